@@ -1,0 +1,44 @@
+// The host's main run loop as the component sees it: work posted for later, repeating
+// timers, and the loop that belongs to the calling thread. Everything runs on one thread.
+#pragma once
+
+#include <cstdint>
+#include <functional>
+
+class RunLoop {
+public:
+    using Task = std::function<void()>;
+    using TimerId = std::uint64_t;  // 0 is never a valid timer
+
+    virtual ~RunLoop() = default;
+
+    // Runs the task later on this loop, after the work already queued; never inside Post.
+    virtual void Post(Task task) = 0;
+
+    // Calls the task first after firstDelay seconds, then every interval seconds
+    // (interval 0: once). Returns the id that CancelTimer takes.
+    virtual TimerId AddTimer(double firstDelay, double interval, Task task) = 0;
+
+    // Stops a timer; an unknown or already cancelled id does nothing. Safe inside the
+    // timer's own task.
+    virtual void CancelTimer(TimerId id) = 0;
+
+    // The loop the calling thread runs, or null when none was made current.
+    static RunLoop* Current();
+    // Makes loop the calling thread's current loop (null clears it).
+    static void SetCurrent(RunLoop* loop);
+};
+
+// Makes a loop current for a scope and restores the previous one afterwards.
+class ScopedCurrentRunLoop {
+public:
+    explicit ScopedCurrentRunLoop(RunLoop* loop) : m_pPrevious(RunLoop::Current()) {
+        RunLoop::SetCurrent(loop);
+    }
+    ~ScopedCurrentRunLoop() { RunLoop::SetCurrent(m_pPrevious); }
+    ScopedCurrentRunLoop(const ScopedCurrentRunLoop&) = delete;
+    ScopedCurrentRunLoop& operator=(const ScopedCurrentRunLoop&) = delete;
+
+private:
+    RunLoop* m_pPrevious;
+};

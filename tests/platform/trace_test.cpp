@@ -1,0 +1,36 @@
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "tests/support/trace_capture.h"
+
+TEST(Trace, EachChannelReachesTheSinkWithItsLevelTagAndText) {
+    TraceCapture capture;
+    MacInfoTrace2("Chat", "Enter %s", "CChatClient::Initialize");
+    MacWarnTrace2("Chat", "refused %d", 7);
+    MacErrorTrace2("UI", "%s", "broken");
+    ASSERT_EQ(capture.Lines().size(), 3u);
+    EXPECT_EQ(capture.Lines()[0].level, TraceLevel::Info);
+    EXPECT_EQ(capture.Lines()[0].tag, "Chat");
+    EXPECT_EQ(capture.Lines()[0].text, "Enter CChatClient::Initialize");
+    EXPECT_EQ(capture.Lines()[1].level, TraceLevel::Warn);
+    EXPECT_EQ(capture.Lines()[1].text, "refused 7");
+    EXPECT_EQ(capture.Lines()[2].level, TraceLevel::Error);
+    EXPECT_EQ(capture.Lines()[2].tag, "UI");
+}
+
+TEST(Trace, TextFromUsersIsAnArgumentSoFormatSignsStayLiteral) {
+    TraceCapture capture;
+    const std::string hostile = "%s%n%x";
+    MacInfoTrace2("Chat", "%s", hostile.c_str());
+    ASSERT_EQ(capture.Lines().size(), 1u);
+    EXPECT_EQ(capture.Lines()[0].text, hostile);
+}
+
+TEST(Trace, LongTextsAreCutAtTheBound) {
+    TraceCapture capture;
+    const std::string longText(kMaxTraceText + 500, 'a');
+    MacInfoTrace2("Chat", "%s", longText.c_str());
+    ASSERT_EQ(capture.Lines().size(), 1u);
+    EXPECT_EQ(capture.Lines()[0].text.size(), static_cast<size_t>(kMaxTraceText));
+}

@@ -1,0 +1,11 @@
+// The one main of every test program: quiet default trace sink and GoogleTest.
+#include <gtest/gtest.h>
+
+#include "platform/trace.h"
+
+int main(int argc, char** argv) {
+    // Tests that look at log lines install their own sink; the rest stay silent.
+    SetTraceSink([](TraceLevel, const char*, const char*) {});
+    testing::InitGoogleTest(&argc, argv);
+    return RUN_ALL_TESTS();
+}
