@@ -27,6 +27,14 @@ public:
     static RunLoop* Current();
     // Makes loop the calling thread's current loop (null clears it).
     static void SetCurrent(RunLoop* loop);
+
+protected:
+    // Longest delay or interval a loop keeps apart (about 31 years); longer ones are cut.
+    static constexpr double kMaxDelaySeconds = 1e9;
+
+    // A delay in whole nanoseconds: negative or NaN counts as 0, huge values are capped
+    // at kMaxDelaySeconds, and anything above 0 is at least 1 ns.
+    static std::int64_t DelayToNanoseconds(double seconds);
 };
 
 // Makes a loop current for a scope and restores the previous one afterwards.
