@@ -1,8 +1,10 @@
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <string>
 #include <vector>
 
+#include "platform/poll_run_loop.h"
 #include "platform/virtual_run_loop.h"
 #include "tests/support/trace_capture.h"
 
@@ -11,6 +13,9 @@ namespace {
 // Lets the same ordering cases run on every loop: "let this much time pass".
 void Drive(VirtualRunLoop& loop, double seconds) {
     loop.AdvanceBy(seconds);
+}
+void Drive(PollRunLoop& loop, double seconds) {
+    loop.RunFor(seconds);
 }
 
 template <typename Loop>
@@ -23,7 +28,7 @@ protected:
     }
 };
 
-using Loops = ::testing::Types<VirtualRunLoop>;
+using Loops = ::testing::Types<VirtualRunLoop, PollRunLoop>;
 TYPED_TEST_SUITE(AnyRunLoop, Loops);
 
 TYPED_TEST(AnyRunLoop, PostedWorkRunsLaterInOrderWithTheWorkItPosts) {
@@ -144,6 +149,50 @@ TEST(VirtualRunLoop, AnAdvanceInsideACallbackNeverTurnsTheClockBack) {
     loop.AdvanceBy(2.0);
     EXPECT_EQ(at, (std::vector<double>{3.0}));
     EXPECT_DOUBLE_EQ(loop.Now(), 6.0);
+}
+
+TEST(PollRunLoop, RunGoesOnUntilQuitAndLeavesTheRestQueued) {
+    PollRunLoop loop;
+    int ticks = 0;
+    bool after = false;
+    loop.AddTimer(0.001, 0.001, [&] {
+        if (++ticks < 3) return;
+        loop.Post([&] { after = true; });
+        loop.Quit();
+    });
+    loop.Run();
+    EXPECT_EQ(ticks, 3);
+    EXPECT_FALSE(after);
+    EXPECT_EQ(loop.RunUntilIdle(), 1u);
+    EXPECT_TRUE(after);
+}
+
+TEST(PollRunLoop, QuitEndsOnlyTheInnermostRunAndNothingLeftEndsTheRest) {
+    PollRunLoop loop;
+    std::vector<std::string> seen;
+    loop.Quit();  // not running: no effect on the next run
+    loop.Post([&] {
+        loop.Post([&] { loop.Quit(); });
+        seen.push_back(loop.RunFor(10) ? "inner quit" : "inner ran out");
+    });
+    loop.AddTimer(0.005, 0, [&] { seen.push_back("timer"); });
+    EXPECT_FALSE(loop.RunFor(10));  // returns once the timer fired: nothing is left
+    EXPECT_EQ(seen, (std::vector<std::string>{"inner quit", "timer"}));
+    EXPECT_FALSE(loop.RunFor(0));
+}
+
+TEST(PollRunLoop, ATaskThatKeepsPostingItselfStarvesNeitherTimersNorQuit) {
+    PollRunLoop loop;
+    int spins = 0;
+    constexpr int kGiveUp = 10000000;  // a starving loop would only stop here
+    std::function<void()> spin = [&] {
+        if (++spins < kGiveUp) loop.Post(spin);
+    };
+    loop.Post(spin);
+    loop.AddTimer(0.002, 0, [&] { loop.Quit(); });
+    EXPECT_TRUE(loop.RunFor(10));
+    EXPECT_GT(spins, 0);
+    EXPECT_LT(spins, kGiveUp);
 }
 
 }  // namespace

@@ -1,0 +1,67 @@
+// The run loop of a command-line host: a real single-threaded loop on the monotonic clock.
+// A window host runs its toolkit's existing event loop behind the same operations instead.
+#pragma once
+
+#include <chrono>
+#include <cstddef>
+#include <deque>
+#include <map>
+#include <set>
+#include <utility>
+
+#include "platform/run_loop.h"
+
+class PollRunLoop final : public RunLoop {
+public:
+    PollRunLoop() = default;
+    PollRunLoop(const PollRunLoop&) = delete;
+    PollRunLoop& operator=(const PollRunLoop&) = delete;
+
+    // Runs posted work and timers as they come due until Quit() is called from inside, or
+    // until nothing is left that could run (no posted work and no timer).
+    void Run();
+
+    // Like Run, for at most seconds; every timer due within them fires. Returns true when
+    // Quit() ended it, false when the time ran out or nothing was left.
+    bool RunFor(double seconds);
+
+    // Runs posted tasks (and the ones they post) and the timers due now, without waiting.
+    // Returns how many tasks and timer firings ran.
+    std::size_t RunUntilIdle();
+
+    // Makes the innermost running Run or RunFor return once the current task is done; the
+    // rest stays queued. Does nothing when neither runs.
+    void Quit();
+
+    void Post(Task task) override;
+    TimerId AddTimer(double firstDelay, double interval, Task task) override;
+    void CancelTimer(TimerId id) override;
+
+private:
+    using Clock = std::chrono::steady_clock;
+
+    struct Timer {
+        Clock::time_point due;
+        Clock::duration interval;  // zero: fires once
+        Task task;                 // empty while its own firing runs
+    };
+
+    // Runs until Quit() or the deadline; true when Quit() ended it.
+    bool RunUntil(Clock::time_point deadline);
+    // Runs the oldest posted task; false when none is queued.
+    bool RunOnePosted();
+    // Fires the earliest timer due at now; false when none is due.
+    bool FireOneDueTimer(Clock::time_point now);
+
+    // Posted tasks in order; timers by id (ids grow, so id order is the order added) and the
+    // timers waiting to fire ordered by (due, id).
+    std::deque<Task> m_posted;
+    std::map<TimerId, Timer> m_timers;
+    std::set<std::pair<Clock::time_point, TimerId>> m_schedule;
+    TimerId m_nextId = 1;
+
+    // Nesting of Run and RunFor (a modal dialog runs one inside a task), and whether the
+    // innermost was asked to return.
+    int m_runDepth = 0;
+    bool m_quit = false;
+};
