@@ -15,8 +15,10 @@ public:
     CByteStream(void* pBuffer, uint32_t nSize);
     // A stream over a caller's buffer of unknown size: nothing is bounded.
     explicit CByteStream(void* pBuffer);
-    // A stream over a memory block, bounded by its size; with bOwns the stream disposes it.
-    CByteStream(KyHandle* hData, bool bOwns);
+    // Whether a stream over a memory block disposes the block when it closes.
+    enum class Ownership { kBorrowed, kOwned };
+    // A stream over a memory block, bounded by its size.
+    CByteStream(KyHandle* hData, Ownership ownership);
     virtual ~CByteStream();
 
     CByteStream(const CByteStream&) = delete;
@@ -139,8 +141,6 @@ private:
     bool Fits(uint32_t n) const;
     // Makes the capacity at least nNeeded by growing in whole increments.
     bool Grow(uint32_t nNeeded);
-    // Reads n bytes into bytes[], for the value operators.
-    bool ReadValue(uint8_t* bytes, uint32_t n);
 
     // Storage: at most one of the two is used.
     uint8_t* m_pBuffer;
