@@ -1,0 +1,255 @@
+// The byte stream: strings, measuring, bounds, growth, memory blocks and its assertions.
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <functional>
+#include <memory>
+#include <vector>
+
+#include "kyutil/bstream.h"
+#include "tests/kyutil/debug_output_capture.h"
+
+namespace {
+
+using Bytes = std::vector<uint8_t>;
+
+// A string read from a stream, freed when it goes.
+using ReadText = std::unique_ptr<char, decltype(&std::free)>;
+ReadText TakeString(CByteStream& stream) {
+    return ReadText(stream.ReadString(), &std::free);
+}
+
+Bytes Contents(const CByteStream& stream) {
+    const uint8_t* p = stream.GetData();
+    return p ? Bytes(p, p + stream.GetLength()) : Bytes();
+}
+
+// A stream whose allocations fail.
+class StarvedStream : public CByteStream {
+public:
+    using CByteStream::CByteStream;
+    void* Alloc(uint32_t) override { return nullptr; }
+};
+
+}  // namespace
+
+TEST(ByteStream, StringFormCountsTheTerminator) {
+    uint8_t buffer[32] = {};
+    CByteStream out(buffer, sizeof(buffer));
+    out.WriteString("");
+    out.WriteString(nullptr);
+    out.WriteString("ab");
+    EXPECT_EQ((Bytes{0, 0, 0, 1, 0, 0, 0, 0, 0, 0, 0, 0, 3, 'a', 'b', 0}), Contents(out));
+
+    CByteStream in(buffer, out.GetLength());
+    EXPECT_STREQ("", TakeString(in).get());
+    EXPECT_EQ(nullptr, TakeString(in).get());
+    EXPECT_EQ(9u, in.Tell());
+    EXPECT_STREQ("ab", TakeString(in).get());
+    EXPECT_FALSE(in.Failed());
+}
+
+TEST(ByteStream, WithoutStorageOnlyMeasures) {
+    CByteStream measure(static_cast<void*>(nullptr));
+    measure << 1;
+    measure.WriteString("ab");
+    EXPECT_EQ(11u, measure.Tell());
+    EXPECT_EQ(11u, measure.GetLength());
+    EXPECT_EQ(nullptr, measure.GetData());
+    EXPECT_FALSE(measure.Failed());
+}
+
+TEST(ByteStream, BoundedStreamDropsWhatDoesNotFit) {
+    uint8_t buffer[4] = {};
+    CByteStream out(buffer, sizeof(buffer));
+    out << 1;
+    EXPECT_FALSE(out.Failed());
+    out << 2;
+    EXPECT_EQ(4u, out.Tell());
+    EXPECT_EQ((Bytes{0, 0, 0, 1}), Bytes(buffer, buffer + 4));
+    EXPECT_TRUE(out.Failed());
+    EXPECT_EQ(0u, out.Available());
+}
+
+TEST(ByteStream, GrowsInWholeIncrementsAndKeepsItsData) {
+    CByteStream out(100u);
+    Bytes first(130);
+    for (size_t i = 0; i < first.size(); ++i)
+        first[i] = static_cast<uint8_t>(i);
+    ASSERT_TRUE(out.Write(first.data(), 130));
+    EXPECT_EQ(200u, out.GetCapacity());
+
+    const Bytes second(100, 0x5A);
+    ASSERT_TRUE(out.Write(second.data(), 100));
+    EXPECT_EQ(300u, out.GetCapacity());
+    Bytes expected = first;
+    expected.insert(expected.end(), second.begin(), second.end());
+    EXPECT_EQ(expected, Contents(out));
+}
+
+TEST(ByteStream, RefusedReadsCopyNothingAndKeepThePosition) {
+    uint8_t data[] = {0, 0, 0, 1, 0xAA, 0xBB};
+    CByteStream in(data, sizeof(data));
+    in.Seek(4);
+    int value = 7;
+    in >> value;
+    uint8_t out[4] = {};
+    EXPECT_FALSE(in.Read(out, 3));
+    EXPECT_FALSE(in.ReadBytes(out, 4));
+    EXPECT_EQ(7, value);
+    EXPECT_EQ(Bytes(4, 0), Bytes(out, out + 4));
+    EXPECT_EQ(4u, in.Tell());
+    EXPECT_TRUE(in.Failed());
+}
+
+TEST(ByteStream, RefusedStringsKeepThePosition) {
+    const Bytes cases[] = {
+        {0, 0, 0},                  // the count itself is cut off
+        {0, 0, 0, 9, 'a', 'b', 0},  // the count passes the end
+        {0, 0, 0, 2, 'a', 'b', 0},  // the last counted byte is not the terminator
+    };
+    for (Bytes data : cases) {
+        SCOPED_TRACE(data.size());
+        CByteStream in(data.data(), static_cast<uint32_t>(data.size()));
+        EXPECT_EQ(nullptr, TakeString(in).get());
+        EXPECT_EQ(0u, in.Tell());
+        EXPECT_TRUE(in.Failed());
+    }
+}
+
+TEST(ByteStream, PositionsPastFourGibibytesDoNotFit) {
+    CByteStream measure(static_cast<void*>(nullptr));
+    measure.Seek(UINT32_MAX - 1);
+    measure << 1;
+    EXPECT_EQ(UINT32_MAX - 1, measure.Tell());
+    EXPECT_TRUE(measure.Failed());
+    EXPECT_EQ(0u, measure.Skip(4));
+    EXPECT_EQ(1u, measure.Skip(1));
+
+    uint8_t buffer[8] = {};
+    CByteStream unbounded(buffer);
+    unbounded.Seek(UINT32_MAX - 1);
+    int value = 5;
+    unbounded >> value;  // would read far outside the buffer if the position wrapped
+    EXPECT_EQ(5, value);
+    EXPECT_EQ(UINT32_MAX - 1, unbounded.Tell());
+
+    CByteStream growable(16u);
+    growable.Seek(UINT32_MAX - 1);
+    EXPECT_FALSE(growable.Write(buffer, 4));
+    EXPECT_EQ(nullptr, growable.GetData());
+}
+
+TEST(ByteStream, UnboundedStreamReadsWhatItIsGiven) {
+    uint8_t buffer[16] = {};
+    CByteStream out(buffer);
+    out << 0x01020304;
+    out.WriteString("hi");
+    CByteStream in(buffer);
+    int value = 0;
+    in >> value;
+    EXPECT_EQ(0x01020304, value);
+    EXPECT_STREQ("hi", TakeString(in).get());
+    EXPECT_EQ(11u, in.Tell());
+}
+
+TEST(ByteStream, MemoryBlockStorage) {
+    KyHandle* hBlock = NewHandle(8);
+    ASSERT_NE(nullptr, hBlock);
+    {
+        CByteStream stream(hBlock, CByteStream::Ownership::kBorrowed);
+        EXPECT_EQ(hBlock->pData, stream.GetData());
+        EXPECT_EQ(1, stream.Lock());
+        EXPECT_EQ(1, hBlock->nLockCount);
+        stream << 7 << 8;
+        stream << 9;
+        EXPECT_TRUE(stream.Failed());
+        EXPECT_EQ(1, stream.Unlock());
+        EXPECT_EQ(0, hBlock->nLockCount);
+    }
+    // The stream did not own the block, so its bytes are still there.
+    EXPECT_EQ(8, CByteStream::ReadInt(hBlock->pData, 4));
+    DisposeHandle(hBlock);
+
+    CByteStream plain(4u);
+    EXPECT_EQ(0, plain.Lock());
+    EXPECT_EQ(0, plain.Unlock());
+}
+
+TEST(ByteStream, AvailableStopsAtTheCapacity) {
+    uint8_t buffer[10] = {};
+    CByteStream stream(buffer, sizeof(buffer));
+    EXPECT_EQ(3u, stream.Skip(3));
+    EXPECT_EQ(7u, stream.Available());
+    EXPECT_EQ(3u, stream.Seek(12));
+    EXPECT_EQ(0u, stream.Available());  // not a wrapped-around huge number
+}
+
+TEST(ByteStreamAssert, ChecksReportTheirLineAndNullDataIsNeverCopied) {
+    uint8_t buffer[8] = {1, 2, 3, 4, 5, 6, 7, 8};
+    struct Case {
+        const char* name;
+        std::function<void()> run;
+        std::vector<int> lines;
+    };
+    const Case cases[] = {
+        {"no increment", [] { CByteStream s(0u); }, {12}},
+        {"null buffer", [] { CByteStream s(nullptr, 4); }, {26}},
+        {"write null",
+         [&] {
+             CByteStream s(buffer, sizeof(buffer));
+             EXPECT_FALSE(s.Write(nullptr, 4));
+             EXPECT_EQ(0u, s.Tell());
+         },
+         {267}},
+        {"read null",
+         [&] {
+             CByteStream s(buffer, sizeof(buffer));
+             EXPECT_FALSE(s.Read(nullptr, 4));
+             EXPECT_EQ(0u, s.Tell());
+         },
+         {311}},
+        {"memcpy null destination",
+         [&] { EXPECT_FALSE(CByteStream::Memcpy(nullptr, buffer, 4)); },
+         {164}},
+        {"memcpy null source",
+         [&] { EXPECT_FALSE(CByteStream::Memcpy(buffer, nullptr, 4)); },
+         {165}},
+        {"memcpy both null",
+         [] { EXPECT_FALSE(CByteStream::Memcpy(nullptr, nullptr, 4)); },
+         {164, 165}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.name);
+        DebugOutputCapture capture;
+        c.run();
+        std::vector<std::string> expected;
+        for (int line : c.lines)
+            expected.push_back(StreamAssertText(line));
+        EXPECT_EQ(expected, capture.Texts());
+    }
+    EXPECT_EQ((Bytes{1, 2, 3, 4, 5, 6, 7, 8}), Bytes(buffer, buffer + 8));
+}
+
+TEST(ByteStreamAssert, StringWithoutMemoryIsSkipped) {
+    uint8_t buffer[] = {0, 0, 0, 3, 'a', 'b', 0, 0, 0, 0, 5};
+    StarvedStream in(buffer, sizeof(buffer));
+    DebugOutputCapture capture;
+    EXPECT_EQ(nullptr, in.ReadString());
+    EXPECT_EQ(std::vector<std::string>{StreamAssertText(668)}, capture.Texts());
+    EXPECT_EQ(7u, in.Tell());
+    int next = 0;
+    in >> next;
+    EXPECT_EQ(5, next);
+}
+
+TEST(ByteStreamAssert, GrowthThatCannotAllocateDropsTheWrite) {
+    StarvedStream out(16u);
+    DebugOutputCapture capture;
+    out << 1;
+    EXPECT_EQ(0u, out.Tell());
+    EXPECT_TRUE(out.Failed());
+    EXPECT_EQ(std::vector<std::string>{StreamAssertText(199)}, capture.Texts());
+}

@@ -1,0 +1,141 @@
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "kyutil/ky_vector.h"
+#include "tests/kyutil/debug_output_capture.h"
+
+namespace {
+
+int g_items[40];
+
+void* Item(int i) {
+    return &g_items[i];
+}
+
+// The vector's pointers as item numbers (-1 for a pointer that is not an item).
+std::vector<int> Numbers(const CKyVector& v) {
+    std::vector<int> numbers;
+    for (int32_t i = 0; i < v.GetCount(); ++i) {
+        const int* p = static_cast<const int*>(v[i]);
+        numbers.push_back(p >= g_items && p < g_items + 40 ? static_cast<int>(p - g_items) : -1);
+    }
+    return numbers;
+}
+
+CKyVector Of(const std::vector<int>& numbers) {
+    CKyVector v;
+    for (int n : numbers)
+        v.Add(Item(n));
+    return v;
+}
+
+}  // namespace
+
+TEST(KyVector, GrowsByThirtyTwoSlots) {
+    CKyVector v;
+    for (int i = 0; i < 33; ++i)
+        ASSERT_EQ(1, v.Add(Item(i)));
+    EXPECT_EQ(33, v.GetCount());
+    EXPECT_EQ(64, v.GetCapacity());
+    EXPECT_EQ(Item(32), v[32]);
+    EXPECT_EQ(Item(0), v.GetHead()[0]);
+}
+
+TEST(KyVector, UniqueAddAndLookupUseTheFirstOccurrence) {
+    CKyVector v = Of({1, 2, 1});
+    EXPECT_EQ(0, v.Add(Item(2), true));
+    EXPECT_EQ(1, v.Add(Item(3), true));
+    EXPECT_EQ(1, v.Add(Item(2)));
+    EXPECT_EQ((std::vector<int>{1, 2, 1, 3, 2}), Numbers(v));
+    EXPECT_EQ(1, v.GetIndex(Item(2)));
+    EXPECT_EQ(-1, v.GetIndex(Item(9)));
+    EXPECT_EQ(nullptr, v[-1]);
+    EXPECT_EQ(nullptr, v[v.GetCount()]);
+}
+
+TEST(KyVector, RemovalMovesTheTailDown) {
+    CKyVector v = Of({1, 2, 3, 2, 4});
+    EXPECT_EQ(1, v.Remove(Item(2)));
+    EXPECT_EQ(0, v.Remove(Item(9)));
+    EXPECT_EQ(1, v.RemoveAt(3));
+    EXPECT_EQ((std::vector<int>{1, 3, 2}), Numbers(v));
+    EXPECT_EQ(0, v.RemoveAt(3));
+    EXPECT_EQ(0, v.RemoveAt(-1));
+    EXPECT_EQ((std::vector<int>{1, 3, 2}), Numbers(v));
+    v.RemoveAll();
+    EXPECT_EQ(0, v.GetCount());
+    EXPECT_EQ(0, v.GetCapacity());
+    EXPECT_EQ(nullptr, v.GetData());
+}
+
+TEST(KyVector, InsertAtMovesTheTailUpAndGrowsWhenFull) {
+    CKyVector v = Of({1, 2});
+    EXPECT_EQ(1, v.InsertAt(0, Item(0)));
+    EXPECT_EQ(1, v.InsertAt(2, Item(9)));
+    EXPECT_EQ(1, v.InsertAt(4, Item(3)));
+    EXPECT_EQ((std::vector<int>{0, 1, 9, 2, 3}), Numbers(v));
+
+    CKyVector full;
+    for (int i = 0; i < 32; ++i)
+        full.Add(Item(i + 1));
+    EXPECT_EQ(1, full.InsertAt(0, Item(0)));
+    EXPECT_EQ(64, full.GetCapacity());
+    EXPECT_EQ(Item(0), full[0]);
+    EXPECT_EQ(Item(32), full[32]);
+}
+
+TEST(KyVector, OutOfRangeIndexesAreRefusedAndReported) {
+    const std::string insertText =
+        "Assert -- nIndex >= 0 && nIndex <= m_nUsed in InsertAt of newutil/macutil\n";
+    const std::string setText =
+        "Assert -- nIndex >= 0 && nIndex < m_nUsed in SetAt of newutil/macutil\n";
+    struct Case {
+        int (CKyVector::*op)(int32_t, void*);
+        int32_t index;
+        std::string text;
+    };
+    const Case cases[] = {
+        {&CKyVector::InsertAt, -1, insertText},
+        {&CKyVector::InsertAt, 3, insertText},
+        {&CKyVector::SetAt, -1, setText},
+        {&CKyVector::SetAt, 2, setText},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.index);
+        CKyVector v = Of({1, 2});
+        DebugOutputCapture capture;
+        EXPECT_EQ(0, (v.*c.op)(c.index, Item(9)));
+        EXPECT_EQ((std::vector<int>{1, 2}), Numbers(v));
+        EXPECT_EQ(std::vector<std::string>{c.text}, capture.Texts());
+    }
+    CKyVector v = Of({1, 2});
+    EXPECT_EQ(1, v.SetAt(1, Item(9)));
+    EXPECT_EQ((std::vector<int>{1, 9}), Numbers(v));
+}
+
+TEST(KyVector, CopiesHoldTheSamePointersInExactlySizedArrays) {
+    CKyVector original = Of({1, 2, 3});
+    CKyVector copy(original);
+    EXPECT_EQ(3, copy.GetCapacity());
+    EXPECT_EQ(Numbers(original), Numbers(copy));
+    EXPECT_NE(original.GetData(), copy.GetData());
+
+    CKyVector assigned = Of({7, 8, 9, 9});
+    assigned = original;
+    EXPECT_EQ((std::vector<int>{1, 2, 3}), Numbers(assigned));
+
+    CKyVector& alias = assigned;
+    assigned = alias;
+    EXPECT_EQ((std::vector<int>{1, 2, 3}), Numbers(assigned));
+
+    const std::unique_ptr<CKyVector> clone = original.Clone();
+    ASSERT_NE(nullptr, clone);
+    EXPECT_EQ(Numbers(original), Numbers(*clone));
+
+    void* items[] = {Item(5), Item(6)};
+    CKyVector fromArray(items, 2);
+    EXPECT_EQ((std::vector<int>{5, 6}), Numbers(fromArray));
+    EXPECT_EQ(2, fromArray.GetCapacity());
+}
