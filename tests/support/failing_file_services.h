@@ -1,0 +1,71 @@
+// File services for tests: the real POSIX ones, except that chosen operations fail with
+// chosen results (tests run as root, where the file system itself refuses nothing).
+// Installs itself while it lives.
+#pragma once
+
+#include <cstddef>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "platform/file_services.h"
+
+enum class FileOp {
+    Resolve,
+    GetInfo,
+    Open,
+    Read,
+    Write,
+    GetSize,
+    Truncate,
+    Close,
+    Delete,
+    Rename,
+    Create
+};
+
+class FailingFileServices final : public FileServices {
+public:
+    FailingFileServices();
+    ~FailingFileServices() override;
+    FailingFileServices(const FailingFileServices&) = delete;
+    FailingFileServices& operator=(const FailingFileServices&) = delete;
+
+    // Makes op fail with result on paths containing pathPart (every path when empty), once
+    // skip matching calls have passed. For Rename the path is the destination; for calls on
+    // an open file it is the path it was opened with. A failed call does nothing, except
+    // that a failed Close still releases the file, as a real one does.
+    void Fail(FileOp op, FileResult result, const std::string& pathPart = "", int skip = 0);
+    // How many times op was called, failed calls included.
+    int Calls(FileOp op) const;
+
+    FileResult Resolve(const std::string& path) override;
+    FileResult GetInfo(const std::string& path, FileInfo* info) override;
+    FileResult Open(const std::string& path, FilePermission permission, FileId* file) override;
+    FileResult Read(FileId file, void* buffer, std::size_t size) override;
+    FileResult Write(FileId file, const void* data, std::size_t size) override;
+    FileResult GetSize(FileId file, std::uint64_t* size) override;
+    FileResult Truncate(FileId file, std::uint64_t size) override;
+    FileResult Close(FileId file) override;
+    FileResult Delete(const std::string& path) override;
+    FileResult Rename(const std::string& from, const std::string& to) override;
+    FileResult Create(const std::string& folder, const std::string& name, std::uint32_t type,
+                      std::uint32_t creator) override;
+
+private:
+    struct Rule {
+        FileOp op;
+        FileResult result;
+        std::string pathPart;
+        int skip;
+    };
+    // Counts the call; the injected result when a rule matches, else kFileOk.
+    FileResult Injected(FileOp op, const std::string& path);
+    std::string PathOf(FileId file) const;
+
+    PosixFileServices m_posix;
+    FileServices* m_pPrevious;
+    std::vector<Rule> m_rules;
+    std::map<FileOp, int> m_calls;
+    std::map<FileId, std::string> m_openPaths;
+};
