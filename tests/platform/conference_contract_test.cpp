@@ -1,0 +1,525 @@
+// The conference-service contract, driven the way several chat participants drive it.
+#include "tests/platform/conference_contract.h"
+
+#include <algorithm>
+#include <cstring>
+
+namespace {
+
+constexpr const char* kSessionResource = "c_session_id";
+
+// "+7[11:1001:alpha] -7[...] ~7[...]": a roster change in one line.
+std::string Describe(const RosterChange& change) {
+    std::string text;
+    const auto add = [&text](char sign, const std::vector<RosterRecord>& records) {
+        for (const RosterRecord& record : records) {
+            if (!text.empty()) text += ' ';
+            text += sign + std::to_string(record.sessionId);
+            for (const RosterUserEntry& user : record.users) {
+                text += "[" + std::to_string(user.nodeId) + ":" + std::to_string(user.userId) +
+                        ":" + std::string(user.enrollInfo.begin(), user.enrollInfo.end()) + "]";
+            }
+        }
+    };
+    add('+', change.added);
+    add('-', change.deleted);
+    add('~', change.modified);
+    return text;
+}
+
+std::string Entry(const ContractParticipant& p, const std::string& payload) {
+    return "[" + std::to_string(p.nodeId) + ":" + std::to_string(p.userId) + ":" + payload + "]";
+}
+
+std::vector<std::string> Rosters(const ContractParticipant& p) {
+    std::vector<std::string> changes;
+    for (const ArmEvent& event : p.sink->Named("ApeRosterChanged")) {
+        changes.push_back(Describe(event.roster));
+    }
+    return changes;
+}
+
+std::string Text(const std::vector<std::uint8_t>& bytes) {
+    return std::string(bytes.begin(), bytes.end());
+}
+
+}  // namespace
+
+std::vector<std::uint8_t> ContractBytes(const std::string& text) {
+    return std::vector<std::uint8_t>(text.begin(), text.end());
+}
+
+ContractParticipant& ConferenceContract::Attached(std::uint32_t nodeId) {
+    ContractParticipant& p = m_participants.emplace_back();
+    p.nodeId = nodeId;
+    p.client = m_harness->NewClient(nodeId);
+    p.sink = std::make_unique<ArmRecorder>(p.client);
+    EXPECT_EQ(0, p.client->Connect(p.sink.get(), "user", 0, 0, 0));
+    Run();
+    EXPECT_EQ(0, p.client->ConferenceJoin(0, m_harness->ConferenceId(), p.sink.get(), 3));
+    Run();
+    EXPECT_EQ(0, p.client->ApeAttach(p.sink.get(), 0, m_harness->ConferenceId(), &p.ape));
+    Run();
+    const std::vector<ArmEvent> attach = p.sink->Named("ApeAttachConfirm");
+    if (!attach.empty()) p.userId = attach.back().userId;
+    p.sink->Clear();
+    return p;
+}
+
+int ConferenceContract::Enroll(ContractParticipant& p, const std::string& payload,
+                               std::uint32_t session) {
+    ARMSessionResource resource{1, kSessionResource, 1, 0, 0};
+    return p.client->ApeEnroll(p.ape, 1, session, 0, 1, &resource, payload.data(),
+                               static_cast<std::uint32_t>(payload.size()), 3);
+}
+
+std::uint32_t ConferenceContract::Handle(ContractParticipant& p, const std::string& name) {
+    NameHandle entry{};
+    std::memcpy(entry.name, name.data(), std::min(name.size(), sizeof entry.name));
+    EXPECT_EQ(0, p.client->AllocNameHandle(p.ape, 1, &entry, p.sink.get()));
+    Run();
+    const std::vector<ArmEvent> confirms = p.sink->Named("AllocNameHandleConfirm");
+    p.sink->Clear();
+    if (confirms.empty() || confirms.back().handles.size() != 1) return 0;
+    return confirms.back().handles[0].handle_value;
+}
+
+int ConferenceContract::Write(ContractParticipant& p, std::uint32_t cache, tagCacheAction action,
+                              const std::vector<std::uint8_t>* bytes) {
+    std::uint32_t mem = 0;
+    if (bytes != nullptr) {
+        std::uint32_t size = static_cast<std::uint32_t>(bytes->size());
+        EXPECT_EQ(0, p.client->AllocMemHandle(size, &mem));
+        EXPECT_EQ(0, p.client->WriteMemHandle(mem, 0, bytes->data(), &size));
+    }
+    const int result =
+        p.client->ApeSharedDataActionEx(p.ape, cache, 0, 0, action, 0x2000000, mem, 0, 1);
+    if (mem != 0) {
+        EXPECT_EQ(0, p.client->FreeMemHandle(mem));
+    }
+    return result;
+}
+
+int ConferenceContract::Request(ContractParticipant& p, std::uint32_t cache,
+                                tagCacheRequestType type) {
+    return p.client->ApeRequestSharedDataEx(p.ape, cache, 0, type, 255, p.sink.get());
+}
+
+void ConferenceContract::Release(ContractParticipant& p) {
+    EXPECT_EQ(0, p.client->Release());
+    p.client = nullptr;
+}
+
+TEST_P(ConferenceContract, ConnectJoinAndAttachAnswerLaterAndRepeatsAnswerTheSame) {
+    ContractParticipant& p = m_participants.emplace_back();
+    p.client = m_harness->NewClient(11);
+    p.sink = std::make_unique<ArmRecorder>(p.client);
+    const std::uint16_t conference = m_harness->ConferenceId();
+
+    ASSERT_EQ(0, p.client->Connect(p.sink.get(), "Ann", 0, 0, 0));
+    EXPECT_TRUE(p.sink->Events().empty()) << "answered from inside the request";
+    Run();
+    ASSERT_EQ(1u, p.sink->Count("ConnectConfirm"));
+    EXPECT_EQ(0, p.sink->Named("ConnectConfirm")[0].result);
+    EXPECT_EQ(kArmAlreadyConnected, p.client->Connect(p.sink.get(), "Ann", 0, 0, 0));
+
+    ASSERT_EQ(0, p.client->ConferenceJoin(0, conference, p.sink.get(), 3));
+    Run();
+    ASSERT_EQ(1u, p.sink->Count("ConferenceJoinConfirm"));
+    EXPECT_EQ(0, p.sink->Named("ConferenceJoinConfirm")[0].result);
+    EXPECT_EQ(kArmAlreadyJoined, p.client->ConferenceJoin(0, conference, p.sink.get(), 3));
+
+    std::uint32_t ape = 0;
+    ASSERT_EQ(0, p.client->ApeAttach(p.sink.get(), 0, conference, &ape));
+    EXPECT_NE(0u, ape);
+    Run();
+    std::uint32_t again = 0;
+    ASSERT_EQ(0, p.client->ApeAttach(p.sink.get(), 0, conference, &again));
+    EXPECT_EQ(ape, again);
+    Run();
+    const std::vector<ArmEvent> attach = p.sink->Named("ApeAttachConfirm");
+    ASSERT_EQ(2u, attach.size());
+    for (const ArmEvent& event : attach) {
+        EXPECT_EQ(ape, event.apeHandle);
+        EXPECT_EQ(0, event.result);
+        EXPECT_NE(0u, event.userId);
+    }
+    EXPECT_EQ(attach[0].userId, attach[1].userId);
+    EXPECT_EQ(1u, p.sink->Count("ConnectConfirm"));
+    EXPECT_EQ(1u, p.sink->Count("ConferenceJoinConfirm"));
+}
+
+TEST_P(ConferenceContract, UserIdsAndApeHandlesAreUniqueWithinTheConference) {
+    const ContractParticipant& a = Attached(11);
+    const ContractParticipant& b = Attached(12);
+    const ContractParticipant& c = Attached(13);
+    for (const ContractParticipant* p : {&a, &b, &c}) {
+        EXPECT_NE(0u, p->userId);
+        EXPECT_NE(0u, p->ape);
+    }
+    EXPECT_NE(a.userId, b.userId);
+    EXPECT_NE(a.userId, c.userId);
+    EXPECT_NE(b.userId, c.userId);
+    EXPECT_NE(a.ape, b.ape);
+}
+
+TEST_P(ConferenceContract, EnrollGrantsOneSessionValuePerSession) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    ContractParticipant& c = Attached(13);
+    ASSERT_EQ(0, Enroll(a, "a"));
+    ASSERT_EQ(0, Enroll(b, "b"));
+    ASSERT_EQ(0, Enroll(c, "c", kSession + 1));
+    EXPECT_TRUE(a.sink->Events().empty());
+    Run();
+
+    std::vector<std::uint32_t> values;
+    for (ContractParticipant* p : {&a, &b, &c}) {
+        const std::vector<ArmEvent> confirms = p->sink->Named("ApeEnrollConfirm");
+        ASSERT_EQ(1u, confirms.size());
+        EXPECT_EQ(p->ape, confirms[0].apeHandle);
+        EXPECT_EQ(0, confirms[0].result);
+        ASSERT_EQ(1u, confirms[0].resources.size());
+        EXPECT_EQ(kSessionResource, confirms[0].resourceNames[0]);
+        EXPECT_EQ(0, confirms[0].resources[0].wStatus);
+        EXPECT_NE(0u, confirms[0].resources[0].dwValue);
+        values.push_back(confirms[0].resources[0].dwValue);
+        // The confirmation comes before any roster change.
+        EXPECT_EQ("ApeEnrollConfirm", p->sink->Names().front());
+    }
+    EXPECT_EQ(values[0], values[1]);
+    EXPECT_NE(values[0], values[2]);
+}
+
+TEST_P(ConferenceContract, RosterReportsEachEnrollToEveryMemberOfTheSession) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    ContractParticipant& c = Attached(13);
+    const std::string payloadA("<roster>a\0b</roster>", 20);  // bytes pass unchanged
+    ASSERT_EQ(0, Enroll(a, payloadA));
+    Run();
+    ASSERT_EQ(0, Enroll(b, "beta"));
+    ASSERT_EQ(0, Enroll(c, "gamma", kSession + 1));
+    Run();
+
+    const std::string s = std::to_string(kSession);
+    EXPECT_EQ(std::vector<std::string>({"+" + s + Entry(a, payloadA), "+" + s + Entry(b, "beta")}),
+              Rosters(a));
+    // The newcomer first learns who is there, then sees its own arrival.
+    EXPECT_EQ(std::vector<std::string>({"+" + s + Entry(a, payloadA), "+" + s + Entry(b, "beta")}),
+              Rosters(b));
+    EXPECT_EQ(std::vector<std::string>({"+" + std::to_string(kSession + 1) + Entry(c, "gamma")}),
+              Rosters(c));
+}
+
+TEST_P(ConferenceContract, ReEnrollIsModifiedAndDetachIsDeleted) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    ASSERT_EQ(0, Enroll(a, "alpha"));
+    ASSERT_EQ(0, Enroll(b, "beta"));
+    Run();
+    a.sink->Clear();
+    b.sink->Clear();
+
+    ASSERT_EQ(0, Enroll(b, "beta, now presenter"));
+    Run();
+    const std::string s = std::to_string(kSession);
+    const std::string modified = "~" + s + Entry(b, "beta, now presenter");
+    EXPECT_EQ(std::vector<std::string>({modified}), Rosters(a));
+    EXPECT_EQ(std::vector<std::string>({"ApeEnrollConfirm", "ApeRosterChanged"}), b.sink->Names());
+    EXPECT_EQ(std::vector<std::string>({modified}), Rosters(b));
+
+    a.sink->Clear();
+    b.sink->Clear();
+    ASSERT_EQ(0, a.client->ApeDetach(a.ape));
+    Run();
+    EXPECT_EQ(std::vector<std::string>({"-" + s + Entry(a, "alpha")}), Rosters(b));
+    EXPECT_TRUE(a.sink->Events().empty());
+}
+
+TEST_P(ConferenceContract, PrivateDataReachesOneUserWithTheTrueSender) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    ContractParticipant& c = Attached(13);
+    const std::string bytes("<pdu>\0\xff</pdu>", 13);
+    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.userId, 1, bytes.data(), 13, 1, 1));
+    EXPECT_NE(0, a.client->ApeSendData(a.ape, 999999, 1, bytes.data(), 13, 1, 1));
+    EXPECT_TRUE(b.sink->Events().empty());
+    Run();
+
+    const std::vector<ArmEvent> received = b.sink->Named("ApeDataIndication");
+    ASSERT_EQ(1u, received.size());
+    EXPECT_EQ(b.ape, received[0].apeHandle);
+    EXPECT_EQ(a.userId, received[0].userId);
+    EXPECT_EQ(bytes, Text(received[0].data));
+    EXPECT_TRUE(a.sink->Events().empty());
+    EXPECT_TRUE(c.sink->Events().empty());
+}
+
+TEST_P(ConferenceContract, NamedHandlesAreTheSameForEveryone) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    const std::string longName(64, 'n');  // fills the field, no terminating NUL
+    NameHandle first[3] = {};
+    std::strcpy(first[0].name, "70001_chat_cache_15");
+    std::strcpy(first[1].name, "70001_chat_status");
+    std::memcpy(first[2].name, longName.data(), 64);
+    NameHandle second[2] = {};
+    std::strcpy(second[0].name, "70001_chat_status");
+    std::strcpy(second[1].name, "70001_Chat_User_Info");
+    ASSERT_EQ(0, a.client->AllocNameHandle(a.ape, 3, first, a.sink.get()));
+    ASSERT_EQ(0, b.client->AllocNameHandle(b.ape, 2, second, b.sink.get()));
+    EXPECT_TRUE(a.sink->Events().empty());
+    Run();
+
+    const std::vector<ArmEvent> gotA = a.sink->Named("AllocNameHandleConfirm");
+    const std::vector<ArmEvent> gotB = b.sink->Named("AllocNameHandleConfirm");
+    ASSERT_EQ(1u, gotA.size());
+    ASSERT_EQ(1u, gotB.size());
+    ASSERT_EQ(3u, gotA[0].handles.size());
+    ASSERT_EQ(2u, gotB[0].handles.size());
+    EXPECT_EQ(a.ape, gotA[0].apeHandle);
+    EXPECT_EQ(0, gotA[0].result);
+    EXPECT_STREQ("70001_chat_status", gotA[0].handles[1].name);
+    EXPECT_EQ(longName, std::string(gotA[0].handles[2].name, 64));
+    for (const NameHandle& entry : gotA[0].handles)
+        EXPECT_NE(0u, entry.handle_value);
+    EXPECT_NE(0u, gotB[0].handles[1].handle_value);
+    EXPECT_EQ(gotA[0].handles[1].handle_value, gotB[0].handles[0].handle_value);
+    EXPECT_NE(gotA[0].handles[0].handle_value, gotA[0].handles[1].handle_value);
+    EXPECT_NE(gotA[0].handles[2].handle_value, gotA[0].handles[1].handle_value);
+    EXPECT_NE(gotB[0].handles[1].handle_value, gotB[0].handles[0].handle_value);
+}
+
+TEST_P(ConferenceContract, CacheActionsReachEverySubscriberWithTheWriterAsSender) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    ContractParticipant& c = Attached(13);
+    const std::uint32_t cache = Handle(a, "70001_chat_cache_15");
+    ASSERT_EQ(cache, Handle(b, "70001_chat_cache_15"));
+    ASSERT_EQ(0, Request(a, cache, CACHE_REQUEST_SUBSCRIBE));
+    ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_SUBSCRIBE));
+
+    const std::vector<std::uint8_t> zero(2, 0), one = ContractBytes("one"),
+                                                two = ContractBytes("two");
+    ASSERT_EQ(0, Write(a, cache, CACHE_SET, &zero));
+    ASSERT_EQ(0, Write(a, cache, CACHE_APPEND, &one));
+    ASSERT_EQ(0, Write(b, cache, CACHE_APPEND, &two));
+    EXPECT_TRUE(a.sink->Events().empty());
+    Run();
+
+    const std::vector<ArmEvent> confirms = a.sink->Named("ApeCacheActionConfirmEx");
+    ASSERT_EQ(2u, confirms.size());
+    EXPECT_EQ(CACHE_SET, confirms[0].action);
+    EXPECT_EQ(CACHE_APPEND, confirms[1].action);
+    for (const ArmEvent& confirm : confirms) {
+        EXPECT_EQ(a.ape, confirm.apeHandle);
+        EXPECT_EQ(cache, confirm.entityId);
+        EXPECT_EQ(0, confirm.result);
+    }
+    EXPECT_LT(confirms[0].cacheId, confirms[1].cacheId);
+    // The writer's confirmation comes before its own delivery.
+    EXPECT_EQ("ApeCacheActionConfirmEx", a.sink->Names().front());
+
+    for (const ContractParticipant* p : {&a, &b}) {
+        const std::vector<ArmEvent> got = p->sink->Named("SharedDataReceivedEx");
+        ASSERT_EQ(3u, got.size());
+        const std::uint32_t senders[] = {a.userId, a.userId, b.userId};
+        const std::vector<std::uint8_t>* bytes[] = {&zero, &one, &two};
+        for (std::size_t i = 0; i < 3; ++i) {
+            EXPECT_EQ(p->ape, got[i].apeHandle);
+            EXPECT_EQ(cache, got[i].entityId);
+            EXPECT_EQ(senders[i], got[i].userId);
+            EXPECT_EQ(*bytes[i], got[i].data);
+            EXPECT_EQ(0, got[i].result);
+            EXPECT_EQ(i == 0 ? CACHE_SET : CACHE_APPEND, got[i].action);
+        }
+        EXPECT_EQ(confirms[1].cacheId, got[1].cacheId);
+        EXPECT_LT(got[1].cacheId, got[2].cacheId);
+    }
+    EXPECT_TRUE(c.sink->Events().empty());
+}
+
+TEST_P(ConferenceContract, UnsubscribeStopsLaterDeliveries) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    const std::uint32_t cache = Handle(a, "70001_chat_cache_8");
+    ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_SUBSCRIBE));
+    const std::vector<std::uint8_t> first = ContractBytes("first"),
+                                    second = ContractBytes("second");
+    ASSERT_EQ(0, Write(a, cache, CACHE_APPEND, &first));
+    Run();
+    ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_UNSUBSCRIBE));
+    ASSERT_EQ(0, Write(a, cache, CACHE_APPEND, &second));
+    Run();
+    const std::vector<ArmEvent> got = b.sink->Named("SharedDataReceivedEx");
+    ASSERT_EQ(1u, got.size());
+    EXPECT_EQ(first, got[0].data);
+}
+
+// What one retrieval answers, for each state a cache can be in.
+TEST_P(ConferenceContract, RetrieveAnswersEveryItemAndMarksTheLast) {
+    struct Item {
+        tagCacheAction action;
+        short result;
+        std::string data;  // "" with no memory handle
+    };
+    struct Step {
+        tagCacheAction action;
+        bool withBytes;
+        std::string bytes;
+    };
+    struct Case {
+        const char* name;
+        std::vector<Step> writes;
+        std::vector<Item> expected;
+    };
+    const std::string mark("1\0", 2), zero("\0\0", 2);
+    const std::vector<Case> cases = {
+        {"never set", {}, {{CACHE_REPLY_LAST, kArmRetry, ""}}},
+        {"set without bytes", {{CACHE_SET, false, ""}}, {{CACHE_REPLY_LAST, 0, ""}}},
+        {"status mark", {{CACHE_SET, true, mark}}, {{CACHE_REPLY_LAST, 0, mark}}},
+        {"initialised, two lines",
+         {{CACHE_SET, true, zero}, {CACHE_APPEND, true, "p"}, {CACHE_APPEND, true, "q"}},
+         {{CACHE_REPLY_ITEM, 0, zero}, {CACHE_REPLY_ITEM, 0, "p"}, {CACHE_REPLY_LAST, 0, "q"}}},
+        {"set replaces",
+         {{CACHE_APPEND, true, "p"}, {CACHE_SET, true, mark}},
+         {{CACHE_REPLY_LAST, 0, mark}}},
+    };
+    ContractParticipant& writer = Attached(11);
+    ContractParticipant& reader = Attached(12);
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.name);
+        const std::uint32_t cache = Handle(writer, std::string("cache ") + c.name);
+        for (const Step& step : c.writes) {
+            const std::vector<std::uint8_t> bytes = ContractBytes(step.bytes);
+            ASSERT_EQ(0, Write(writer, cache, step.action, step.withBytes ? &bytes : nullptr));
+        }
+        Run();
+        reader.sink->Clear();
+        ASSERT_EQ(0, Request(reader, cache, CACHE_REQUEST_RETRIEVE));
+        Run();
+        const std::vector<ArmEvent> got = reader.sink->Named("SharedDataReceivedEx");
+        ASSERT_EQ(c.expected.size(), got.size());
+        for (std::size_t i = 0; i < got.size(); ++i) {
+            EXPECT_EQ(reader.ape, got[i].apeHandle);
+            EXPECT_EQ(cache, got[i].entityId);
+            EXPECT_EQ(c.expected[i].action, got[i].action);
+            EXPECT_EQ(c.expected[i].result, got[i].result);
+            EXPECT_EQ(c.expected[i].data, Text(got[i].data));
+            EXPECT_EQ(c.expected[i].data.empty(), got[i].memHandle == 0);
+            if (!c.expected[i].data.empty()) {
+                EXPECT_EQ(writer.userId, got[i].userId);
+            }
+            if (i > 0) {
+                EXPECT_LT(got[i - 1].cacheId, got[i].cacheId);
+            }
+        }
+    }
+}
+
+TEST_P(ConferenceContract, DeliveredMemoryHandlesLiveForTheCallbackOnly) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    const std::uint32_t cache = Handle(a, "70001_Chat_User_Info");
+    ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_SUBSCRIBE));
+    const std::vector<std::uint8_t> info = ContractBytes("<user/>");
+    ASSERT_EQ(0, Write(a, cache, CACHE_APPEND, &info));
+    Run();
+    const std::vector<ArmEvent> got = b.sink->Named("SharedDataReceivedEx");
+    ASSERT_EQ(1u, got.size());
+    EXPECT_TRUE(got[0].memReadable);
+    EXPECT_EQ(info, got[0].data);
+    std::uint32_t size = 0;
+    EXPECT_NE(0, b.client->GetMemHandleSize(got[0].memHandle, &size));
+}
+
+TEST_P(ConferenceContract, MemoryHandlesAreCheckedAndBounded) {
+    ContractParticipant& a = Attached(11);
+    IArmClient& client = *a.client;
+    std::uint32_t mem = 0, size = 0;
+    ASSERT_EQ(0, client.AllocMemHandle(4, &mem));
+    ASSERT_EQ(0, client.GetMemHandleSize(mem, &size));
+    EXPECT_EQ(4u, size);
+    char buffer[16] = {};
+    size = 4;
+    ASSERT_EQ(0, client.WriteMemHandle(mem, 0, "abcd", &size));
+    size = sizeof buffer;
+    const int read = client.ReadMemHandle(mem, 0, buffer, &size);
+    EXPECT_TRUE(read != 0 || (size == 4 && std::memcmp(buffer, "abcd", 4) == 0));
+
+    // Past the block: refused or clipped, never written beyond it.
+    size = 10;
+    const int write = client.WriteMemHandle(mem, 2, "0123456789", &size);
+    EXPECT_TRUE(write != 0 || size <= 2);
+    size = 0;
+    ASSERT_EQ(0, client.GetMemHandleSize(mem, &size));
+    EXPECT_EQ(4u, size);
+    size = 4;
+    EXPECT_TRUE(client.ReadMemHandle(mem, 9, buffer, &size) != 0 || size == 0);
+
+    ASSERT_EQ(0, client.FreeMemHandle(mem));
+    size = 4;
+    EXPECT_NE(0, client.GetMemHandleSize(mem, &size));
+    EXPECT_NE(0, client.ReadMemHandle(mem, 0, buffer, &size));
+    EXPECT_NE(0, client.WriteMemHandle(mem, 0, "ab", &size));
+    EXPECT_NE(0, client.FreeMemHandle(mem));
+    EXPECT_NE(0, client.FreeMemHandle(0));
+}
+
+TEST_P(ConferenceContract, NothingReachesAParticipantAfterRelease) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    ASSERT_EQ(0, Enroll(a, "alpha"));
+    ASSERT_EQ(0, Enroll(b, "beta"));
+    const std::uint32_t cache = Handle(a, "70001_chat_cache_15");
+    ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_SUBSCRIBE));
+    Run();
+    b.sink->Clear();
+    a.sink->Clear();
+
+    // Answers already on their way to b are dropped with it.
+    const std::vector<std::uint8_t> line = ContractBytes("line");
+    ASSERT_EQ(0, Write(a, cache, CACHE_APPEND, &line));
+    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.userId, 1, "hi", 2, 1, 1));
+    ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_RETRIEVE));
+    Release(b);
+    Run();
+    EXPECT_TRUE(b.sink->Events().empty());
+    EXPECT_EQ(std::vector<std::string>({"-" + std::to_string(kSession) + Entry(b, "beta")}),
+              Rosters(a));
+    EXPECT_EQ(1u, a.sink->Count("ApeCacheActionConfirmEx"));
+    EXPECT_NE(0, a.client->ApeSendData(a.ape, b.userId, 1, "hi", 2, 1, 1));
+}
+
+TEST_P(ConferenceContract, ReleaseInsideACallbackStopsTheRest) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    const std::uint32_t cache = Handle(a, "70001_chat_cache_15");
+    for (const char* text : {"x", "y", "z"}) {
+        const std::vector<std::uint8_t> bytes = ContractBytes(text);
+        ASSERT_EQ(0, Write(a, cache, CACHE_APPEND, &bytes));
+    }
+    Run();
+    b.sink->SetHook([this, &b](const ArmEvent& event) {
+        if (event.name == "SharedDataReceivedEx") Release(b);
+    });
+    ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_RETRIEVE));
+    Run();
+    EXPECT_EQ(1u, b.sink->Count("SharedDataReceivedEx"));
+}
+
+TEST_P(ConferenceContract, DetachDropsAnswersAlreadyPosted) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    ASSERT_EQ(0, Enroll(b, "beta"));
+    Run();
+    b.sink->Clear();
+    ASSERT_EQ(0, Enroll(a, "alpha"));
+    ASSERT_EQ(0, a.client->ApeDetach(a.ape));
+    Run();
+    EXPECT_TRUE(a.sink->Events().empty());
+    const std::string s = std::to_string(kSession);
+    EXPECT_EQ(std::vector<std::string>({"+" + s + Entry(a, "alpha"), "-" + s + Entry(a, "alpha")}),
+              Rosters(b));
+}

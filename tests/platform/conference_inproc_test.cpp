@@ -1,0 +1,402 @@
+// The in-process conference: the contract suite on the virtual clock, and the fault
+// injection, refusals and choices that belong to this implementation.
+#include <algorithm>
+#include <cstring>
+
+#include "platform/conference_results.h"
+#include "platform/inproc_conference.h"
+#include "platform/virtual_run_loop.h"
+#include "tests/platform/conference_contract.h"
+
+namespace {
+
+// Every participant on a virtual loop of its own.
+class InProcessHarness final : public ConferenceHarness {
+public:
+    IArmClient* NewClient(std::uint32_t nodeId) override {
+        m_loops.push_back(std::make_unique<VirtualRunLoop>());
+        return m_conference.CreateClient(*m_loops.back(), nodeId);
+    }
+    std::uint16_t ConferenceId() const override { return m_conference.ConferenceId(); }
+    void RunUntilIdle() override {
+        std::size_t ran = 0;
+        do {
+            ran = 0;
+            for (const auto& loop : m_loops)
+                ran += loop->RunUntilIdle();
+        } while (ran > 0);
+    }
+
+private:
+    InProcessConference m_conference{5};
+    std::vector<std::unique_ptr<VirtualRunLoop>> m_loops;
+};
+
+INSTANTIATE_TEST_SUITE_P(
+    InProcess, ConferenceContract,
+    testing::Values(ConferenceHarnessFactory{"OnVirtualClock",
+                                             [] { return std::make_unique<InProcessHarness>(); }}),
+    [](const testing::TestParamInfo<ConferenceHarnessFactory>& info) { return info.param.name; });
+
+constexpr std::uint32_t kSession = 3;
+constexpr std::uint16_t kConference = 1;
+
+// Participants sharing one virtual loop, with the in-process object's own controls at hand.
+class InProcessConferenceTest : public testing::Test {
+protected:
+    struct Member {
+        InProcessArmClient* client;
+        std::unique_ptr<ArmRecorder> sink;
+        std::uint32_t ape = 0;
+    };
+
+    Member& Connected(std::uint32_t nodeId) {
+        Member& m = m_members.emplace_back();
+        m.client = m_conference.CreateClient(m_loop, nodeId);
+        m.sink = std::make_unique<ArmRecorder>(m.client);
+        EXPECT_EQ(0, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
+        m_loop.RunUntilIdle();
+        return m;
+    }
+    Member& Attached(std::uint32_t nodeId) {
+        Member& m = Connected(nodeId);
+        EXPECT_EQ(0, m.client->ConferenceJoin(0, kConference, m.sink.get(), 3));
+        EXPECT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &m.ape));
+        m_loop.RunUntilIdle();
+        m.sink->Clear();
+        return m;
+    }
+    int Enroll(Member& m, const char* payload) {
+        ARMSessionResource resource{1, "c_session_id", 1, 0, 0};
+        return m.client->ApeEnroll(m.ape, 1, kSession, 0, 1, &resource, payload,
+                                   static_cast<std::uint32_t>(std::strlen(payload)), 3);
+    }
+    std::uint32_t Handle(Member& m, const char* name) {
+        NameHandle entry{};
+        std::memcpy(entry.name, name, std::min(std::strlen(name), sizeof entry.name));
+        EXPECT_EQ(0, m.client->AllocNameHandle(m.ape, 1, &entry, m.sink.get()));
+        m_loop.RunUntilIdle();
+        const std::vector<ArmEvent> confirms = m.sink->Named("AllocNameHandleConfirm");
+        m.sink->Clear();
+        return confirms.empty() ? 0 : confirms.back().handles.at(0).handle_value;
+    }
+    int Append(Member& m, std::uint32_t cache, const char* text) {
+        std::uint32_t mem = 0, size = static_cast<std::uint32_t>(std::strlen(text));
+        EXPECT_EQ(0, m.client->AllocMemHandle(size, &mem));
+        EXPECT_EQ(0, m.client->WriteMemHandle(mem, 0, text, &size));
+        const int result =
+            m.client->ApeSharedDataActionEx(m.ape, cache, 0, 0, CACHE_APPEND, 0x2000000, mem, 0, 1);
+        m.client->FreeMemHandle(mem);
+        return result;
+    }
+
+    VirtualRunLoop m_loop;
+    InProcessConference m_conference{kConference};
+    std::deque<Member> m_members;
+};
+
+}  // namespace
+
+TEST_F(InProcessConferenceTest, FailedCallsReturnTheChosenResultAndDoNothing) {
+    Member& a = Attached(11);
+    a.client->FailNext(ArmOperation::ApeEnroll, 1);
+    EXPECT_EQ(1, Enroll(a, "x"));
+    m_loop.RunUntilIdle();
+    EXPECT_TRUE(a.sink->Events().empty());
+    EXPECT_EQ(0, Enroll(a, "x"));
+
+    std::uint32_t mem = 0;
+    a.client->FailNext(ArmOperation::AllocMemHandle, 7, 2);
+    EXPECT_EQ(7, a.client->AllocMemHandle(4, &mem));
+    EXPECT_EQ(7, a.client->AllocMemHandle(4, &mem));
+    EXPECT_EQ(0u, a.client->MemHandleCount());
+    EXPECT_EQ(0, a.client->AllocMemHandle(4, &mem));
+
+    a.client->FailAlways(ArmOperation::ApeSendData, 9);
+    for (int i = 0; i < 3; ++i)
+        EXPECT_EQ(9, a.client->ApeSendData(a.ape, 1001, 1, "x", 1, 1, 1));
+    a.client->ClearFaults();
+    EXPECT_EQ(0, a.client->ApeSendData(a.ape, a.client->UserId(), 1, "x", 1, 1, 1));
+
+    // A result of 0 claims success, but no answer ever comes.
+    Member& b = m_members.emplace_back();
+    b.client = m_conference.CreateClient(m_loop, 12);
+    b.sink = std::make_unique<ArmRecorder>(b.client);
+    b.client->FailNext(ArmOperation::Connect, 0);
+    EXPECT_EQ(0, b.client->Connect(b.sink.get(), "b", 0, 0, 0));
+    m_loop.RunUntilIdle();
+    EXPECT_EQ(0u, b.sink->Count("ConnectConfirm"));
+}
+
+TEST_F(InProcessConferenceTest, ConnectRetriesEndWhenTheInjectedResultsRunOut) {
+    Member& m = m_members.emplace_back();
+    m.client = m_conference.CreateClient(m_loop, 11);
+    m.sink = std::make_unique<ArmRecorder>(m.client);
+    // Like the component: connect again whenever the confirmation says 19.
+    m.sink->SetHook([&m](const ArmEvent& event) {
+        if (event.name == "ConnectConfirm" && event.result == kArmRetry) {
+            EXPECT_EQ(0, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
+        }
+    });
+    m.client->ConfirmNextWith(ArmConfirmation::ConnectConfirm, kArmRetry, 2);
+    ASSERT_EQ(0, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
+    m_loop.RunUntilIdle();
+    std::vector<short> results;
+    for (const ArmEvent& event : m.sink->Named("ConnectConfirm"))
+        results.push_back(event.result);
+    EXPECT_EQ(std::vector<short>({kArmRetry, kArmRetry, 0}), results);
+    EXPECT_EQ(kArmAlreadyConnected, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
+}
+
+TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect) {
+    Member& a = Attached(11);
+    Member& b = Attached(12);
+    ASSERT_EQ(0, Enroll(b, "b"));
+    m_loop.RunUntilIdle();
+    b.sink->Clear();
+
+    a.client->ConfirmNextWith(ArmConfirmation::ApeEnrollConfirm, 5);
+    ASSERT_EQ(0, Enroll(a, "a"));
+    a.client->ConfirmNextWith(ArmConfirmation::EnrollResourceStatus, 3);
+    ASSERT_EQ(0, Enroll(a, "a"));
+    m_loop.RunUntilIdle();
+    const std::vector<ArmEvent> enrolls = a.sink->Named("ApeEnrollConfirm");
+    ASSERT_EQ(2u, enrolls.size());
+    EXPECT_EQ(5, enrolls[0].result);
+    EXPECT_EQ(0, enrolls[1].result);
+    ASSERT_EQ(1u, enrolls[1].resources.size());
+    EXPECT_EQ(3, enrolls[1].resources[0].wStatus);
+    EXPECT_EQ(0u, enrolls[1].resources[0].dwValue);
+    EXPECT_EQ(0u, a.sink->Count("ApeRosterChanged"));
+    EXPECT_TRUE(b.sink->Events().empty());
+
+    const std::uint32_t cache = Handle(a, "70001_chat_status");
+    ASSERT_EQ(0, b.client->ApeRequestSharedDataEx(b.ape, cache, 0, CACHE_REQUEST_SUBSCRIBE, 255,
+                                                  b.sink.get()));
+    a.client->ConfirmNextWith(ArmConfirmation::ApeCacheActionConfirmEx, 7);
+    ASSERT_EQ(0, Append(a, cache, "1"));
+    a.client->ConfirmNextWith(ArmConfirmation::AllocNameHandleConfirm, 6);
+    NameHandle entry{};
+    std::strcpy(entry.name, "70001_chat_cache_1");
+    ASSERT_EQ(0, a.client->AllocNameHandle(a.ape, 1, &entry, a.sink.get()));
+    ASSERT_EQ(0, b.client->ApeRequestSharedDataEx(b.ape, cache, 0, CACHE_REQUEST_RETRIEVE, 255,
+                                                  b.sink.get()));
+    m_loop.RunUntilIdle();
+    const std::vector<ArmEvent> action = a.sink->Named("ApeCacheActionConfirmEx");
+    ASSERT_EQ(1u, action.size());
+    EXPECT_EQ(7, action[0].result);
+    const std::vector<ArmEvent> handles = a.sink->Named("AllocNameHandleConfirm");
+    ASSERT_EQ(1u, handles.size());
+    EXPECT_EQ(6, handles[0].result);
+    EXPECT_EQ(0u, handles[0].handles.at(0).handle_value);
+    // The refused append left the cache never set: the subscriber saw nothing of it.
+    const std::vector<ArmEvent> got = b.sink->Named("SharedDataReceivedEx");
+    ASSERT_EQ(1u, got.size());
+    EXPECT_EQ(kArmRetry, got[0].result);
+}
+
+TEST_F(InProcessConferenceTest, RefusedJoinAndAttachLeaveTheStateUnchanged) {
+    Member& m = Connected(11);
+    m.client->ConfirmNextWith(ArmConfirmation::ConferenceJoinConfirm, 2);
+    ASSERT_EQ(0, m.client->ConferenceJoin(0, kConference, m.sink.get(), 3));
+    std::uint32_t ape = 77;
+    EXPECT_EQ(kArmNotJoined, m.client->ApeAttach(m.sink.get(), 0, kConference, &ape));
+    ASSERT_EQ(0, m.client->ConferenceJoin(0, kConference, m.sink.get(), 3));
+    m.client->ConfirmNextWith(ArmConfirmation::ApeAttachConfirm, 4);
+    ASSERT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &ape));
+    EXPECT_EQ(0u, ape);
+    m_loop.RunUntilIdle();
+    const std::vector<ArmEvent> joins = m.sink->Named("ConferenceJoinConfirm");
+    ASSERT_EQ(2u, joins.size());
+    EXPECT_EQ(2, joins[0].result);
+    EXPECT_EQ(0, joins[1].result);
+    const std::vector<ArmEvent> attach = m.sink->Named("ApeAttachConfirm");
+    ASSERT_EQ(1u, attach.size());
+    EXPECT_EQ(4, attach[0].result);
+    EXPECT_EQ(0u, m.client->ApeHandle());
+    ASSERT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &ape));
+    EXPECT_NE(0u, ape);
+}
+
+TEST_F(InProcessConferenceTest, InjectedDeliveriesArriveExactlyAsCrafted) {
+    Member& m = Attached(11);
+    ASSERT_EQ(0, m.client->RegisterSharedDataSink(m.ape, m.sink.get()));
+    const std::vector<std::uint8_t> notAPdu = {0xde, 0xad, 0x00, 0xbe};
+    EXPECT_TRUE(m.client->InjectPrivateData(4242, notAPdu));
+
+    ArmCacheDelivery delivery;
+    delivery.cacheId = 9;
+    delivery.entityId = 50123;
+    delivery.result = kArmRetry;
+    delivery.action = CACHE_REPLY_LAST;
+    delivery.senderId = 4242;
+    delivery.value = 0x90;
+    delivery.flags = 3;
+    EXPECT_TRUE(m.client->InjectCacheDelivery(delivery, notAPdu));
+    EXPECT_TRUE(m.client->InjectCacheDelivery(delivery, std::nullopt));
+
+    RosterChange change;
+    change.added.push_back({kSession, {{21, 2001, {'a'}}, {22, 2002, {}}}});
+    change.added.push_back({kSession + 9, {{23, 2003, {'c'}}}});
+    change.modified.push_back({kSession, {{21, 2001, {'m'}}}});
+    EXPECT_TRUE(m.client->InjectRosterChange(change));
+    EXPECT_TRUE(m.sink->Events().empty());
+    m_loop.RunUntilIdle();
+
+    ASSERT_EQ(std::vector<std::string>({"ApeDataIndication", "SharedDataReceivedEx",
+                                        "SharedDataReceivedEx", "ApeRosterChanged"}),
+              m.sink->Names());
+    const std::vector<ArmEvent>& events = m.sink->Events();
+    EXPECT_EQ(4242u, events[0].userId);
+    EXPECT_EQ(notAPdu, events[0].data);
+    for (int i : {1, 2}) {
+        EXPECT_EQ(m.ape, events[i].apeHandle);
+        EXPECT_EQ(9u, events[i].cacheId);
+        EXPECT_EQ(50123u, events[i].entityId);
+        EXPECT_EQ(kArmRetry, events[i].result);
+        EXPECT_EQ(CACHE_REPLY_LAST, events[i].action);
+        EXPECT_EQ(4242u, events[i].userId);
+        EXPECT_EQ(0x90u, events[i].value);
+        EXPECT_EQ(3, events[i].flags);
+    }
+    EXPECT_EQ(notAPdu, events[1].data);
+    EXPECT_EQ(0u, events[2].memHandle);
+    const RosterChange& roster = events[3].roster;
+    ASSERT_EQ(2u, roster.added.size());
+    EXPECT_EQ(kSession + 9, roster.added[1].sessionId);
+    ASSERT_EQ(2u, roster.added[0].users.size());
+    EXPECT_EQ(2002u, roster.added[0].users[1].userId);
+    EXPECT_TRUE(roster.added[0].users[1].enrollInfo.empty());
+    EXPECT_TRUE(roster.deleted.empty());
+    ASSERT_EQ(1u, roster.modified.size());
+    EXPECT_EQ(std::vector<std::uint8_t>({'m'}), roster.modified[0].users[0].enrollInfo);
+    EXPECT_EQ(0u, m.client->MemHandleCount());
+
+    InProcessArmClient* detached = Connected(12).client;
+    EXPECT_FALSE(detached->InjectPrivateData(1, notAPdu));
+    EXPECT_FALSE(detached->InjectCacheDelivery(delivery, notAPdu));
+    EXPECT_FALSE(detached->InjectRosterChange(change));
+}
+
+TEST_F(InProcessConferenceTest, RequestsOutsideTheirStateAreRefused) {
+    Member& fresh = m_members.emplace_back();
+    fresh.client = m_conference.CreateClient(m_loop, 10);
+    fresh.sink = std::make_unique<ArmRecorder>();
+    EXPECT_EQ(kArmNotConnected, fresh.client->ConferenceJoin(0, kConference, fresh.sink.get(), 3));
+    Member& a = Connected(11);
+    EXPECT_EQ(kArmNoSuchConference, a.client->ConferenceJoin(0, 99, a.sink.get(), 3));
+    EXPECT_EQ(kArmNotJoined, a.client->ConferenceLeave(0, kConference, a.sink.get()));
+    Member& b = Attached(12);
+    const std::uint32_t cache = Handle(b, "70001_chat_cache_15");
+    std::uint32_t mem = 0;
+    ASSERT_EQ(0, a.client->AllocMemHandle(2, &mem));
+    const struct {
+        const char* what;
+        int result;
+        int expected;
+    } cases[] = {
+        {"enroll with another ape handle",
+         b.client->ApeEnroll(b.ape + 1, 1, kSession, 0, 0, nullptr, nullptr, 0, 3),
+         kArmBadApeHandle},
+        {"enroll with resources missing",
+         b.client->ApeEnroll(b.ape, 1, kSession, 0, 1, nullptr, nullptr, 0, 3),
+         kArmInvalidArgument},
+        {"send with a foreign ape", b.client->ApeSendData(b.ape + 1, 1001, 1, "x", 1, 1, 1),
+         kArmBadApeHandle},
+        {"write to an unknown cache",
+         b.client->ApeSharedDataActionEx(b.ape, cache + 1000, 0, 0, CACHE_SET, 0, 0, 0, 1),
+         kArmUnknownHandle},
+        {"append without bytes",
+         b.client->ApeSharedDataActionEx(b.ape, cache, 0, 0, CACHE_APPEND, 0, 0, 0, 1),
+         kArmInvalidArgument},
+        {"another object's memory handle",
+         b.client->ApeSharedDataActionEx(b.ape, cache, 0, 0, CACHE_SET, 0, mem, 0, 1),
+         kArmUnknownHandle},
+        {"an action that is an answer",
+         b.client->ApeSharedDataActionEx(b.ape, cache, 0, 0, CACHE_REPLY_LAST, 0, 0, 0, 1),
+         kArmInvalidArgument},
+        {"request type 3",
+         b.client->ApeRequestSharedDataEx(b.ape, cache, 0, static_cast<tagCacheRequestType>(3), 255,
+                                          b.sink.get()),
+         kArmInvalidArgument},
+        {"retrieve without any sink",
+         b.client->ApeRequestSharedDataEx(b.ape, cache, 0, CACHE_REQUEST_RETRIEVE, 255, nullptr),
+         kArmInvalidArgument},
+        {"send option of another ape",
+         [&] {
+             const ARMSendOption option{b.ape + 1, 0x90};
+             return b.client->SetSendOption(-200, &option);
+         }(),
+         kArmBadApeHandle},
+        {"oversized block", b.client->AllocMemHandle(kArmMaxDataLength + 1, &mem), kArmTooLarge},
+    };
+    for (const auto& c : cases)
+        EXPECT_EQ(c.expected, c.result) << c.what;
+}
+
+TEST_F(InProcessConferenceTest, MemoryReadsAndWritesAreClippedAtTheBlock) {
+    Member& m = Connected(11);
+    std::uint32_t mem = 0, size = 4;
+    ASSERT_EQ(0, m.client->AllocMemHandle(4, &mem));
+    ASSERT_EQ(0, m.client->WriteMemHandle(mem, 0, "abcd", &size));
+    size = 10;
+    EXPECT_EQ(0, m.client->WriteMemHandle(mem, 2, "0123456789", &size));
+    EXPECT_EQ(2u, size);
+    char buffer[10] = {};
+    size = 10;
+    EXPECT_EQ(0, m.client->ReadMemHandle(mem, 1, buffer, &size));
+    EXPECT_EQ(3u, size);
+    EXPECT_EQ("b01", std::string(buffer, size));
+    size = 1;
+    EXPECT_EQ(0, m.client->ReadMemHandle(mem, 4, buffer, &size));
+    EXPECT_EQ(0u, size);
+    size = 1;
+    EXPECT_EQ(kArmOutOfRange, m.client->ReadMemHandle(mem, 5, buffer, &size));
+    EXPECT_EQ(0u, size);
+    EXPECT_EQ(kArmInvalidArgument, m.client->ReadMemHandle(mem, 0, buffer, nullptr));
+}
+
+TEST_F(InProcessConferenceTest, SendOptionMarksTheNextSendOnly) {
+    Member& a = Attached(11);
+    Member& b = Attached(12);
+    const ARMSendOption option{a.ape, 0x92};
+    ASSERT_EQ(0, a.client->SetSendOption(-200, &option));
+    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.client->UserId(), 1, "1", 1, 1, 1));
+    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.client->UserId(), 1, "2", 1, 1, 1));
+    m_loop.RunUntilIdle();
+    const std::vector<ArmEvent> got = b.sink->Named("ApeDataIndication");
+    ASSERT_EQ(2u, got.size());
+    EXPECT_EQ(0x92, got[0].flags);
+    EXPECT_EQ(0, got[1].flags);
+}
+
+TEST_F(InProcessConferenceTest, DestroyAndReleaseEndEverythingQuietly) {
+    Member& a = Attached(11);
+    Member& b = Attached(12);
+    ASSERT_EQ(0, Enroll(a, "a"));
+    ASSERT_EQ(0, Enroll(b, "b"));
+    m_loop.RunUntilIdle();
+    b.sink->Clear();
+    ASSERT_EQ(0, a.client->ApeSendData(a.ape, a.client->UserId(), 1, "x", 1, 1, 1));
+    a.sink->Clear();
+    ASSERT_EQ(0, a.client->Destroy(a.sink.get(), 1));
+    m_loop.RunUntilIdle();
+    EXPECT_TRUE(a.sink->Events().empty());
+    EXPECT_EQ(1u, b.sink->Count("ApeRosterChanged"));
+    EXPECT_EQ(0u, a.client->ApeHandle());
+    EXPECT_EQ(kArmNotConnected, a.client->ConferenceJoin(0, kConference, a.sink.get(), 3));
+
+    EXPECT_EQ(2u, m_conference.ClientCount());
+    EXPECT_EQ(0, a.client->Release());
+    EXPECT_EQ(1u, m_conference.ClientCount());
+
+    // A conference that ends with answers still posted delivers none of them.
+    ArmRecorder late;
+    {
+        InProcessConference gone(kConference);
+        InProcessArmClient* client = gone.CreateClient(m_loop, 13);
+        ASSERT_EQ(0, client->Connect(&late, "late", 0, 0, 0));
+    }
+    EXPECT_GT(m_loop.RunUntilIdle(), 0u);
+    EXPECT_TRUE(late.Events().empty());
+}
