@@ -1,0 +1,56 @@
+// CChatContentStorage: the transcript store. Every shown chat line is kept with its time,
+// in two parallel sequences whose index i pairs time i with line i.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+// A calendar time as the transcript keeps it; valid is 1 when it was filled from the clock.
+struct DateTimeRec {
+    std::uint16_t year;
+    std::uint16_t month;   // 1 to 12
+    std::uint16_t day;     // 1 to 31
+    std::uint16_t hour;    // 0 to 23
+    std::uint16_t minute;  // 0 to 59
+    std::uint16_t second;  // 0 to 59
+    std::uint16_t valid;
+};
+
+// One whole transcript entry: a time and its line.
+struct ChatEntry {
+    DateTimeRec time;
+    std::string line;
+};
+
+class CChatContentStorage {
+public:
+    CChatContentStorage() = default;
+    CChatContentStorage(const CChatContentStorage&) = delete;
+    CChatContentStorage& operator=(const CChatContentStorage&) = delete;
+
+    // Appends a new line made of the header followed by one TAB.
+    void InsertNewLine(const std::string& header);
+    // Appends text to the last line; does nothing while there is no line.
+    void ModifyLatestLineByAdd(const std::string& text);
+    // Appends a time.
+    void InsertTime(const DateTimeRec& time);
+    // Appends every entry, each time with its line, in order; the lines are moved out.
+    void AppendEntries(std::vector<ChatEntry>&& entries);
+
+    // The time at index, or an all-zero record when index is out of range.
+    DateTimeRec GetTimeAt(std::size_t index) const;
+    // The line at index, or an empty string when index is out of range.
+    const std::string& GetLineAtIndex(std::size_t index) const;
+
+    std::size_t GetTimeCount() const { return m_times.size(); }
+    std::size_t GetLineCount() const { return m_lines.size(); }
+
+    // Forgets every time and line.
+    void Clear();
+
+private:
+    std::vector<DateTimeRec> m_times;
+    std::vector<std::string> m_lines;
+};
