@@ -28,7 +28,8 @@ struct RosterChange {
 };
 
 // Lays out a RosterChange as back-to-back ARMApeRoster records (added, deleted, modified)
-// whose user entries point into the change; the change must outlive the batch.
+// whose user entries point into the change; the change must outlive the batch. An empty
+// enroll payload is handed out as a null pointer with length 0.
 class RosterBatch {
 public:
     explicit RosterBatch(const RosterChange& change);

@@ -1,15 +1,16 @@
 // One participant's service object on an InProcessConference. It answers every request with a
-// callback posted to its run loop and delivers nothing more once released, detached (ape
-// callbacks), left (conference callbacks) or destroyed (all callbacks), not even callbacks
-// already posted. Tests can make requests fail, make confirmations carry chosen results and
-// inject crafted deliveries.
+// callback posted to its run loop and delivers nothing more once released, detached (the ape,
+// shared-data and handle callbacks), left (conference callbacks and, with the attachment, the
+// ape ones) or destroyed (all callbacks), not even callbacks already posted. Tests can make
+// requests fail, make confirmations carry chosen results and inject crafted deliveries.
 //
 // Choices the contract leaves open: ConnectConfirm carries the node id as its value; an
 // ApeDataIndication carries value 0 and, as flags, the option SetSendOption set for that send;
 // SharedDataReceivedEx carries the writer's action flags as value and flags 0; ApeRosterChanged
 // carries the receiver's ape handle as service id and value 0; retrievals deliver every item
-// whatever their item limit. A confirmation with a non-zero result means the request did not
-// take effect.
+// whatever their item limit; an unsubscribe stops the deliveries of later actions, while those
+// of earlier actions are already on their way; ApeEnroll with enroll 0 leaves the session. A
+// confirmation with a non-zero result means the request did not take effect.
 #pragma once
 
 #include <cstdint>
