@@ -180,10 +180,11 @@ TEST_P(ConferenceContract, EnrollGrantsOneSessionValuePerSession) {
         EXPECT_EQ(p->ape, confirms[0].apeHandle);
         EXPECT_EQ(0, confirms[0].result);
         ASSERT_EQ(1u, confirms[0].resources.size());
-        EXPECT_EQ(kSessionResource, confirms[0].resourceNames[0]);
-        EXPECT_EQ(0, confirms[0].resources[0].wStatus);
-        EXPECT_NE(0u, confirms[0].resources[0].dwValue);
-        values.push_back(confirms[0].resources[0].dwValue);
+        const RecordedResource& resource = confirms[0].resources[0];
+        EXPECT_EQ(kSessionResource, resource.name);
+        EXPECT_EQ(0, resource.status);
+        EXPECT_NE(0u, resource.value);
+        values.push_back(resource.value);
         // The confirmation comes before any roster change.
         EXPECT_EQ("ApeEnrollConfirm", p->sink->Names().front());
     }

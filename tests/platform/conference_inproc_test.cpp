@@ -165,8 +165,8 @@ TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect
     EXPECT_EQ(5, enrolls[0].result);
     EXPECT_EQ(0, enrolls[1].result);
     ASSERT_EQ(1u, enrolls[1].resources.size());
-    EXPECT_EQ(3, enrolls[1].resources[0].wStatus);
-    EXPECT_EQ(0u, enrolls[1].resources[0].dwValue);
+    EXPECT_EQ(3, enrolls[1].resources[0].status);
+    EXPECT_EQ(0u, enrolls[1].resources[0].value);
     EXPECT_EQ(0u, a.sink->Count("ApeRosterChanged"));
     EXPECT_TRUE(b.sink->Events().empty());
 

@@ -124,10 +124,10 @@ int ArmRecorder::ApeEnrollConfirm(std::uint32_t apeHandle, short result, short r
     ArmEvent event = Event("ApeEnrollConfirm", apeHandle, result);
     event.value = static_cast<std::uint32_t>(resourceNumber);
     for (short i = 0; i < resourceNumber && resources != nullptr; ++i) {
-        ARMSessionResource copy = resources[i];
-        event.resourceNames.emplace_back(copy.pszName == nullptr ? "" : copy.pszName);
-        copy.pszName = nullptr;
-        event.resources.push_back(copy);
+        const ARMSessionResource resource = resources[i];
+        event.resources.push_back({resource.pszName == nullptr ? "" : resource.pszName,
+                                   resource.wResourceType, resource.dwCount, resource.dwValue,
+                                   resource.wStatus});
     }
     return Record(std::move(event));
 }

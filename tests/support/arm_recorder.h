@@ -11,6 +11,15 @@
 #include "platform/arm_service.h"
 #include "platform/conference_roster.h"
 
+// A session resource as a confirmation filled it (unpacked, so tests can compare its fields).
+struct RecordedResource {
+    std::string name;
+    std::uint16_t type = 0;
+    std::uint32_t count = 0;
+    std::uint32_t value = 0;
+    std::uint16_t status = 0;
+};
+
 // One recorded callback. Fields a callback does not have keep their defaults.
 struct ArmEvent {
     std::string name;  // the callback, e.g. "ApeAttachConfirm"; the conference sink's roster
@@ -28,8 +37,7 @@ struct ArmEvent {
     std::vector<std::uint8_t> data;  // private data, or the delivered memory handle's bytes
     bool memReadable = false;        // the delivered memory handle could be read
     std::vector<NameHandle> handles;
-    std::vector<ARMSessionResource> resources;  // pszName cleared; see resourceNames
-    std::vector<std::string> resourceNames;
+    std::vector<RecordedResource> resources;
     RosterChange roster;
 };
 
