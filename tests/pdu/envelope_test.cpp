@@ -1,0 +1,125 @@
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "pdu/group_info_pdu.h"
+#include "pdu/group_message_pdu.h"
+#include "pdu/kvo_chat_xml_pdu.h"
+
+namespace {
+
+std::string WithType(const std::string& type) {
+    return "<chat ver=\"1.0\"><mtype>" + type + "</mtype></chat>";
+}
+
+const char kGroupMessageBody[] =
+    "<mtype>3</mtype><sendid>1</sendid><groupid>15</groupid><message><![CDATA[hi]]></message>";
+
+}  // namespace
+
+TEST(Envelope, PduTypeIsTheMainTypeFrom1To11AndElse0) {
+    const CKvoChatXMLPDU pdu;
+    for (int type = 0; type <= 12; ++type) {
+        const int expected = type >= 1 && type <= 11 ? type : 0;
+        EXPECT_EQ(pdu.GetPDUType(WithType(std::to_string(type))), expected) << type;
+    }
+    const struct {
+        const char* text;
+        int type;
+    } cases[] = {
+        {"", 0},
+        {"this is not xml", 0},
+        {"<chats ver=\"1.0\"><mtype>3</mtype></chats>", 0},
+        {"<x><chat ver=\"1.0\"><mtype>3</mtype></chat></x>", 0},
+        {"<chat ver=\"1.0\"><mtype>3</mtype>", 0},
+        {"<chat ver=\"1.0\"></chat>", 0},
+        {"<chat ver=\"1.0\"><mtype></mtype></chat>", 0},
+        {"<chat ver=\"1.0\"><mtype>-1</mtype></chat>", 0},
+        {"<chat ver=\"2.0\"><mtype>3</mtype></chat>", 3},
+        {"<chat><mtype>4</mtype></chat>", 4},
+        {"<!-- note --><chat ver=\"1.0\"><mtype>5</mtype></chat>", 5},
+    };
+    for (const auto& c : cases)
+        EXPECT_EQ(pdu.GetPDUType(c.text), c.type) << c.text;
+}
+
+TEST(Envelope, OnlyVersionOnePointZeroPassesTheCheck) {
+    const struct {
+        const char* attribute;
+        int result;
+        uint32_t version;
+    } cases[] = {
+        {" ver=\"1.0\"", 1, 1u},
+        {" ver=\"1.00\"", 0, 1u},
+        {" ver=\"2.0\"", 0, 2u},
+        {" ver=\"\"", 0, 0u},
+        {"", 0, 1u},  // no "ver": the version stays as it was
+    };
+    for (const auto& c : cases) {
+        CGroupMessagePDU pdu;
+        const std::string text =
+            std::string("<chat") + c.attribute + ">" + kGroupMessageBody + "</chat>";
+        EXPECT_EQ(pdu.ParseXMLPDU(text), c.result) << text;
+        EXPECT_EQ(pdu.GetVersion(), c.version) << text;
+    }
+}
+
+TEST(Envelope, AMainTypeWithoutTextIsEmptyAndOnlyMatchesZero) {
+    CGroupMessagePDU pdu;
+    TiXmlElement root("chat");
+    root.SetAttribute("ver", "1.0");
+    root.LinkEndChild(new TiXmlElement("mtype"));
+    TiXmlElement* first = nullptr;
+    EXPECT_FALSE(pdu.CheckVersionAndType(first, &root, XMLPDU_GROUP_MESSAGE));
+    EXPECT_EQ(pdu.GetMainType(), "");
+    EXPECT_EQ(pdu.GetMainType_Int(), 0);
+    EXPECT_EQ(first, root.FirstChildElement("mtype"));
+    EXPECT_TRUE(pdu.CheckVersionAndType(first, &root, static_cast<XMLPDUType>(0)));
+}
+
+TEST(Envelope, AnEmptyMainTypeIsWrittenAsAnEmptyElement) {
+    CGroupInfoPDU pdu;
+    pdu.SetMainType("");
+    ASSERT_EQ(pdu.GenerateXMLPDU(), 1);
+    EXPECT_EQ(pdu.ToWireText(), "<chat ver=\"1.0\"><mtype /></chat>");
+}
+
+TEST(Envelope, TheBaseBuildsAndReadsNothing) {
+    CKvoChatXMLPDU pdu(11, 7);
+    EXPECT_EQ(pdu.GetVersion(), 7u);
+    EXPECT_EQ(pdu.GetMainType(), "11");
+    EXPECT_EQ(pdu.GetMainType_Int(), 11);
+    EXPECT_EQ(pdu.GenerateXMLPDU(), 0);
+    EXPECT_EQ(pdu.ToWireText(), "");
+    EXPECT_EQ(pdu.ParseXMLPDU(WithType("11")), 0);
+}
+
+TEST(Envelope, ASecondGenerateOrParseReplacesTheFirst) {
+    CGroupMessagePDU pdu;
+    pdu.SetSendID(1u);
+    pdu.GenerateXMLPDU();
+    pdu.SetSendID(2u);
+    pdu.GenerateXMLPDU();
+    EXPECT_EQ(pdu.ToWireText(), "<chat ver=\"1.0\"><mtype>3</mtype><sendid>2</sendid></chat>");
+
+    const std::string first = std::string("<chat ver=\"1.0\">") + kGroupMessageBody + "</chat>";
+    std::string second = first;
+    second.replace(second.find("hi"), 2, "again");
+    ASSERT_EQ(pdu.ParseXMLPDU(first), 1);
+    ASSERT_EQ(pdu.ParseXMLPDU(second), 1);
+    EXPECT_EQ(pdu.GetMessageContent(), "again");
+    // The document holds the second text only.
+    EXPECT_EQ(pdu.ToWireText(), second);
+}
+
+TEST(Envelope, ReceivedBytesAreReadUpToTheirLengthOnly) {
+    const std::string text = std::string("<chat ver=\"1.0\">") + kGroupMessageBody + "</chat>";
+    // What follows the PDU in memory would break it if it were read.
+    const std::string memory = text + "<broken";
+    CGroupMessagePDU pdu;
+    EXPECT_EQ(pdu.ParseXMLPDU(memory.data(), text.size()), 1);
+    EXPECT_EQ(pdu.GetPDUType(memory.data(), text.size()), 3);
+    EXPECT_EQ(pdu.ParseXMLPDU(memory.data(), memory.size()), 0);
+    EXPECT_EQ(pdu.ParseXMLPDU(memory.data(), 0), 0);
+    EXPECT_EQ(pdu.ParseXMLPDU(nullptr, 5), 0);
+}

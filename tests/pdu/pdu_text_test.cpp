@@ -1,0 +1,67 @@
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "pdu/pdu_text.h"
+
+TEST(PduText, DecimalsKeepTheLow32BitsWhateverTheSign) {
+    const struct {
+        const char* text;
+        uint32_t value;
+    } cases[] = {
+        {"", 0u},
+        {"0", 0u},
+        {"15", 15u},
+        {"4097", 4097u},
+        {"2147483648", 0x80000000u},
+        {"4294967295", 0xFFFFFFFFu},
+        {"-1", 0xFFFFFFFFu},
+        {"-6", 0xFFFFFFFAu},
+        {"+7", 7u},
+        {"4294967296", 0u},
+        {"4294967297", 1u},
+        {"  42", 42u},
+        {"12abc", 12u},
+        {"abc", 0u},
+        {"-", 0u},
+        {"1.0", 1u},
+    };
+    for (const auto& c : cases)
+        EXPECT_EQ(DwordValue(c.text), c.value) << '"' << c.text << '"';
+}
+
+TEST(PduText, NumbersAreWrittenWithoutSignOrLeadingZeros) {
+    EXPECT_EQ(DwordText(0u), "0");
+    EXPECT_EQ(DwordText(0xFFFFFFFFu), "4294967295");
+    EXPECT_EQ(DwordText(static_cast<uint32_t>(-4)), "4294967292");
+    EXPECT_EQ(IntText(-3), "-3");
+}
+
+TEST(PduText, EveryCdataEndMarkerGetsItsBlank) {
+    const struct {
+        const char* in;
+        const char* out;
+    } cases[] = {
+        {"", ""},
+        {"plain", "plain"},
+        {"a]]>b", "a]] >b"},
+        {"]]>", "]] >"},
+        {"]]>]]>", "]] >]] >"},
+        {"]]>x]]>", "]] >x]] >"},
+        {"]]]>>", "]]] >>"},
+        {"]] >", "]] >"},
+        {"]]", "]]"},
+    };
+    for (const auto& c : cases)
+        EXPECT_EQ(ReplaceCdataEndMarkers(c.in), c.out) << c.in;
+}
+
+TEST(PduText, AMegabyteOfMarkersIsWidenedInOnePass) {
+    std::string markers;
+    for (int i = 0; i < 350000; ++i)
+        markers += "]]>";
+    const std::string out = ReplaceCdataEndMarkers(markers);
+    ASSERT_EQ(out.size(), markers.size() / 3 * 4);
+    EXPECT_EQ(out.find("]]>"), std::string::npos);
+    EXPECT_EQ(out.compare(out.size() - 8, 8, "]] >]] >"), 0);
+}
