@@ -1,6 +1,7 @@
 #include "platform/inproc_conference_client.h"
 
 #include <cstring>
+#include <optional>
 #include <string>
 #include <utility>
 
@@ -49,14 +50,20 @@ int InProcessArmClient::Release() {
 
 int InProcessArmClient::Connect(IArmNodeControllerSink* sink, const char* /*userName*/,
                                 std::uint32_t, std::uint32_t, std::uint32_t) {
-    if (const auto fault = Fault(ArmOperation::Connect)) return *fault;
+    // An injected answer that tells how things stand makes them so: "pending" connects and
+    // confirms as usual, "already connected" connects without a confirmation.
+    const std::optional<int> fault = Fault(ArmOperation::Connect);
+    if (fault && *fault != kArmConnectPending) {
+        if (*fault == kArmAlreadyConnected) m_bConnected = true;
+        return *fault;
+    }
     if (sink == nullptr) return kArmInvalidArgument;
     if (m_bConnected) return kArmAlreadyConnected;
     const short result = ConfirmResult(ArmConfirmation::ConnectConfirm);
     m_bConnected = result == 0;
     const std::uint32_t value = m_nodeId;
     Post(Stage::Node, [sink, result, value] { sink->ConnectConfirm(result, value); });
-    return 0;
+    return fault ? *fault : 0;
 }
 
 int InProcessArmClient::Destroy(IArmNodeControllerSink*, int) {
@@ -77,7 +84,11 @@ int InProcessArmClient::SetSendOption(int option, const ARMSendOption* value) {
 
 int InProcessArmClient::ConferenceJoin(std::uint32_t, std::uint16_t conferenceId,
                                        IArmConferenceSink* sink, int) {
-    if (const auto fault = Fault(ArmOperation::ConferenceJoin)) return *fault;
+    if (const auto fault = Fault(ArmOperation::ConferenceJoin)) {
+        // An injected "already joined" leaves the object joined, as it tells the caller.
+        if (*fault == kArmAlreadyJoined) m_bJoined = true;
+        return *fault;
+    }
     if (sink == nullptr) return kArmInvalidArgument;
     if (conferenceId != m_conference.ConferenceId()) return kArmNoSuchConference;
     if (!m_bConnected) return kArmNotConnected;

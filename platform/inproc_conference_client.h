@@ -80,7 +80,9 @@ public:
                       std::uint32_t* size) override;
 
     // The next `times` calls of op return result and do nothing else (result 0: the call
-    // claims success but has no effect, so no answer follows).
+    // claims success but has no effect, so no answer follows). Results that tell how things
+    // stand make them so: Connect 1202 connects and confirms as usual, Connect 1215 leaves
+    // the object connected and ConferenceJoin 1201 leaves it joined, without confirmations.
     void FailNext(ArmOperation op, int result, int times = 1);
     // Every later call of op returns result, until ClearFaults.
     void FailAlways(ArmOperation op, int result);

@@ -128,6 +128,29 @@ TEST_F(InProcessConferenceTest, FailedCallsReturnTheChosenResultAndDoNothing) {
     EXPECT_EQ(0u, b.sink->Count("ConnectConfirm"));
 }
 
+TEST_F(InProcessConferenceTest, InjectedResultsThatTellTheStateMakeItSo) {
+    Member& pending = m_members.emplace_back();
+    pending.client = m_conference.CreateClient(m_loop, 11);
+    pending.sink = std::make_unique<ArmRecorder>(pending.client);
+    pending.client->FailNext(ArmOperation::Connect, kArmConnectPending);
+    EXPECT_EQ(kArmConnectPending, pending.client->Connect(pending.sink.get(), "p", 0, 0, 0));
+    m_loop.RunUntilIdle();
+    EXPECT_EQ(std::vector<std::string>({"ConnectConfirm"}), pending.sink->Names());
+
+    // Told "already connected" and "already joined", a caller goes on to attach at once.
+    Member& m = m_members.emplace_back();
+    m.client = m_conference.CreateClient(m_loop, 12);
+    m.sink = std::make_unique<ArmRecorder>(m.client);
+    m.client->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
+    m.client->FailNext(ArmOperation::ConferenceJoin, kArmAlreadyJoined);
+    EXPECT_EQ(kArmAlreadyConnected, m.client->Connect(m.sink.get(), "m", 0, 0, 0));
+    EXPECT_EQ(kArmAlreadyJoined, m.client->ConferenceJoin(0, kConference, m.sink.get(), 3));
+    ASSERT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &m.ape));
+    m_loop.RunUntilIdle();
+    EXPECT_EQ(std::vector<std::string>({"ApeAttachConfirm"}), m.sink->Names());
+    EXPECT_EQ(kArmAlreadyConnected, m.client->Connect(m.sink.get(), "m", 0, 0, 0));
+}
+
 TEST_F(InProcessConferenceTest, ConnectRetriesEndWhenTheInjectedResultsRunOut) {
     Member& m = m_members.emplace_back();
     m.client = m_conference.CreateClient(m_loop, 11);
