@@ -1,0 +1,260 @@
+// Transcript files: saving the transcript as a time-stamped text file (save, save as, save
+// into a folder), opening such files back into the transcript and the window, the modified
+// flag and the tick's watch over the saved file.
+#include <cstdint>
+#include <memory>
+#include <new>
+#include <string>
+#include <utility>
+
+#include "engine/chat_client.h"
+#include "engine/func_trace.h"
+#include "engine/transcript_format.h"
+#include "platform/file_services.h"
+#include "platform/string_table.h"
+#include "platform/trace.h"
+#include "platform/warning_window.h"
+
+namespace {
+
+// String-table keys of the texts the user sees.
+constexpr const char* kWarningTitleKey = "Korvo Chat";
+constexpr const char* kOpenFailedKey =
+    "Unable to open this chat file, because either the file is damaged or the file format is "
+    "not recognized.";
+constexpr const char* kCannotReplaceKey =
+    "Your cannot replace\"%s\" because you do not have the right privileges.";
+constexpr const char* kSaveFailedKey =
+    "Can't save this file \"%s\". Make sure that the disk or folder you want to save is not "
+    "full, write-protected, or damaged.";
+constexpr const char* kChatFileNameKey = "Chat.txt";
+
+// Warning messages are cut to fit the host's 2048-byte message buffer.
+constexpr std::size_t kMaxWarningBytes = 2047;
+// Bytes gathered before each write while saving.
+constexpr std::size_t kWriteChunkBytes = 256 * 1024;
+
+// The text after the last "/", or the whole path when there is none or it ends the path.
+std::string FileNameOf(const std::string& path) {
+    const std::size_t slash = path.rfind('/');
+    if (slash == std::string::npos || slash + 1 == path.size()) return path;
+    return path.substr(slash + 1);
+}
+
+// The localised message with the file name in place of its "%s"; the name is inserted as
+// it is, never read as a format. Cut at a character boundary to the warning's bound.
+std::string FillFileName(const std::string& format, const std::string& name) {
+    std::string message = format;
+    const std::size_t at = message.find("%s");
+    if (at != std::string::npos) message.replace(at, 2, name);
+    if (message.size() > kMaxWarningBytes) {
+        std::size_t keep = kMaxWarningBytes;
+        while (keep > 0 && (static_cast<unsigned char>(message[keep]) & 0xC0) == 0x80)
+            --keep;
+        message.resize(keep);
+    }
+    return message;
+}
+
+void ShowChatWarning(const std::string& message) {
+    ShowWarningWindow2(GetLocalizedString(kWarningTitleKey).c_str(), message.c_str());
+}
+
+// Reads the whole file at path into bytes; false when any step fails.
+bool ReadWholeFile(FileServices& files, const std::string& path, std::unique_ptr<char[]>* bytes,
+                   std::size_t* size) {
+    OpenFile file(files);
+    std::uint64_t fileSize = 0;
+    if (file.Open(path, kFileRead) != kFileOk) return false;
+    if (files.GetSize(file.Id(), &fileSize) != kFileOk) return false;
+    if (fileSize >= SIZE_MAX) return false;
+    std::unique_ptr<char[]> buffer(new (std::nothrow) char[fileSize]);
+    if (!buffer) return false;
+    if (files.Read(file.Id(), buffer.get(), fileSize) != kFileOk) return false;
+    if (file.Close() != kFileOk) return false;
+    *bytes = std::move(buffer);
+    *size = static_cast<std::size_t>(fileSize);
+    return true;
+}
+
+// Creates name in folder afresh and writes the whole transcript into it. kFileOk only when
+// every byte was written and the file closed cleanly.
+FileResult WriteNewTranscriptFile(FileServices& files, const std::string& folder,
+                                  const std::string& name, const std::string& path,
+                                  const CChatContentStorage& content) {
+    FileResult result = files.Delete(path);  // what an interrupted save left behind
+    if (result != kFileOk && result != kFileNotFound) return result;
+    result = files.Create(folder, name, FileTag("TEXT"), FileTag("ttxt"));
+    if (result != kFileOk) return result;
+    OpenFile file(files);
+    result = file.Open(path, kFileWrite);
+    if (result != kFileOk) return result;
+
+    std::string chunk;
+    chunk.reserve(kWriteChunkBytes * 2);
+    chunk.append(kUtf8Bom, kUtf8BomSize);
+    const std::size_t count = content.GetTimeCount();
+    for (std::size_t i = 0; i < count; ++i) {
+        AppendTranscriptEntry(content.GetTimeAt(i), content.GetLineAtIndex(i), chunk);
+        if (chunk.size() >= kWriteChunkBytes) {
+            result = files.Write(file.Id(), chunk.data(), chunk.size());
+            if (result != kFileOk) return result;
+            chunk.clear();
+        }
+    }
+    result = files.Write(file.Id(), chunk.data(), chunk.size());
+    if (result != kFileOk) return result;
+    return file.Close();
+}
+
+}  // namespace
+
+void CChatClient::SetFileNeedSave(int bNeedSave) {
+    CFuncTrace trace("CChatClient::SetFileNeedSave , bNeedSave = %d", bNeedSave);
+    const int flag = bNeedSave != 0 ? 1 : 0;
+    if (flag == m_bFileNeedSave) return;
+    m_bFileNeedSave = flag;
+    if (m_pHostSink) m_pHostSink->OnChatModified(flag != 0);
+}
+
+bool CChatClient::IsChatHaveContent() {
+    return m_ChatContent.GetTimeCount() > 0;
+}
+
+void CChatClient::SaveChatFile(int bPrompt) {
+    CFuncTrace trace("CChatClient::SaveChatFile");
+    if (m_strFilePath.empty()) {
+        PopSaveDialog(false);
+        return;
+    }
+    // Copied: a dialog run from here may replace the current path.
+    const std::string path = m_strFilePath;
+    if (!CheckPrivileges(path.c_str(), kFileReadWrite)) {
+        if (bPrompt != 0) PopSaveDialog(false);
+        return;
+    }
+    if (!WriteChatFileToFolder(path)) {
+        AlertForSaveFailed(path);
+        return;
+    }
+    AlertIfSaveFailed(path.c_str());
+}
+
+void CChatClient::SaveAsChatFile() {
+    CFuncTrace trace("CChatClient::SaveAsChatFile");
+    PopSaveDialog(true);
+}
+
+void CChatClient::PopSaveDialog(bool bSaveAs) {
+    std::int32_t confirmed = bSaveAs ? 1 : 0;
+    std::string path;
+    // Without a window nobody answered: the flag still holds what was passed in.
+    if (NotifyUI(msg_SaveChatPanel, &confirmed, &path) != 0 || confirmed == 0) return;
+    m_strFilePath = path;
+    SaveChatFile(0);
+}
+
+void CChatClient::PopChatFileOpenDialog() {
+    CFuncTrace trace("CChatClient::PopChatFileOpenDialog");
+    std::int32_t confirmed = 0;
+    std::string path;
+    if (NotifyUI(msg_OpenChatPanel, &confirmed, &path) != 0 || confirmed == 0) return;
+    m_strFilePath = path;
+    OpenChatFile();
+}
+
+void CChatClient::OpenChatFile() {
+    const bool hadEntries = IsChatHaveContent();
+    std::unique_ptr<char[]> bytes;
+    std::size_t size = 0;
+    TranscriptBatch batch;
+    // Everything is read and checked before anything is stored or shown, so a file that
+    // fails leaves the transcript and the window as they were.
+    if (!ReadWholeFile(CurrentFileServices(), m_strFilePath, &bytes, &size) ||
+        !ParseTranscript(bytes.get(), size, &batch)) {
+        MacWarnTrace2(kChatTag, "CChatClient::OpenChatFile failed, path = %s",
+                      m_strFilePath.c_str());
+        ShowChatWarning(GetLocalizedString(kOpenFailedKey));
+        m_strFilePath.clear();
+        return;
+    }
+    bytes.reset();
+
+    const std::size_t firstLine = m_ChatContent.GetLineCount();
+    m_ChatContent.AppendEntries(std::move(batch.entries));
+    std::string text;
+    for (const TranscriptPiece& piece : batch.pieces) {
+        text.assign(m_ChatContent.GetLineAtIndex(firstLine + piece.entry), piece.offset,
+                    piece.size);
+        NotifyUI(piece.bTitle ? msg_ShowTitle : msg_ShowText, const_cast<char*>(text.c_str()));
+    }
+    if (hadEntries) SetFileNeedSave(1);
+    if (m_pHostSink) m_pHostSink->OnChatContentChanged(true);
+}
+
+bool CChatClient::WriteChatFileToFolder(const std::string& path) {
+    // The new file is written beside the old one and then renamed over it, so the old file
+    // stays whole until the new one is complete.
+    const std::size_t slash = path.rfind('/');
+    const std::string folder =
+        slash == std::string::npos ? std::string() : path.substr(0, slash + 1);
+    const std::string tempName = "." + FileNameOf(path) + ".saving";
+    const std::string tempPath = folder + tempName;
+
+    FileServices& files = CurrentFileServices();
+    FileResult result = WriteNewTranscriptFile(files, folder, tempName, tempPath, m_ChatContent);
+    if (result == kFileOk) result = files.Rename(tempPath, path);
+    if (result != kFileOk) {
+        files.Delete(tempPath);
+        MacErrorTrace2(kChatTag, "CChatClient::WriteChatFileToFolder failed, result = %d",
+                       static_cast<int>(result));
+        return false;
+    }
+    SetFileNeedSave(0);
+    return true;
+}
+
+int CChatClient::SaveFileToFolder(const char* folder) {
+    if (!folder || CurrentFileServices().Resolve(folder) != kFileOk) return -1;
+    const std::string path = std::string(folder) + "/" + GetLocalizedString(kChatFileNameKey);
+    if (!WriteChatFileToFolder(path)) return -1;
+    m_strFilePath = path;
+    return 0;
+}
+
+bool CChatClient::CheckPrivileges(const char* path, signed char permission) {
+    if (!path) return true;
+    FileServices& files = CurrentFileServices();
+    if (files.Resolve(path) == kFileNotFound) return true;
+    OpenFile file(files);
+    const FileResult result = file.Open(path, static_cast<FilePermission>(permission));
+    if (result == kFileOk || result == kFileNotFound) return true;
+    ShowChatWarning(FillFileName(GetLocalizedString(kCannotReplaceKey), FileNameOf(path)));
+    return false;
+}
+
+void CChatClient::AlertForSaveFailed(const std::string& path) {
+    if (path.empty()) return;
+    ShowChatWarning(FillFileName(GetLocalizedString(kSaveFailedKey), FileNameOf(path)));
+}
+
+bool CChatClient::AlertIfSaveFailed(const char* path) {
+    FileServices& files = CurrentFileServices();
+    FileInfo info;
+    if (path && *path && files.Resolve(path) == kFileOk && files.GetInfo(path, &info) == kFileOk) {
+        return true;
+    }
+    AlertForSaveFailed(path ? path : "");
+    return false;
+}
+
+void CChatClient::CheckSavedFileStillThere() {
+    if (m_bFileNeedSave != 0 || m_strFilePath.empty()) return;
+    FileServices& files = CurrentFileServices();
+    FileInfo info;
+    if (files.Resolve(m_strFilePath) == kFileOk && files.GetInfo(m_strFilePath, &info) == kFileOk) {
+        return;
+    }
+    MacInfoTrace2(kChatTag, "CChatClient::OnTick() SetFileNeedSave(true)");
+    SetFileNeedSave(1);
+}
