@@ -182,6 +182,10 @@ public:
     bool AllocStringForMemoryHandle(std::uint32_t memHandle, std::string& out) override;
     int ChatRequestSharedDataEx(std::uint32_t cacheHandle, tagCacheRequestType type,
                                 short maxItems) override;
+    // The status cache answered a retrieve: join the caches or initialise them.
+    void OnChatStatusCacheAnswer(std::uint32_t memHandle, short result, tagCacheAction action);
+    // True when what is written now is flagged for recording.
+    bool IsRecording() const;
 
     // ---- Host commands, configuration and window events (commands.cpp) ----
     int SelectFeature(std::uint32_t features, std::uint32_t reserved1, long reserved2,
@@ -198,70 +202,235 @@ public:
     void CloseSeltAttDlg();
 
     // ---- Transcript files (transcript.cpp) ----
+    // Stores the modified flag; the host hears of it only when it changes.
     void SetFileNeedSave(int bNeedSave);
+    // Saves to the current path (asks for one when there is none); warns when it fails.
     void SaveChatFile(int bPrompt);
+    // Asks for a path and saves there.
     void SaveAsChatFile();
+    // Runs the save panel; a confirmed path becomes the current one and is saved.
     void PopSaveDialog(bool bSaveAs);
+    // Runs the open panel; a confirmed path becomes the current one and is opened.
     void PopChatFileOpenDialog();
+    // Appends the file at the current path to the transcript and the window, all or nothing;
+    // on failure warns and forgets the path.
     void OpenChatFile();
+    // True when the transcript holds at least one entry.
     bool IsChatHaveContent();
+    // Writes the transcript to path, replacing a file there only once the new one is
+    // complete. True (and the modified flag cleared) when the file holds the transcript.
+    bool WriteChatFileToFolder(const std::string& path);
+    // Writes the transcript as the localised "Chat.txt" into folder and makes that the
+    // current path: 0 when written, -1 when not (null or missing folder, failed write).
+    int SaveFileToFolder(const char* folder);
+    // False, after a warning, when an existing file at path cannot be opened with permission
+    // (1 read, 2 write, 3 read-write); true when it can or when there is no file.
+    bool CheckPrivileges(const char* path, signed char permission);
+    // Warns that the file at path could not be saved; nothing for an empty path.
+    void AlertForSaveFailed(const std::string& path);
+    // True when the file at path exists and can be examined; otherwise warns and is false.
+    bool AlertIfSaveFailed(const char* path);
+    // The tick's watch: marks the transcript modified when its saved file has gone.
+    void CheckSavedFileStillThere();
+    // The file the transcript was last saved to or opened from; empty when none.
+    const std::string& ChatFilePath() const { return m_strFilePath; }
 
     // ---- Receiving chat (receive.cpp) ----
     void ParseAndShowGroupMessages(CGroupMessagePDU* pdu, std::uint32_t cacheHandle) override;
     int ParseAndShowPrivateMessages(CPrivateMessagePDU* pdu, int reserved) override;
 
     // ---- Roster (roster.cpp, roster_changes.cpp) ----
-    bool IsUserExist(const UserItem* item);
-    std::uint32_t GetPanelistCount();
-    bool IsBeforeHost();
+    // True when a roster item has both the item's user id and its node id.
+    bool IsUserExist(const UserItem* item) const;
+    // Roster items that are host, presenter or panelist (the local participant included).
+    std::uint32_t GetPanelistCount() const;
+    // True while the meeting has no host, as far as the local participant can tell.
+    bool IsBeforeHost() const;
+    // Sets the local participant's roles (host or presenter bring the panelist bit outside
+    // meeting type 1). bForce: stores only, 1. Else enrolled: the enroll result when the roles
+    // changed, 1 when not; before enrolment 0 and the change waits for it.
     int SetRosters(std::uint32_t dwRoster, int bForce);
+    // Makes the node a plain attendee: 0 when it is in the roster, else -1.
     int SetAttendee(std::uint32_t dwNodeId);
-    bool IsUserSelectedUser(std::uint32_t nodeId);
+    // The local participant's role bits.
+    std::uint32_t GetMyRosters() const { return m_dwMyRosters; }
+    // True when own roles changed before enrolment and still wait to be announced.
+    bool IsRostersPending() const { return m_bRostersPending != 0; }
+    // Selected-user set (attendees picked in the picker, oldest first): membership is false
+    // for nodes outside the roster; adding skips those and nodes already present; removing
+    // drops every occurrence of a selected node.
+    bool IsUserSelectedUser(std::uint32_t nodeId) const;
     void AddUserByUserSelected(std::uint32_t nodeId);
     void RemoveUserByUserID(std::uint32_t nodeId);
+    // Copies the ids of the record's entry at index into item and, when its enroll data parses,
+    // name, roles, visibility, user type and tag: 0; -1 when the entry has no enroll data.
     int ExtractEnrollInfoAndReturnLen(std::uint32_t index, UserItem* item,
                                       const ARMApeRoster* record);
+    // Handle count records of added, left or changed participants (records of other sessions
+    // are skipped) and keep roster, menu and privileges in step; 1.
     int ProcessAddEnrollInfo(std::uint32_t count, const ARMApeRoster* first);
     int ProcessDeleteEnrollInfo(std::uint32_t count, const ARMApeRoster* first);
     int ProcessModifyEnrollInfo(std::uint32_t count, const ARMApeRoster* first);
 
-    // ---- Send-to groups (groups.cpp) ----
-    void AddGroup(const _tagChatGroupInfo* info, int bAddToMenu);
-    void SetMeetingType(std::int32_t meetingType);
+private:
+    // Adds one enrolled participant, unless already known or the recorder, with the menu
+    // entry the rules give it (roster_changes.cpp).
+    void AddEnrolledUser(std::unique_ptr<UserItem> user, bool bOwn);
+    // Under QM rules: titles the role entry the participant holds with the participant's name.
+    void TitleRoleEntryInQM(std::uint32_t nodeId, const std::string& name);
 
+public:
+
+    // ---- Send-to groups (groups.cpp) ----
+    // Adds the host's group (a null info does nothing), with a menu entry at its index when
+    // bAddToMenu is set, and has the window rebuild its menu.
+    void AddGroup(const _tagChatGroupInfo* info, int bAddToMenu);
+    // Stores the meeting type and adds its default groups and menu entries.
+    void SetMeetingType(std::int32_t meetingType);
+    // A group with every value the add operations take.
+    struct GroupValues {
+        std::uint32_t dwIndex = 0;
+        std::uint32_t dwGroupType = 0;
+        std::uint32_t dwGroupId = 0;
+        const char* lpszGroupName = nullptr;
+        std::uint32_t dwValueA = 0;
+        std::uint32_t dwValueB = 0;
+        std::uint32_t dwFlags = 0;
+        const char* lpszGroupLabel = nullptr;
+        std::uint32_t dwMemberCount = 0;
+        const std::uint32_t* const* pMembers = nullptr;
+    };
+
+private:
+    // Adds the group by type under the current insertion scheme and renumbers the rows; the
+    // add operation's result, -1 for an unknown type.
+    int AddGroup(const GroupValues& values);
+    // Role groups and separators: updates a matching group in place or inserts a new one. The
+    // first form returns the index (-1 before enrolment when the insertion failed), the second
+    // the group's sequence number (-1 when it could not be inserted).
+    int AddRoleGroup(const GroupValues& values);
+    int AddRoleGroup2(const GroupValues& values);
+    // Id groups: always inserts a new group; the insertion result.
+    int AddIDGroup(const GroupValues& values);
+    int AddIDGroup2(const GroupValues& values);
+    // A role group with only a name, as AddRoleGroup; returns 1.
+    int AddCacheGroup(std::uint32_t dwIndex, std::uint32_t dwGroupType, std::uint32_t dwGroupId,
+                      const char* lpszGroupName);
+
+public:
     // ---- Send-to menu model (menu.cpp) ----
+    // Index of the group's entry (group id, no participant), or -1.
     int GetIndexOfMenuByGroup(std::int32_t groupId) const;
+    // The group's entry, or null.
     const MenuStatus* GetMenuByGroupID(std::int32_t groupId) const;
+    // Index of the participant's first entry (recent entries included), or -1.
     int GetIndexOfMenuByNodeID(std::uint32_t nodeId) const;
+    // Selects the entry (the everyone entry in everyone-only mode) and tells the window;
+    // nothing for an index outside the menu. The QM form also lets the window allow input.
     void SelectMenuItemByIndex(int index);
     void SelectMenuItemByIndexInQM(int index);
+    // Enables or disables the group's entry; the window hears only of a change.
     void SetGroupMenuEnable(std::int32_t groupId, bool bEnable);
     bool GetHideSendToCombox() const { return m_bEveryoneOnly != 0; }
+    // InsertChatUserName with the participant's internal/external mark on the title.
     void InsertExternalInternalChatUserName(const char* name, std::uint32_t nodeId,
                                             std::uint32_t tag);
+    // Gives the participant a private-chat entry in its section, in title order; the local
+    // participant, and attendees seen by an attendee in practice, get none.
     void InsertChatUserName(const char* name, std::uint32_t nodeId, int bSelect);
+    // Puts the participant at the top of the recent entries.
     void InsertRecentUserName(const char* name, std::uint32_t nodeId);
+    // Take the participant's entry (or its recent entry) out with the separators it leaves
+    // doubled; a selected entry's audience is replaced by a fallback one.
     void RemoveChatUserName(const char* name, std::uint32_t nodeId, int bNotify);
     void RemoveChatUserNameInQM(const char* name, std::uint32_t nodeId);
     void RemoveRecentUserName(const char* name, std::uint32_t nodeId);
+    // Changes nothing: an entry keeps the title it got on arrival.
     void ModifyChatUserName(const char* name, std::uint32_t nodeId);
+    // True when chat to the participant is possible; selects its entry unless test-only.
     bool SelectUserByNodeID(std::uint32_t nodeId, bool bTestOnly, bool bSelect);
+    // True when the local participant may chat with the node (never in everyone-only mode).
     bool CanChatWith(std::uint32_t nodeId, bool bMenuOnly);
+    // The participant's tag as the tagging mode shows it: 1 internal, 2 external, else 0.
     std::uint32_t GetUserExternalInternalTag(std::uint32_t nodeId);
+    // The mark for a tag: "internal"/"external" alone (form 0), after ", " (1) or in " ()" (2);
+    // empty when the tagging mode does not show the tag.
     std::string GetUserExternalInternalString(std::uint32_t tag, int form) const;
 
+private:
+    // Menu editing shared by the menu, roster-change, privilege and role rules (menu.cpp).
+    // Inserts the entry at position (-1 or beyond the end: appended), tells the window and
+    // returns the entry's index.
+    int InsertMenuEntry(const MenuStatus& entry, int position);
+    // Erases the entry at index and tells the window; nothing for an index outside the menu.
+    void EraseMenuEntry(int index);
+    // Erases the entry at index; a selected one is announced as a departed audience and
+    // input is stopped, any other as a plain removal.
+    void EraseSelectedAware(int index);
+    // Erases a participant entry and a separator it leaves doubled (and a trailing one when
+    // asked); re-selects a fallback entry when the erased one was selected.
+    void EraseParticipantEntry(int index, bool bTrailingSeparator);
+    // Selects the enabled everyone entry, else the first enabled entry that is not a separator.
+    void SelectFallbackMenuItem();
+    // Marks only the entry at index selected (the everyone entry in everyone-only mode); false
+    // and nothing changed when the index is outside the menu.
+    bool MarkMenuItemSelected(int& index);
+    // Index of the node's first participant entry that is (or is not) a recent entry, or -1.
+    int IndexOfParticipantEntry(std::uint32_t nodeId, bool bRecent) const;
+    // True when some entry belongs to a participant.
+    bool HasParticipantEntry() const;
+    // True when, of the privilege flags, private chat alone is allowed.
+    bool OnlyChatPrivately() const;
+    // Another participant's roles: host and presenter by the holder ids, panelist by the roster.
+    bool IsNodeHost(std::uint32_t nodeId) const;
+    bool IsNodePresenter(std::uint32_t nodeId) const;
+    bool IsNodePanelist(std::uint32_t nodeId) const;
+    // Panelist, presenter or host.
+    bool IsNodePrivileged(std::uint32_t nodeId) const;
+    // Inserts a new participant entry at position and selects as InsertChatUserName asks.
+    void AnnounceInsertedUser(const MenuStatus& entry, int position, int bSelect,
+                              bool selectedWasDisabled);
+    // Where an attendee's entry goes in meeting types 1 and 2 (-1: appended); may first append
+    // the separator that opens the participant section under QM rules.
+    int AttendeeInsertPosition(const char* name);
+    // Where an attendee's entry goes in meeting type 3; may first insert the section separator.
+    int PanelAttendeeInsertPosition(const char* name);
+    // Where a recent entry goes in meeting type 3, or -1 when the menu has no place for it.
+    int PanelRecentInsertPosition();
+    // Moves the node to the front of the picked attendees (at most 20) and its recent entry
+    // to the top of the recent section.
+    void RememberRecentUser(std::uint32_t nodeId, const char* name);
+
+public:
+
     // ---- Privilege and role policy (privilege.cpp) ----
+    // Takes a privilege word (or re-applies the current one; bForce redoes the attendee menu
+    // even when the word is unchanged); under QM rules hands over to OnPrivilegeChangedInQM.
     void OnPrivilegeChanged(std::uint32_t privilege, int bForce);
+    // The QM rules' counterpart of OnPrivilegeChanged; it also governs the everyone flag.
+    void OnPrivilegeChangedInQM(std::uint32_t privilege, int bForce);
+    // Re-applies the current privilege word; the value is not examined.
     void OnBeforeHostChange(int value);
 
     // ---- Host and presenter changes (roles.cpp) ----
+    // Records the new host (0: none) and the local participant's resulting role bits.
     void OnHostChanged(std::uint32_t hostId);
+    // Records the new presenter (0: none) and the local participant's resulting role bits.
     void OnPresenterChanged(std::uint32_t presenterId);
+    // Rebuilds a privileged participant's menu from the groups; with the flag selects everyone.
     void OnRosterChange(int bSelectEveryone);
 
     // ---- Practice session and panelists (practice.cpp) ----
+    // Starts (non-zero) or ends practice; repeating the current value does nothing.
     void SetPracticeStatus(std::int8_t value);
+    // Stores the panel status and tells the window of a non-zero one.
     void SetPanelStatus(std::uint32_t status);
+
+private:
+    // Stores the privilege word and splits it into the flags; the everyone flag only when asked.
+    void StorePrivilege(std::uint32_t privilege, bool bWithEveryone);
+
+public:
 
     // ---- State read by tests and the component's functions ----
     const CUserListManager& UserList() const { return m_UserList; }
@@ -272,12 +441,36 @@ public:
     IArmClient* ArmClient() const { return m_pArmClient; }
     ChatUIHandle ChatUI() const { return m_hChatUI; }
     int FileNeedSave() const { return m_bFileNeedSave; }
+    int State() const { return m_nState; }
+    int Enrolled() const { return m_bEnrolled; }
+    std::uint32_t SessionValue() const { return m_dwSessionValue; }
+    std::uint32_t MyUserID() const { return m_dwMyUserID; }
+    std::uint32_t MyNodeID() const { return m_dwMyNodeID; }
+    std::uint32_t MyRosters() const { return m_dwMyRosters; }
+    const std::string& MyName() const { return m_strMyName; }
+    const std::string& Reserved() const { return m_strReserved; }
+    std::uint32_t UserExternalTag() const { return m_dwUserExternalTag; }
+    int NeedRosterInfo() const { return m_bNeedRosterInfo; }
+    int BroadcastRosterInfo() const { return m_bBroadcastRosterInfo; }
+    int PrivilegeCountdown() const { return m_nPrivilegeCountdown; }
+    int PrivilegePending() const { return m_bPrivilegePending; }
+    int StartupTicks() const { return m_nStartupTicks; }
+    bool TimerInstalled() const { return m_pTimer != 0; }
+    std::uint32_t Features() const { return m_dwFeatures; }
+    std::uint32_t Privilege() const { return m_dwPrivilege; }
+    const NameHandle& ChatStatusCacheHandle() const { return m_ChatStatusCacheHandle; }
+    const NameHandle& UserInfoCacheHandle() const { return m_UserInfoCacheHandle; }
+    const NameHandle& CustomerCacheHandle() const { return m_CustomerCacheHandle; }
 
 private:
     // True when the local participant has the panelist bit or is presenter or host.
     bool IsPrivileged() const;
     // True when the local participant is the host or the presenter (node ids alone).
     bool IsHostOrPresenter() const;
+    // Appends bytes to a cache through a memory handle; false when nothing was written.
+    bool AppendToCache(std::uint32_t cacheHandle, const std::string& bytes, std::uint32_t flags);
+    // The first group with a cache (not a separator) of that id, or null.
+    CUsersGroup* FindCacheGroup(std::uint32_t groupId);
 
     // Engine fields, in the order the component has always kept them.
     std::uint32_t m_dwMyRosters = 0;     // own role bits (ChSetRosters)

@@ -32,6 +32,6 @@ private:
     bool m_bGroupMsgRecovery = false;        // 0x400
     bool m_bQMFlag = false;                  // 0x200000
 
-    std::uint32_t m_dwCustomerId = 0;        // names the customer cache; 0 = none
+    std::uint32_t m_dwCustomerId = 0;           // names the customer cache; 0 = none
     IChatDataCmdProcess* m_pCmdSink = nullptr;  // the engine; not owned
 };

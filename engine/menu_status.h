@@ -6,10 +6,10 @@
 #include <vector>
 
 struct MenuStatus {
-    std::string strTitle;      // text shown
+    std::string strTitle;        // text shown
     std::uint32_t dwNodeID = 0;  // participant of a participant entry; 0 otherwise
-    bool bEnabled = true;      // the entry can be chosen
-    bool bSelected = false;    // the current audience; at most one entry is selected
+    bool bEnabled = true;        // the entry can be chosen
+    bool bSelected = false;      // the current audience; at most one entry is selected
     std::uint8_t bReserved = 0;
     std::int32_t nGroupID = -1;  // group id of a group entry; -1 otherwise
     bool bSeparator = false;     // a separator line

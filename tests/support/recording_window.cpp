@@ -7,10 +7,14 @@
 namespace {
 RecordingWindow* g_latest = nullptr;
 
-std::int32_t IndexAt(void* param) { return param ? *static_cast<std::int32_t*>(param) : -2; }
+std::int32_t IndexAt(void* param) {
+    return param ? *static_cast<std::int32_t*>(param) : -2;
+}
 }  // namespace
 
-RecordingWindow::RecordingWindow() { g_latest = this; }
+RecordingWindow::RecordingWindow() {
+    g_latest = this;
+}
 
 RecordingWindow::~RecordingWindow() {
     if (g_latest == this) g_latest = nullptr;
@@ -20,9 +24,13 @@ void RecordingWindow::Install() {
     SetChatWindowFactory([] { return new RecordingWindow; });
 }
 
-void RecordingWindow::Uninstall() { SetChatWindowFactory(nullptr); }
+void RecordingWindow::Uninstall() {
+    SetChatWindowFactory(nullptr);
+}
 
-RecordingWindow* RecordingWindow::Latest() { return g_latest; }
+RecordingWindow* RecordingWindow::Latest() {
+    return g_latest;
+}
 
 int RecordingWindow::HandleCommand(int command, void* inParam, void* outParam) {
     RecordedCommand rec;
@@ -77,10 +85,13 @@ int RecordingWindow::HandleCommand(int command, void* inParam, void* outParam) {
     return 0;
 }
 
-std::vector<int> RecordingWindow::Ids() const { return IdsSince(0); }
+std::vector<int> RecordingWindow::Ids() const {
+    return IdsSince(0);
+}
 
 std::vector<int> RecordingWindow::IdsSince(std::size_t first) const {
     std::vector<int> ids;
-    for (std::size_t i = first; i < m_commands.size(); ++i) ids.push_back(m_commands[i].id);
+    for (std::size_t i = first; i < m_commands.size(); ++i)
+        ids.push_back(m_commands[i].id);
     return ids;
 }

@@ -11,11 +11,11 @@
 
 struct RecordedCommand {
     int id = 0;
-    std::string name;      // protocol name, e.g. "msg_ShowText"
-    std::string text;      // 2200/2201 text, 2304 title, 2602/2603 path
-    std::int32_t index = -2;  // 2301 position (-1 = append), 2302..2307 index, 2103 flag
-    MenuStatus entry;      // 2301, 2307
-    MenuStatusList menu;   // 2400
+    std::string name;           // protocol name, e.g. "msg_ShowText"
+    std::string text;           // 2200/2201 text, 2304 title, 2602/2603 path
+    std::int32_t index = -2;    // 2301 position (-1 = append), 2302..2307 index, 2103 flag
+    MenuStatus entry;           // 2301, 2307
+    MenuStatusList menu;        // 2400
     AttendeeRecord attendee{};  // 2604
 };
 
@@ -36,9 +36,9 @@ public:
     int HandleCommand(int command, void* inParam, void* outParam) override;
 
     // What the window answers.
-    std::string inputText;         // 2500
+    std::string inputText;             // 2500
     std::int32_t dialogConfirmed = 0;  // 2600 / 2601
-    std::string dialogPath;        // 2600 / 2601
+    std::string dialogPath;            // 2600 / 2601
     std::int32_t warningShowing = 0;   // 2606
 
     const std::vector<RecordedCommand>& Commands() const { return m_commands; }

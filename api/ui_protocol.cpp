@@ -1,0 +1,75 @@
+#include "api/ui_protocol.h"
+
+const char* ChatUIMessageName(int id) {
+    switch (id) {
+        case msg_ClearChat:
+            return "msg_ClearChat";
+        case msg_FocusInput:
+            return "msg_FocusInput";
+        case msg_ShowChat:
+            return "msg_ShowChat";
+        case msg_SendDone:
+            return "msg_SendDone";
+        case msg_AllowUserInput:
+            return "msg_AllowUserInput";
+        case msg_HideUserList:
+            return "msg_HideUserList";
+        case msg_ShowText:
+            return "msg_ShowText";
+        case msg_ShowTitle:
+            return "msg_ShowTitle";
+        case msg_InsertMenuItem:
+            return "msg_InsertMenuItem";
+        case msg_RemoveMenuItem:
+            return "msg_RemoveMenuItem";
+        case msg_SelectedUserLeft:
+            return "msg_SelectedUserLeft";
+        case msg_RenameMenuItem:
+            return "msg_RenameMenuItem";
+        case msg_SelectMenuItem:
+            return "msg_SelectMenuItem";
+        case msg_SelectMenuItemAndAllowInput:
+            return "msg_SelectMenuItemAndAllowInput";
+        case msg_UpdateMenuItem:
+            return "msg_UpdateMenuItem";
+        case msg_EnableUserList:
+            return "msg_EnableUserList";
+        case msg_DisableUserList:
+            return "msg_DisableUserList";
+        case msg_NoSendToItems:
+            return "msg_NoSendToItems";
+        case msg_RebuildMenu:
+            return "msg_RebuildMenu";
+        case msg_PanelStatusChanged:
+            return "msg_PanelStatusChanged";
+        case msg_CloseAllDialogs:
+            return "msg_CloseAllDialogs";
+        case msg_GetInputText:
+            return "msg_GetInputText";
+        case msg_ClearInput:
+            return "msg_ClearInput";
+        case msg_SaveChatPanel:
+            return "msg_SaveChatPanel";
+        case msg_OpenChatPanel:
+            return "msg_OpenChatPanel";
+        case msg_WriteTextFile:
+            return "msg_WriteTextFile";
+        case msg_ReadTextFile:
+            return "msg_ReadTextFile";
+        case msg_AddAttendee:
+            return "msg_AddAttendee";
+        case msg_CloseAttendeeDialog:
+            return "msg_CloseAttendeeDialog";
+        case msg_CloseAttendeeWarning:
+            return "msg_CloseAttendeeWarning";
+        case msg_SendChat:
+            return "msg_SendChat";
+        case msg_SelectionChanged:
+            return "msg_SelectionChanged";
+        case msg_ShowAttendeeList:
+            return "msg_ShowAttendeeList";
+        case msg_AttendeeSelected:
+            return "msg_AttendeeSelected";
+    }
+    return nullptr;
+}

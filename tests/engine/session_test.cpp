@@ -1,0 +1,502 @@
+// The engine's life against the in-process conference on a virtual clock: start, the
+// connection chain and its failures, roster-info switches, the tick and the tear-down.
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "engine/chat_client.h"
+#include "engine/chat_recovery_mgr.h"
+#include "platform/inproc_conference.h"
+#include "platform/virtual_run_loop.h"
+#include "tests/support/arm_recorder.h"
+#include "tests/support/recording_window.h"
+#include "tests/support/spy_arm_client.h"
+#include "tests/support/trace_capture.h"
+
+namespace {
+
+constexpr std::uint32_t kSessionId = 42;
+
+class HostSinkRecorder final : public IHostChatSink {
+public:
+    void OnIncomingChat(const char* sender, const char* message, uint32_t nodeId) override {
+        events.push_back("incoming " + std::string(sender) + ": " + message + " @" +
+                         std::to_string(nodeId));
+    }
+    void OnChatShown() override { events.push_back("shown"); }
+    void OnChatModified(bool modified) override {
+        events.push_back(std::string("modified ") + (modified ? "1" : "0"));
+    }
+    void OnChatContentChanged(bool changed) override {
+        events.push_back(std::string("content ") + (changed ? "1" : "0"));
+    }
+    std::vector<std::string> events;
+};
+
+class SessionTest : public ::testing::Test {
+protected:
+    void SetUp() override { RecordingWindow::Install(); }
+    void TearDown() override { RecordingWindow::Uninstall(); }
+
+    _tagChatData Data(IArmClient* client, std::uint32_t node, const char* name,
+                      std::int32_t meetingType = 1) {
+        _tagChatData data{};
+        data.pHostSink = &host;
+        data.hParentView = &parentView;
+        data.pArmClient = client;
+        data.wConferenceID = conference.ConferenceId();
+        data.dwSessionID = kSessionId;
+        data.lpszUserName = name;
+        data.dwNodeID = node;
+        data.lMeetingType = meetingType;
+        return data;
+    }
+
+    VirtualRunLoop loop;
+    ScopedCurrentRunLoop current{&loop};
+    InProcessConference conference;
+    HostSinkRecorder host;
+    int parentView = 0;
+};
+
+std::vector<std::string> Prefix(const std::vector<std::string>& calls, std::size_t n) {
+    return std::vector<std::string>(calls.begin(), calls.begin() + std::min(n, calls.size()));
+}
+
+TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    SpyArmClient spy(client);
+    CChatClient engine;
+    engine.Initialize(Data(&spy, 7, "Alice", 3));
+
+    // Nothing is answered inside a request: only Connect has happened yet.
+    EXPECT_EQ(spy.Calls(), std::vector<std::string>{"Connect"});
+    EXPECT_EQ(engine.State(), kStateIdle);
+    loop.RunUntilIdle();
+
+    EXPECT_EQ(Prefix(spy.Calls(), 6),
+              (std::vector<std::string>{"Connect", "ConferenceJoin", "ApeAttach", "ApeEnroll",
+                                        "AllocNameHandle", "RegisterSharedDataSink"}));
+    EXPECT_EQ(engine.State(), kStateEnrolled);
+    EXPECT_EQ(engine.Enrolled(), 1);
+    EXPECT_EQ(engine.MyUserID(), client->UserId());
+    EXPECT_NE(engine.SessionValue(), 0u);
+    EXPECT_EQ(engine.SessionValue(), conference.SessionValue(kSessionId));
+    EXPECT_EQ(spy.RegisteredSink(), static_cast<IArmSharedDataSink*>(&engine));
+    EXPECT_EQ(host.events, (std::vector<std::string>{"modified 0", "content 0"}));
+
+    // Named handles for the seven group caches of meeting type 3 and the bookkeeping caches.
+    const std::string prefix = std::to_string(engine.SessionValue());
+    EXPECT_EQ(spy.HandleNames(),
+              (std::vector<std::string>{
+                  prefix + "_chat_cache_1", prefix + "_chat_cache_2", prefix + "_chat_cache_3",
+                  prefix + "_chat_cache_8", prefix + "_chat_cache_4", prefix + "_chat_cache_15",
+                  prefix + "_chat_cache_16", prefix + "_Chat_User_Info", prefix + "_chat_status"}));
+    EXPECT_NE(engine.ChatStatusCacheHandle().handle_value, 0u);
+    EXPECT_NE(engine.UserInfoCacheHandle().handle_value, 0u);
+    EXPECT_EQ(engine.CustomerCacheHandle().handle_value, 0u);
+    for (std::int32_t i = 0; i < engine.GroupList().GetGroupsCount(); ++i) {
+        const CUsersGroup* group = engine.GroupList().GetGroupByIndex(i);
+        if (group->GetGroupType() == 2) continue;
+        EXPECT_NE(group->GetCacheHandle(), 0u) << group->GetGroupId();
+        // The first participant found the status cache empty and initialised every cache.
+        EXPECT_EQ(group->IsCacheSet(), 1) << group->GetGroupId();
+    }
+    int subscribed = 0, requestType = 0, cacheSet = 0;
+    ASSERT_TRUE(engine.GetGroupCacheStatus(GROUP_EVERYONE, subscribed, requestType, cacheSet));
+    EXPECT_EQ(subscribed, 1);
+    EXPECT_EQ(requestType, CACHE_REQUEST_SUBSCRIBE);
+    // An attendee reads "All Attendees" but not the host's cache.
+    ASSERT_TRUE(engine.GetGroupCacheStatus(GROUP_ATTENDEES, subscribed, requestType, cacheSet));
+    EXPECT_EQ(subscribed, 1);
+    ASSERT_TRUE(engine.GetGroupCacheStatus(GROUP_HOST, subscribed, requestType, cacheSet));
+    EXPECT_EQ(subscribed, 0);
+
+    RecordingWindow* window = RecordingWindow::Latest();
+    ASSERT_NE(window, nullptr);
+    EXPECT_EQ(window->SuperView(), &parentView);
+    EXPECT_EQ(window->Sink(), static_cast<IChatCommSinkForChatUI*>(&engine));
+}
+
+TEST_F(SessionTest, LaterJoinerFindsTheCachesInitialisedAndOnlySubscribes) {
+    InProcessArmClient* firstClient = conference.CreateClient(loop, 7);
+    CChatClient first;
+    first.Initialize(Data(firstClient, 7, "Alice", 3));
+    loop.RunUntilIdle();
+
+    InProcessArmClient* client = conference.CreateClient(loop, 8);
+    SpyArmClient spy(client);
+    TraceCapture capture;
+    CChatClient second;
+    second.Initialize(Data(&spy, 8, "Bob", 3));
+    loop.RunUntilIdle();
+    EXPECT_EQ(second.SessionValue(), first.SessionValue());
+    EXPECT_EQ(second.ChatStatusCacheHandle().handle_value,
+              first.ChatStatusCacheHandle().handle_value);
+    EXPECT_FALSE(capture.Has("Enter CChatClient::SetAllCaches"));
+    EXPECT_TRUE(capture.Has("CChatClient::SetAllGroupCacheSetFlag()"));
+    int subscribed = 0, requestType = 0, cacheSet = 0;
+    ASSERT_TRUE(second.GetGroupCacheStatus(GROUP_EVERYONE, subscribed, requestType, cacheSet));
+    EXPECT_EQ(subscribed, 1);
+    EXPECT_EQ(cacheSet, 1);
+}
+
+TEST_F(SessionTest, RosterInfoOthersReceiveIsPinned) {
+    ArmRecorder other;
+    InProcessArmClient* otherClient = conference.CreateClient(loop, 9);
+    other.SetClient(otherClient);
+    std::uint32_t otherApe = 0;
+    ARMSessionResource resource{1, "c_session_id", 1, 0, 0};
+    otherClient->Connect(&other, "Bob", 0, 0, 0);
+    otherClient->ConferenceJoin(0, conference.ConferenceId(), &other, 3);
+    otherClient->ApeAttach(&other, 0, conference.ConferenceId(), &otherApe);
+    loop.RunUntilIdle();
+    otherClient->ApeEnroll(otherApe, 1, kSessionId, 0, 1, &resource, "x", 1, 3);
+    loop.RunUntilIdle();
+    other.Clear();
+
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    CChatClient engine;
+    engine.SetRosters(ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST, 1);
+    engine.Initialize(Data(client, 7, "Alice <&> ]]>", 1));
+    loop.RunUntilIdle();
+
+    // Meeting type 1 clears the panelist bit; the customer id is written even when 0;
+    // no FAQ fields without FAQ settings; no external tag when it is 0.
+    const std::string expected =
+        "<chat ver=\"1.0\"><mtype>5</mtype><NodeID>7</NodeID>"
+        "<UserName><![CDATA[Alice <&> ]] >]]></UserName><RoleSet>3</RoleSet>"
+        "<Visible>1</Visible><UserType>1</UserType><GuestID>0</GuestID></chat>";
+    bool seen = false;
+    for (const ArmEvent& event : other.Named("ApeRosterChanged")) {
+        for (const RosterRecord& record : event.roster.added) {
+            for (const RosterUserEntry& user : record.users) {
+                if (user.nodeId != 7) continue;
+                EXPECT_EQ(std::string(user.enrollInfo.begin(), user.enrollInfo.end()), expected);
+                EXPECT_EQ(user.userId, engine.MyUserID());
+                seen = true;
+            }
+        }
+    }
+    EXPECT_TRUE(seen);
+}
+
+TEST_F(SessionTest, RosterInfoCarriesFaqFieldsTagAndCustomerId) {
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    SpyArmClient spy(client);
+    CChatClient engine;
+    engine.SetRosters(ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST, 1);
+    engine.SetConfig(2,
+                     "<chat ver=\"1.0\"><mtype>8</mtype><fname>Ann</fname><phone>1 &amp; 2</phone>"
+                     "</chat>");
+    engine.SetConfig(3, "<chat ver=\"1.0\"><mtype>11</mtype><customerid>555</customerid></chat>");
+    _tagChatData data = Data(&spy, 7, "Ann", 3);
+    data.lExternalTagMode = 2;
+    data.dwUserExternalTag = 2;
+    engine.Initialize(data);
+    loop.RunUntilIdle();
+
+    ASSERT_FALSE(spy.EnrollPayloads().empty());
+    EXPECT_EQ(spy.EnrollPayloads().front(),
+              "<chat ver=\"1.0\"><mtype>5</mtype><NodeID>7</NodeID>"
+              "<UserName><![CDATA[Ann]]></UserName><RoleSet>7</RoleSet><Visible>1</Visible>"
+              "<UserType>1</UserType><FName><![CDATA[Ann]]></FName><Phone>1 &amp; 2</Phone>"
+              "<GuestID>555</GuestID><UIT>2</UIT></chat>");
+}
+
+struct ConnectCase {
+    int connectResult;
+    bool joins;
+};
+
+class ConnectResultTest : public SessionTest, public ::testing::WithParamInterface<ConnectCase> {};
+
+TEST_P(ConnectResultTest, ConnectResultDecidesWhetherTheChainGoesOn) {
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    SpyArmClient spy(client);
+    client->FailNext(ArmOperation::Connect, GetParam().connectResult);
+    CChatClient engine;
+    engine.Initialize(Data(&spy, 7, "Alice"));
+    loop.RunUntilIdle();
+    if (GetParam().joins) {
+        EXPECT_EQ(spy.Count("ConferenceJoin"), 1u);
+        EXPECT_EQ(engine.State(), kStateEnrolled);
+    } else {
+        // The session ends at once, but the window is made and the tick still runs.
+        EXPECT_EQ(spy.Count("ConferenceJoin"), 0u);
+        EXPECT_TRUE(spy.Released());
+        EXPECT_EQ(engine.ArmClient(), nullptr);
+        EXPECT_NE(engine.ChatUI(), nullptr);
+        EXPECT_TRUE(engine.TimerInstalled());
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Results, ConnectResultTest,
+                         ::testing::Values(ConnectCase{1202, true}, ConnectCase{1, false},
+                                           ConnectCase{19, false}));
+
+TEST_F(SessionTest, AlreadyConnectedGoesStraightIntoConferenceJoin) {
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    SpyArmClient spy(client);
+    client->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
+    TraceCapture capture;
+    CChatClient engine;
+    engine.Initialize(Data(&spy, 7, "Alice"));
+    // Joined within Initialize, without waiting for a confirmation.
+    EXPECT_EQ(Prefix(spy.Calls(), 2), (std::vector<std::string>{"Connect", "ConferenceJoin"}));
+    EXPECT_TRUE(capture.Has("CChatClient::already connected, now call ConnectConfirm() myself"));
+    loop.RunUntilIdle();
+    EXPECT_EQ(engine.State(), kStateEnrolled);
+}
+
+TEST_F(SessionTest, AlreadyJoinedAttachesWithinTheSameCall) {
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    SpyArmClient spy(client);
+    client->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
+    client->FailNext(ArmOperation::ConferenceJoin, kArmAlreadyJoined);
+    CChatClient engine;
+    engine.Initialize(Data(&spy, 7, "Alice"));
+    EXPECT_EQ(Prefix(spy.Calls(), 3),
+              (std::vector<std::string>{"Connect", "ConferenceJoin", "ApeAttach"}));
+    EXPECT_EQ(engine.State(), kStateAttaching);
+}
+
+TEST_F(SessionTest, ConnectConfirmRetryConnectsAgainBoundedByTheService) {
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    SpyArmClient spy(client);
+    client->ConfirmNextWith(ArmConfirmation::ConnectConfirm, kArmRetry, 2);
+    CChatClient engine;
+    engine.Initialize(Data(&spy, 7, "Alice"));
+    loop.RunUntilIdle();
+    EXPECT_EQ(spy.Count("Connect"), 3u);
+    EXPECT_EQ(engine.State(), kStateEnrolled);
+}
+
+TEST_F(SessionTest, AttachFailuresEndInIdle) {
+    {
+        InProcessArmClient* client = conference.CreateClient(loop, 7);
+        SpyArmClient spy(client);
+        client->FailNext(ArmOperation::ApeAttach, 5);
+        TraceCapture capture;
+        CChatClient engine;
+        engine.Initialize(Data(&spy, 7, "Alice"));
+        loop.RunUntilIdle();
+        EXPECT_EQ(engine.State(), kStateIdle);
+        EXPECT_EQ(spy.Count("ApeEnroll"), 0u);
+        EXPECT_TRUE(capture.Has(TraceLevel::Error,
+                                "CChatClient::m_pArmClient->Attach user failed, nRetCode=5, "
+                                "nRetCode"));
+    }
+    {
+        InProcessArmClient* client = conference.CreateClient(loop, 8);
+        SpyArmClient spy(client);
+        client->ConfirmNextWith(ArmConfirmation::ApeAttachConfirm, 3);
+        CChatClient engine;
+        engine.Initialize(Data(&spy, 8, "Bob"));
+        loop.RunUntilIdle();
+        EXPECT_EQ(engine.State(), kStateIdle);
+        EXPECT_TRUE(spy.Released());
+        EXPECT_EQ(spy.Count("ApeEnroll"), 0u);
+    }
+}
+
+TEST_F(SessionTest, EnrollFailureAndRefusalReleaseTheServiceAndClearEnrolled) {
+    {
+        InProcessArmClient* client = conference.CreateClient(loop, 7);
+        SpyArmClient spy(client);
+        client->FailNext(ArmOperation::ApeEnroll, 9);
+        TraceCapture capture;
+        CChatClient engine;
+        engine.Initialize(Data(&spy, 7, "Alice"));
+        loop.RunUntilIdle();
+        EXPECT_EQ(engine.State(), kStateIdle);
+        EXPECT_TRUE(
+            capture.Has(TraceLevel::Error, "CChatClient::ApeEnroll failed. nRetCode = 9. "));
+    }
+    for (ArmConfirmation refusal :
+         {ArmConfirmation::ApeEnrollConfirm, ArmConfirmation::EnrollResourceStatus}) {
+        InProcessArmClient* client = conference.CreateClient(loop, 8);
+        SpyArmClient spy(client);
+        client->ConfirmNextWith(refusal, 4);
+        CChatClient engine;
+        engine.Initialize(Data(&spy, 8, "Bob"));
+        loop.RunUntilIdle();
+        EXPECT_EQ(engine.State(), kStateIdle);
+        EXPECT_EQ(engine.Enrolled(), 0);
+        EXPECT_TRUE(spy.Released());
+        EXPECT_EQ(spy.Count("AllocNameHandle"), 0u);
+        // Roles change after the refusal: the tick must not reach for the released service.
+        engine.SetRosters(ROLE_HOST, 0);
+        loop.AdvanceBy(5.0);
+        EXPECT_EQ(spy.Count("ApeEnroll"), 1u);
+    }
+}
+
+TEST_F(SessionTest, EnrollConfirmationWithoutResourceChangesNothing) {
+    CChatClient engine;
+    EXPECT_EQ(engine.ApeEnrollConfirm(1, 0, 0, nullptr), 0);
+    EXPECT_EQ(engine.Enrolled(), 0);
+    EXPECT_EQ(engine.SessionValue(), 0u);
+    EXPECT_EQ(engine.State(), kStateIdle);
+}
+
+TEST_F(SessionTest, SetRosterStatusReEnrollsOnlyOnChange) {
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    SpyArmClient spy(client);
+    CChatClient engine;
+    engine.Initialize(Data(&spy, 7, "Alice"));
+    loop.RunUntilIdle();
+    ASSERT_EQ(spy.Count("ApeEnroll"), 1u);
+    loop.AdvanceBy(10.0);  // let the start-up countdown finish
+    ASSERT_EQ(engine.PrivilegeCountdown(), 0);
+
+    engine.SetRosterStatus(1, 1);
+    EXPECT_EQ(spy.Count("ApeEnroll"), 1u);
+    EXPECT_EQ(engine.PrivilegeCountdown(), 0);
+
+    engine.SetRosterStatus(0, 1);
+    EXPECT_EQ(spy.Count("ApeEnroll"), 2u);
+    EXPECT_EQ(engine.NeedRosterInfo(), 0);
+    EXPECT_EQ(engine.PrivilegeCountdown(), 5);
+
+    engine.SetRosterStatus(7, 7);  // values other than 0 and 1 change nothing
+    EXPECT_EQ(spy.Count("ApeEnroll"), 2u);
+    EXPECT_EQ(engine.NeedRosterInfo(), 0);
+    EXPECT_EQ(engine.BroadcastRosterInfo(), 1);
+}
+
+TEST_F(SessionTest, SetRosterStatusWithoutServiceDoesNotCrash) {
+    CChatClient engine;
+    EXPECT_EQ(engine.SetRosterStatus(0, 0), 0);
+    EXPECT_EQ(engine.NeedRosterInfo(), 0);
+    EXPECT_EQ(engine.BroadcastRosterInfo(), 0);
+    EXPECT_EQ(engine.Enroll(), 1);
+}
+
+TEST_F(SessionTest, PrivilegesAreReappliedOnTheNinthTick) {
+    CChatClient engine;
+    engine.Initialize(Data(nullptr, 7, "Alice"));
+    ASSERT_EQ(engine.PrivilegeCountdown(), 1);
+    ASSERT_EQ(engine.PrivilegePending(), 1);
+    TraceCapture capture;
+    loop.AdvanceBy(1.0);  // first tick
+    EXPECT_EQ(engine.PrivilegeCountdown(), 2);
+    loop.AdvanceBy(0.5 * 7);  // ticks two to eight
+    EXPECT_EQ(engine.PrivilegeCountdown(), 9);
+    EXPECT_EQ(engine.PrivilegePending(), 1);
+    loop.AdvanceBy(0.5);  // the ninth tick
+    EXPECT_EQ(engine.PrivilegeCountdown(), 0);
+    EXPECT_EQ(engine.PrivilegePending(), 0);
+    EXPECT_EQ(engine.StartupTicks(), 10);
+    loop.AdvanceBy(0.5 * 11);
+    EXPECT_EQ(engine.StartupTicks(), 0);
+}
+
+TEST_F(SessionTest, TickClosesTheAttendeePickerOnceItsWarningIsGone) {
+    CChatClient engine;
+    engine.Initialize(Data(nullptr, 7, "Alice"));
+    RecordingWindow* window = RecordingWindow::Latest();
+    ASSERT_NE(window, nullptr);
+    window->warningShowing = 1;
+    engine.CloseSeltAttDlg();
+    window->Clear();
+    loop.AdvanceBy(1.0);
+    EXPECT_EQ(window->Ids(), std::vector<int>{msg_CloseAttendeeWarning});
+    window->warningShowing = 0;
+    window->Clear();
+    loop.AdvanceBy(0.5);
+    EXPECT_EQ(window->Ids(), (std::vector<int>{msg_CloseAttendeeWarning, msg_CloseAttendeeDialog}));
+    window->Clear();
+    loop.AdvanceBy(0.5);
+    EXPECT_TRUE(window->Ids().empty());
+}
+
+TEST_F(SessionTest, RolesChangedBeforeEnrolmentAreEnrolledByTheTick) {
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    SpyArmClient spy(client);
+    CChatClient engine;
+    engine.Initialize(Data(&spy, 7, "Alice"));
+    EXPECT_EQ(engine.SetRosters(ROLE_PRESENTER, 0), 0);  // not enrolled yet: pending
+    loop.RunUntilIdle();
+    ASSERT_EQ(spy.Count("ApeEnroll"), 1u);
+    loop.AdvanceBy(1.0);
+    EXPECT_EQ(spy.Count("ApeEnroll"), 2u);
+    loop.AdvanceBy(1.0);
+    EXPECT_EQ(spy.Count("ApeEnroll"), 2u);
+}
+
+TEST_F(SessionTest, CleanupIsSafeTwiceAndReleasesOnce) {
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    SpyArmClient spy(client);
+    CChatClient engine;
+    engine.Initialize(Data(&spy, 7, "Alice"));
+    loop.RunUntilIdle();
+    engine.Cleanup();
+    engine.Cleanup();
+    EXPECT_EQ(spy.Count("Release"), 1u);
+    EXPECT_EQ(spy.Count("ApeDetach"), 1u);
+    EXPECT_EQ(engine.ChatUI(), nullptr);
+    EXPECT_EQ(engine.RecoveryMgr(), nullptr);
+    EXPECT_EQ(engine.ArmClient(), nullptr);
+    EXPECT_EQ(Prefix(std::vector<std::string>(spy.Calls().end() - 4, spy.Calls().end()), 4),
+              (std::vector<std::string>{"ApeDetach", "ConferenceLeave", "Destroy", "Release"}));
+}
+
+TEST_F(SessionTest, SecondInitializeKeepsTheFirstServiceWindowAndTimer) {
+    InProcessArmClient* first = conference.CreateClient(loop, 7);
+    InProcessArmClient* second = conference.CreateClient(loop, 8);
+    SpyArmClient spyFirst(first);
+    SpyArmClient spySecond(second);
+    CChatClient engine;
+    engine.Initialize(Data(&spyFirst, 7, "Alice"));
+    loop.RunUntilIdle();
+    const ChatUIHandle window = engine.ChatUI();
+    engine.Initialize(Data(&spySecond, 7, "Alice"));
+    loop.RunUntilIdle();
+    EXPECT_EQ(engine.ArmClient(), &spyFirst);
+    EXPECT_TRUE(spySecond.Calls().empty());
+    EXPECT_EQ(spyFirst.Count("Connect"), 2u);
+    EXPECT_EQ(engine.ChatUI(), window);
+    EXPECT_EQ(RecordingWindow::Latest(), window);
+    // One timer: each tick moves the restarted countdown by exactly one.
+    ASSERT_EQ(engine.PrivilegeCountdown(), 1);
+    loop.AdvanceBy(1.0);
+    EXPECT_EQ(engine.PrivilegeCountdown(), 2);
+    loop.AdvanceBy(0.5);
+    EXPECT_EQ(engine.PrivilegeCountdown(), 3);
+}
+
+TEST_F(SessionTest, DeletingWithCallbacksInFlightDeliversNothingMore) {
+    InProcessArmClient* client = conference.CreateClient(loop, 7);
+    auto engine = std::make_unique<CChatClient>();
+    engine->Initialize(Data(client, 7, "Alice"));
+    loop.RunUntilIdle();
+    // A change that makes the engine write to the service, then delete it before answers come.
+    engine->SetRosterStatus(0, 0);
+    EXPECT_GT(loop.PendingTasks(), 0u);
+    engine.reset();
+    loop.AdvanceBy(5.0);
+    EXPECT_EQ(conference.ClientCount(), 0u);
+}
+
+TEST_F(SessionTest, NullNamesLeaveStringsEmptyAndTagModeZeroKeepsTag) {
+    CChatClient engine;
+    _tagChatData data = Data(nullptr, 7, nullptr);
+    data.lpszReserved = nullptr;
+    data.lExternalTagMode = 0;
+    data.dwUserExternalTag = 2;
+    engine.Initialize(data);
+    EXPECT_TRUE(engine.MyName().empty());
+    EXPECT_TRUE(engine.Reserved().empty());
+    EXPECT_EQ(engine.UserExternalTag(), 0u);
+    data.lExternalTagMode = 1;
+    data.dwUserExternalTag = 1;
+    data.lpszReserved = "r";
+    engine.Initialize(data);
+    EXPECT_EQ(engine.UserExternalTag(), 1u);
+    EXPECT_EQ(engine.Reserved(), "r");
+}
+
+}  // namespace
