@@ -1,0 +1,368 @@
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "engine/users_group.h"
+#include "engine/users_group_list.h"
+
+namespace {
+
+using Bytes = std::vector<unsigned char>;
+
+// A role group: type 1, id 8, name "All Attendees", label "att", members 7 and 9.
+const Bytes kRoleGroupBytes = {
+    0x00, 0x00, 0x00, 0x01,                                    // type
+    0x00, 0x00, 0x00, 0x08,                                    // id
+    0x00, 0x00, 0x00, 0x0E, 'A',  'l',  'l',  ' ',  'A', 't',  // name, 14 bytes with the 0
+    't',  'e',  'n',  'd',  'e',  'e',  's',  0x00,            //
+    0x00, 0x00, 0x00, 0x04, 'a',  't',  't',  0x00,            // label
+    0x00, 0x00, 0x00, 0x02,                                    // member count
+    0x00, 0x00, 0x00, 0x07, 0x00, 0x00, 0x00, 0x09,            // members
+};
+// Offset of the member count in kRoleGroupBytes.
+constexpr std::size_t kCountOffset = 34;
+
+std::unique_ptr<CUsersGroup> MakeGroup(std::uint32_t type, std::uint32_t id, const char* name,
+                                       std::int32_t members = 0) {
+    std::unique_ptr<CUsersGroup> group(new CUsersGroup);
+    group->SetGroupType(type);
+    group->SetGroupId(id);
+    group->SetGrpName(name);
+    for (std::int32_t i = 0; i < members; ++i)
+        group->AddAMember(1000 + id * 10 + i);
+    return group;
+}
+
+// Appends a group and returns it.
+CUsersGroup* Append(CUsersGroupList& list, std::unique_ptr<CUsersGroup> group) {
+    CUsersGroup* raw = group.get();
+    EXPECT_EQ(list.InsertGroup(static_cast<std::uint32_t>(list.GetGroupsCount()), std::move(group)),
+              1);
+    return raw;
+}
+
+std::vector<std::uint32_t> Ids(const CUsersGroupList& list) {
+    std::vector<std::uint32_t> ids;
+    for (std::int32_t i = 0; i < list.GetGroupsCount(); ++i) {
+        ids.push_back(list.GetGroupByIndex(i)->GetGroupId());
+    }
+    return ids;
+}
+
+}  // namespace
+
+TEST(CUsersGroup, FactNameWrapsTheGroupName) {
+    CUsersGroup group;
+    group.SetGrpName("Panel");
+    EXPECT_STREQ(group.SetFactName("chat"), "chat(|(Panel)|)");
+    EXPECT_STREQ(group.GetFactName(), "chat(|(Panel)|)");
+    CUsersGroup nameless;
+    EXPECT_STREQ(nameless.SetFactName("t"), "t(|()|)");
+}
+
+TEST(CUsersGroup, SetGroupReadsAWholeRoleGroup) {
+    CUsersGroup group;
+    group.AddAMember(1);
+    ASSERT_EQ(group.SetGroup(kRoleGroupBytes.data(), kRoleGroupBytes.size()), 1);
+    EXPECT_EQ(group.GetGroupType(), 1u);
+    EXPECT_EQ(group.GetGroupId(), 8u);
+    EXPECT_STREQ(group.GetGrpName(), "All Attendees");
+    EXPECT_STREQ(group.GetGrpLabel(), "att");
+    ASSERT_EQ(group.GetMemberCount(), 2);  // the earlier member is gone
+    EXPECT_EQ(group.GetMember(0), 7u);
+    EXPECT_EQ(group.GetMember(1), 9u);
+    // Clearing first also drops the cache record.
+    EXPECT_EQ(group.GetCacheName(), nullptr);
+}
+
+TEST(CUsersGroup, SetGroupStopsAfterTheTypeOfASeparator) {
+    const Bytes separator = {0x00, 0x00, 0x00, 0x02};
+    CUsersGroup group;
+    EXPECT_EQ(group.SetGroup(separator.data(), separator.size()), 1);
+    EXPECT_EQ(group.GetGroupType(), 2u);
+    EXPECT_EQ(group.GetGrpName(), nullptr);
+}
+
+TEST(CUsersGroup, SetGroupRefusesIncompleteOrLyingData) {
+    Bytes zeroCount(kRoleGroupBytes.begin(), kRoleGroupBytes.begin() + kCountOffset);
+    zeroCount.insert(zeroCount.end(), {0, 0, 0, 0});
+    Bytes lyingCount = kRoleGroupBytes;
+    lyingCount[kCountOffset + 3] = 3;
+    Bytes hugeCount = kRoleGroupBytes;
+    hugeCount[kCountOffset] = 0xFF;
+    Bytes noLabel(kRoleGroupBytes.begin(), kRoleGroupBytes.begin() + 26);
+    noLabel.insert(noLabel.end(), {0, 0, 0, 0, 0, 0, 0, 1, 0, 0, 0, 7});
+    const Bytes noName = {0, 0, 0, 1, 0, 0, 0, 8, 0, 0, 0, 0};
+    struct Case {
+        const char* what;
+        Bytes data;
+    };
+    std::vector<Case> cases = {{"member count 0", zeroCount},
+                               {"count above the members", lyingCount},
+                               {"count beyond any size", hugeCount},
+                               {"null label", noLabel},
+                               {"null name", noName}};
+    // Every cut of the complete group ends too early.
+    for (std::size_t size = 1; size < kRoleGroupBytes.size(); ++size) {
+        cases.push_back(
+            {"truncated", Bytes(kRoleGroupBytes.begin(), kRoleGroupBytes.begin() + size)});
+    }
+    for (const Case& c : cases) {
+        SCOPED_TRACE(std::string(c.what) + ", size " + std::to_string(c.data.size()));
+        // The stream may read only the given bytes: a copy on the heap lets a sanitizer see
+        // any read past them.
+        std::unique_ptr<unsigned char[]> exact(new unsigned char[c.data.size()]);
+        std::memcpy(exact.get(), c.data.data(), c.data.size());
+        CUsersGroup group;
+        group.SetGrpName("old");
+        EXPECT_EQ(group.SetGroup(exact.get(), static_cast<std::uint32_t>(c.data.size())), 0);
+        EXPECT_EQ(group.GetGrpName(), nullptr);
+        EXPECT_EQ(group.GetGrpLabel(), nullptr);
+        EXPECT_EQ(group.GetMemberCount(), 0);
+    }
+    CUsersGroup group;
+    EXPECT_EQ(group.SetGroup(nullptr, 4), 0);
+    EXPECT_EQ(group.SetGroup(kRoleGroupBytes.data(), 0), 0);
+}
+
+TEST(CUsersGroup, FlagSchemesStoreWholeOrUnpacked) {
+    struct Case {
+        std::uint32_t value;
+        bool packed;
+        std::uint32_t flags, bit1, bit2, bit3;
+        bool listed;
+    };
+    const Case cases[] = {
+        {0x1F, false, 0x1F, 0, 1, 0, true},  // first scheme: whole value, bits untouched
+        {0x0B, true, 1, 1, 0, 1, false},
+        {0x14, true, 0, 0, 1, 0, true},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.value);
+        CUsersGroup group;
+        group.SetFlags(c.value, c.packed);
+        EXPECT_EQ(group.GetFlags(), c.flags);
+        EXPECT_EQ(group.GetFlagBit1(), c.bit1);
+        EXPECT_EQ(group.GetFlagBit2(), c.bit2);
+        EXPECT_EQ(group.GetFlagBit3(), c.bit3);
+        EXPECT_EQ(group.IsListed(), c.listed);
+    }
+}
+
+TEST(CUsersGroup, StringsAreReplacedOnlyByText) {
+    CUsersGroup group;
+    EXPECT_EQ(group.SetPrivateChatLabel("private"), nullptr);  // no label yet
+    EXPECT_STREQ(group.SetGrpName("Host"), "Host");
+    EXPECT_EQ(group.SetGrpName(nullptr), nullptr);
+    EXPECT_STREQ(group.GetGrpName(), "Host");
+    group.SetGroupNameLabel(nullptr, "host label");
+    EXPECT_STREQ(group.GetGrpName(), "Host");
+    EXPECT_STREQ(group.GetGrpLabel(), "host label");
+    EXPECT_STREQ(group.SetPrivateChatLabel("private"), "private");
+    EXPECT_EQ(group.SetPrivateChatLabel(nullptr), nullptr);
+    EXPECT_EQ(group.GetPrivateChatLabel(), nullptr);
+}
+
+TEST(CUsersGroup, CacheRecordHoldsSixtyFourCharactersUntilDeleted) {
+    CUsersGroup group;
+    EXPECT_STREQ(group.GetCacheName(), "");
+    group.SetCacheName(std::string(70, 'c').c_str());
+    group.SetCacheHandle(42);
+    EXPECT_EQ(std::string(group.GetCacheName()), std::string(64, 'c'));
+    EXPECT_EQ(group.GetCacheHandle(), 42u);
+
+    group.SetGrpName("n");
+    group.AddAMember(3);
+    EXPECT_EQ(group.DeleteMembers(), 1);
+    EXPECT_EQ(group.GetCacheName(), nullptr);
+    EXPECT_EQ(group.GetCacheHandle(), 0u);
+    group.SetCacheName("again");
+    group.SetCacheHandle(7);
+    EXPECT_EQ(group.GetCacheName(), nullptr);
+    EXPECT_EQ(group.GetCacheHandle(), 0u);
+    EXPECT_EQ(group.GetGrpName(), nullptr);
+    EXPECT_EQ(group.GetMemberCount(), 0);
+}
+
+TEST(CUsersGroup, MembersKeepTheirOrder) {
+    CUsersGroup group;
+    const std::uint32_t a = 5, c = 8;
+    const std::uint32_t* withHole[] = {&a, nullptr, &c};
+    const std::uint32_t* nullFirst[] = {nullptr, &a};
+    group.SetGroupMembers(2, nullFirst);
+    group.SetGroupMembers(0, withHole);
+    EXPECT_EQ(group.GetMemberCount(), 0);
+    group.SetGroupMembers(3, withHole);
+    EXPECT_EQ(group.InsertAMember(6, 1), 1);
+    EXPECT_EQ(group.InsertAMember(9, 4), 0);
+    EXPECT_EQ(group.AddAMember(5), 1);
+    ASSERT_EQ(group.GetMemberCount(), 4);
+    EXPECT_EQ(group.IsUserInTheGroup(6), 1);
+    EXPECT_EQ(group.IsUserInTheGroup(8), 2);
+    EXPECT_EQ(group.IsUserInTheGroup(9), -1);
+    EXPECT_EQ(group.RemoveAMember(5), 1);  // the first 5 only
+    EXPECT_EQ(group.IsUserInTheGroup(5), 2);
+    EXPECT_EQ(group.RemoveAMember(9), 0);
+}
+
+TEST(CUsersGroup, CopiesAreIndependent) {
+    CUsersGroup original;
+    original.SetGrpName("name");
+    original.AddAMember(4);
+    original.SetCacheName("cache");
+    CUsersGroup copy(original);
+    copy.SetGrpName("other");
+    copy.AddAMember(5);
+    copy.SetCacheName("other cache");
+    EXPECT_STREQ(original.GetGrpName(), "name");
+    EXPECT_EQ(original.GetMemberCount(), 1);
+    EXPECT_STREQ(original.GetCacheName(), "cache");
+    EXPECT_STREQ(copy.GetGrpName(), "other");
+    EXPECT_EQ(copy.GetMember(0), 4u);
+}
+
+TEST(CUsersGroupList, GetGroupInfoLooksOnlyAtTheFirstGroupOfTypeAndId) {
+    CUsersGroupList list;
+    Append(list, MakeGroup(1, 1, nullptr));
+    Append(list, MakeGroup(1, 1, "Host"));
+    Append(list, MakeGroup(1, 8, "All Attendees"));
+    Append(list, MakeGroup(1, 8, "Second"));
+    std::int32_t position = 99;
+    EXPECT_EQ(list.GetGroupInfo(1, 8, "all ATTENDEES", &position), list.GetGroupByIndex(2));
+    EXPECT_EQ(position, 2);
+    EXPECT_EQ(list.GetGroupInfo(1, 8, nullptr, &position), list.GetGroupByIndex(2));
+    EXPECT_EQ(list.GetGroupInfo(1, 8, "Second", &position), nullptr);
+    EXPECT_EQ(position, -1);
+    // The first host group has no name: a named look-up finds nothing and does not crash.
+    EXPECT_EQ(list.GetGroupInfo(1, 1, "Host"), nullptr);
+    EXPECT_EQ(list.GetGroupInfo(3, 8, nullptr), nullptr);
+}
+
+TEST(CUsersGroupList, GetGroupInfo2PrefersANamelessGroupElseTheLast) {
+    CUsersGroupList list;
+    Append(list, MakeGroup(1, 8, "First"));
+    Append(list, MakeGroup(1, 8, "Last"));
+    Append(list, MakeGroup(1, 1, "Host"));
+    Append(list, MakeGroup(1, 1, nullptr));
+    Append(list, MakeGroup(1, 1, nullptr));
+    std::int32_t position = 99;
+    EXPECT_EQ(list.GetGroupInfo2(1, 8, nullptr, &position), list.GetGroupByIndex(1));
+    EXPECT_EQ(position, 1);
+    EXPECT_EQ(list.GetGroupInfo2(1, 1, nullptr, &position), list.GetGroupByIndex(3));
+    EXPECT_EQ(position, 3);
+    EXPECT_EQ(list.GetGroupInfo2(1, 8, "FIRST"), list.GetGroupByIndex(0));
+    EXPECT_EQ(list.GetGroupInfo2(1, 8, "Last"), nullptr);
+    EXPECT_EQ(list.GetGroupInfo2(2, 0, nullptr, &position), nullptr);
+    EXPECT_EQ(position, -1);
+}
+
+TEST(CUsersGroupList, InsertGroupAppendsForPositionsOutsideTheList) {
+    CUsersGroupList list;
+    EXPECT_EQ(list.InsertGroup(0, nullptr), -1);
+    EXPECT_EQ(list.InsertGroup(5, MakeGroup(1, 1, "a")), 1);
+    EXPECT_EQ(list.InsertGroup(0, MakeGroup(1, 2, "b")), 1);
+    EXPECT_EQ(list.InsertGroup(0xFFFFFFFFu, MakeGroup(1, 3, "c")), 1);
+    EXPECT_EQ(list.InsertGroup(1, MakeGroup(1, 4, "d")), 1);
+    EXPECT_EQ(Ids(list), (std::vector<std::uint32_t>{2, 4, 1, 3}));
+}
+
+TEST(CUsersGroupList, InsertGroup2FollowsTheKeyedGroupOrGoesToTheFront) {
+    CUsersGroupList list;
+    EXPECT_EQ(list.InsertGroup2(0, nullptr), -1);
+    ASSERT_EQ(list.InsertGroup2(5, MakeGroup(1, 1, "a")), 1);  // nobody has 5: front
+    const CUsersGroup* first = list.GetGroupByIndex(0);
+    EXPECT_EQ(first->GetSequence(), 1u);
+    EXPECT_EQ(first->GetInsertPosition(), 0);
+    ASSERT_EQ(list.InsertGroup2(1, MakeGroup(1, 2, "b")), 1);  // after sequence 1
+    EXPECT_EQ(list.GetGroupByIndex(1)->GetSequence(), 2u);
+    EXPECT_EQ(list.GetGroupByIndex(1)->GetInsertPosition(), 1);
+    ASSERT_EQ(list.InsertGroup2(1, MakeGroup(1, 3, "c")), 1);  // after sequence 1 again
+    ASSERT_EQ(list.InsertGroup2(9, MakeGroup(1, 4, "d")), 1);  // unknown: front
+    EXPECT_EQ(Ids(list), (std::vector<std::uint32_t>{4, 1, 3, 2}));
+    EXPECT_EQ(list.GetInsertIndex(3), 3);
+    EXPECT_EQ(list.GetInsertIndex(7), -1);
+}
+
+TEST(CUsersGroupList, RowsCountAHeaderAndOneRowPerMember) {
+    CUsersGroupList list;
+    EXPECT_EQ(list.GetInsertPosition(3), -1);
+    Append(list, MakeGroup(3, 20, "a", 2));
+    CUsersGroup* hidden = Append(list, MakeGroup(3, 21, "b", 0));
+    Append(list, MakeGroup(3, 22, "c", 1));
+    list.ReArrangeGroupIndex();
+    EXPECT_EQ(list.GetGroupByIndex(0)->GetFirstRow(), 0);
+    EXPECT_EQ(list.GetGroupByIndex(1)->GetFirstRow(), 3);
+    EXPECT_EQ(list.GetGroupByIndex(2)->GetFirstRow(), 4);
+    EXPECT_EQ(list.GetInsertPosition(2), 4);
+    EXPECT_EQ(list.GetInsertPosition(10), 6);
+    EXPECT_EQ(list.GetInsertPosition(0), 0);
+    // Group 22's member is the row below its header.
+    EXPECT_TRUE(list.IsUserInSameSel(1220, 5));
+    EXPECT_FALSE(list.IsUserInSameSel(1220, 4));
+    EXPECT_TRUE(list.IsUserInSameSel(1201, 2));
+
+    hidden->SetFlags(0x00, true);  // not listed
+    hidden->AddAMember(77);
+    list.ReArrangeGroupIndex2();
+    EXPECT_EQ(list.GetGroupByIndex(2)->GetFirstRow(), 3);
+    EXPECT_EQ(hidden->GetFirstRow(), 3);  // left as it was
+}
+
+TEST(CUsersGroupList, LabelsComeFromTheFirstLabelledGroupOfTheId) {
+    CUsersGroupList list;
+    const std::uint32_t ids[] = {1, 2, 3, 4, 7, 8};
+    Append(list, MakeGroup(1, 1, "unlabelled host"));
+    for (std::uint32_t id : ids) {
+        CUsersGroup* group = Append(list, MakeGroup(1, id, "n"));
+        group->SetGrpLabel(("label " + std::to_string(id)).c_str());
+    }
+    EXPECT_STREQ(list.GetHostRoleGrpLabel_M().get(), "label 1");
+    EXPECT_STREQ(list.GetPresenterRoleGrpLabel_M().get(), "label 2");
+    EXPECT_STREQ(list.GetHostPresenterRoleLabel_M().get(), "label 3");
+    EXPECT_STREQ(list.GetAllPanelistsRoleLabel_M().get(), "label 4");
+    EXPECT_STREQ(list.GetHostPresenterPanelistRoleLabel_M().get(), "label 7");
+    EXPECT_STREQ(list.GetAllAttendeesRoleLabel_M().get(), "label 8");
+    EXPECT_EQ(list.GetSpecificRoleGroupLabel_M(15), nullptr);
+    // The copy belongs to the caller.
+    std::unique_ptr<char[]> copy = list.GetHostRoleGrpLabel_M();
+    copy[0] = 'X';
+    EXPECT_STREQ(list.GetHostRoleGrpLabel_M().get(), "label 1");
+}
+
+TEST(CUsersGroupList, FindModifyAndDeleteGroups) {
+    CUsersGroupList list;
+    Append(list, MakeGroup(1, 1, "Host"));
+    Append(list, MakeGroup(3, 30, "ids", 2));
+    EXPECT_FALSE(list.HasPanelistGroup());
+    Append(list, MakeGroup(1, 4, nullptr));
+    EXPECT_TRUE(list.HasPanelistGroup());
+
+    EXPECT_EQ(list.FindGroupFromGrpId(30), list.GetGroupByIndex(1));
+    EXPECT_EQ(list.FindGroupFromGrpNames("Host"), list.GetGroupByIndex(0));
+    EXPECT_EQ(list.FindGroupFromGrpNames("host"), nullptr);
+    EXPECT_EQ(list.FindGroupFromGrpNames(nullptr), nullptr);
+    EXPECT_EQ(list.FindGroupFromSpecificNodeId(1301), list.GetGroupByIndex(1));
+    EXPECT_EQ(list.FindGroupFromSpecificNodeId(1), nullptr);
+
+    std::unique_ptr<CUsersGroup> replacement = MakeGroup(1, 30, "renamed", 1);
+    EXPECT_EQ(list.ModifyGroup(*replacement), 1);
+    replacement->SetGrpName("changed afterwards");
+    EXPECT_STREQ(list.GetGroupByIndex(1)->GetGrpName(), "renamed");
+    EXPECT_EQ(list.GetGroupByIndex(1)->GetMemberCount(), 1);
+    EXPECT_EQ(list.ModifyGroup(*MakeGroup(1, 99, "x")), 0);
+
+    EXPECT_EQ(list.AddGroup(*MakeGroup(1, 8, "All Attendees")), 1);
+    EXPECT_EQ(Ids(list), (std::vector<std::uint32_t>{1, 30, 4, 8}));
+    EXPECT_EQ(list.DeleteGroup(*MakeGroup(0, 30, nullptr)), 1);
+    EXPECT_EQ(list.DeleteGroup(*MakeGroup(0, 30, nullptr)), 0);
+    EXPECT_EQ(list.DeleteGroupbyIndex(0), 1);
+    EXPECT_EQ(list.DeleteGroupbyIndex(2), 0);
+    EXPECT_EQ(list.DeleteGroupbyIndex(-1), 0);
+    EXPECT_EQ(Ids(list), (std::vector<std::uint32_t>{4, 8}));
+    list.CleanUp();
+    EXPECT_EQ(list.GetGroupsCount(), 0);
+    EXPECT_EQ(list.GetDefautGroup(0), nullptr);
+}
