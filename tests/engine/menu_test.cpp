@@ -1,0 +1,364 @@
+// The send-to menu model: where participant and recent entries go, how they come out, and
+// whom the local participant can select. Each scenario checks the menu and the exact
+// commands the window saw.
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "tests/engine/menu_harness.h"
+#include "tests/support/trace_capture.h"
+
+using namespace menutest;
+
+namespace {
+
+using Strings = std::vector<std::string>;
+using Seed = std::vector<std::pair<std::string, std::uint32_t>>;
+
+constexpr std::uint32_t kQM = FEATURE_QM_MODE;
+
+const Seed kPanelTail = {
+    {"---", 0}, {"All Participants", 15}, {"---", 0}, {"Select an Attendee...", 16}};
+
+struct InsertCase {
+    const char* scenario;
+    Options options;
+    Seed seed;
+    Strings names;  // inserted in order as nodes 201, 202, ...
+    Strings menu;
+    Strings commands;
+};
+
+}  // namespace
+
+TEST(InsertChatUserName, PlacesAttendeesByMeetingTypeAndRules) {
+    const InsertCase cases[] = {
+        {"type 1: below All Attendees, case-insensitive, equal titles above",
+         {1},
+         {{"Host", 1}, {"All Attendees", 8}, {"All Panelists", 4}},
+         {"bob", "Alice", "carol", "BOB"},
+         {"Host", "All Attendees", "Alice", "BOB", "bob", "carol", "All Panelists"},
+         {"insert 2 bob", "insert 2 Alice", "insert 4 carol", "insert 3 BOB"}},
+        {"type 2 without All Attendees: appended",
+         {2},
+         {{"Host", 1}},
+         {"bob", "Alice"},
+         {"Host", "bob", "Alice"},
+         {"insert -1 bob", "insert -1 Alice"}},
+        {"QM: a separator opens the participant section under Everyone",
+         {1, false, 0, kQM},
+         {},
+         {"bob", "Alice"},
+         {"Everyone", "---", "Alice", "bob"},
+         {"insert -1 ---", "insert -1 bob", "insert 2 Alice"}},
+        {"type 3: attendees fenced between All Participants and the picker",
+         {3},
+         kPanelTail,
+         {"bob", "Alice"},
+         {"Host", "Presenter", "Host & Presenter", "---", "All Panelists", "---",
+          "All Participants", "---", "Alice", "bob", "---", "Select an Attendee..."},
+         {"insert 7 ---", "insert 8 bob", "insert 8 Alice"}},
+    };
+    for (const InsertCase& c : cases) {
+        SCOPED_TRACE(c.scenario);
+        MenuHarness h(c.options);
+        h.Seed(c.seed);
+        h.Commands();
+        for (std::size_t i = 0; i < c.names.size(); ++i)
+            h.engine.InsertChatUserName(c.names[i].c_str(), 201 + i, 0);
+        EXPECT_EQ(h.Titles(), c.menu);
+        EXPECT_EQ(h.Commands(), c.commands);
+    }
+}
+
+TEST(InsertChatUserName, LocalParticipantAndPracticeAddNothing) {
+    MenuHarness h({1});
+    h.Seed({{"All Attendees", 8}});
+    TraceCapture trace;
+    h.Commands();
+    h.engine.InsertChatUserName("me", kMyNode, 0);
+    EXPECT_FALSE(trace.Has("Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65607"));
+
+    h.engine.OnHostChanged(kMyNode);  // a privileged participant re-applies its privilege
+    trace.Clear();
+    h.engine.InsertChatUserName("me", kMyNode, 0);
+    EXPECT_TRUE(trace.Has("Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65607"));
+
+    MenuHarness attendee({1});
+    attendee.Seed({{"All Attendees", 8}});
+    attendee.engine.SetPracticeStatus(1);
+    attendee.Commands();
+    attendee.engine.InsertChatUserName("bob", 201, 0);
+    EXPECT_EQ(attendee.Titles(), Strings({"All Attendees"}));
+    EXPECT_EQ(attendee.Commands(), Strings());
+    EXPECT_EQ(h.Titles(), Strings({"All Attendees"}));
+}
+
+TEST(InsertChatUserName, SecondInsertOnlySelectsInThePanelMeeting) {
+    MenuHarness h({3});
+    h.Seed(kPanelTail);
+    h.engine.InsertChatUserName("bob", 201, 0);
+    h.Commands();
+    TraceCapture trace;
+    h.engine.InsertChatUserName("bob", 201, 1);
+    EXPECT_EQ(h.Commands(), Strings({"select 8"}));
+    EXPECT_TRUE(trace.Has("CChatClient::InsertChatUserName : bob all ready in list"));
+}
+
+TEST(InsertChatUserName, PrivateOnlyAttendeeInputFollowsParticipantEntries) {
+    MenuHarness h({1});
+    h.engine.OnPrivilegeChanged(0x8, 0);
+    h.Seed({{"All Attendees", 8}});
+    h.Commands();
+    h.engine.InsertChatUserName("bob", 201, 0);
+    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "input 1"}));
+    h.engine.RemoveChatUserName("bob", 201, 1);
+    EXPECT_EQ(h.Commands(), Strings({"remove 1", "input 0", "clear input"}));
+}
+
+TEST(InsertChatUserName, ReplacesADisabledSelection) {
+    MenuHarness h({1});
+    h.Seed({{"All Attendees", 8}, {"Host", 1}});
+    h.engine.SelectMenuItemByIndex(0);
+    h.engine.SetGroupMenuEnable(8, false);
+    h.Commands();
+    h.engine.InsertChatUserName("bob", 201, 0);
+    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "*bob", "Host"}));
+    EXPECT_EQ(h.Commands(), Strings({"insert 1 bob", "select 1"}));
+}
+
+TEST(SetGroupMenuEnable, TellsTheWindowOnlyOfChanges) {
+    MenuHarness h({1});
+    h.Seed({{"Host", 1}, {"All Attendees", 8}});
+    h.Commands();
+    TraceCapture trace;
+    h.engine.SetGroupMenuEnable(8, false);
+    h.engine.SetGroupMenuEnable(8, false);
+    h.engine.SetGroupMenuEnable(4, false);
+    h.engine.SetGroupMenuEnable(8, true);
+    EXPECT_EQ(h.Commands(), Strings({"update 1 off", "update 1 on"}));
+    EXPECT_TRUE(trace.Has("SetGroupMenuEnable inGroupID:8, bEnable:0."));
+}
+
+TEST(RemoveChatUserName, TidiesSeparatorsAndFallsBack) {
+    struct Case {
+        const char* scenario;
+        bool selector;
+        Seed seed;
+        bool disableEveryone;
+        Strings menu;
+        Strings commands;
+    };
+    const Case cases[] = {
+        {"selected entry gone: the everyone entry takes over",
+         false,
+         {{"All Participants", 15}, {"All Attendees", 8}},
+         false,
+         {"*All Participants", "All Attendees"},
+         {"remove 2", "select 0"}},
+        {"everyone disabled: the first enabled entry takes over",
+         false,
+         {{"All Participants", 15}, {"All Attendees", 8}},
+         true,
+         {"All Participants", "*All Attendees"},
+         {"remove 2", "select 1"}},
+        {"the trailing separator goes",
+         false,
+         {{"All Attendees", 8}, {"---", 0}},
+         false,
+         {"*All Attendees"},
+         {"remove 1", "remove 1", "select 0"}},
+        {"with the attendee picker the trailing separator stays",
+         true,
+         {{"All Attendees", 8}, {"---", 0}},
+         false,
+         {"*All Attendees", "---"},
+         {"remove 1", "select 0"}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.scenario);
+        MenuHarness h({1, c.selector});
+        h.Seed(c.seed);
+        h.engine.InsertChatUserName("bob", 201, 0);
+        if (c.disableEveryone) h.engine.SetGroupMenuEnable(15, false);
+        h.engine.SelectMenuItemByIndex(h.engine.GetIndexOfMenuByNodeID(201));
+        h.Commands();
+        h.engine.RemoveChatUserName("bob", 201, 0);
+        EXPECT_EQ(h.Titles(), c.menu);
+        EXPECT_EQ(h.Commands(), c.commands);
+    }
+}
+
+TEST(RemoveChatUserNameInQM, SelectedEntryLeavesAsDepartedAudience) {
+    MenuHarness h({1, false, 0, kQM});
+    h.engine.InsertChatUserName("bob", 201, 0);
+    h.engine.InsertChatUserName("carl", 202, 0);
+    h.engine.SelectMenuItemByIndexInQM(2);
+    h.Commands();
+    h.engine.RemoveChatUserNameInQM("carl", 202);
+    EXPECT_EQ(h.Commands(), Strings({"remove 3"}));
+    h.engine.RemoveChatUserNameInQM("bob", 201);
+    EXPECT_EQ(h.Commands(), Strings({"left 2", "input 0", "remove 1"}));
+    EXPECT_EQ(h.Titles(), Strings({"Everyone"}));
+}
+
+TEST(RecentEntries, PickerKeepsTwentyNewestFirst) {
+    MenuHarness h({1, true});
+    h.engine.OnHostChanged(kMyNode);
+    h.Seed({{"All Attendees", 8}});
+    std::vector<Person> people;
+    for (std::uint32_t i = 1; i <= 21; ++i)
+        people.push_back({200 + i, "u" + std::to_string(i)});
+    h.Enroll(people);
+    EXPECT_EQ(h.Titles(), Strings({"All Attendees"}));  // picked attendees only
+
+    for (std::uint32_t i = 1; i <= 20; ++i)
+        EXPECT_TRUE(h.engine.SelectUserByNodeID(200 + i, false, true));
+    h.Commands();
+    EXPECT_TRUE(h.engine.SelectUserByNodeID(221, false, true));
+    EXPECT_EQ(h.Commands(), Strings({"remove 20", "insert 1 u21", "select 1"}));
+    ASSERT_EQ(h.Titles().size(), 21u);
+    EXPECT_EQ(h.Titles()[1], "*u21");
+    EXPECT_EQ(h.Titles()[20], "u2");
+    EXPECT_EQ(h.engine.GetIndexOfMenuByNodeID(201), -1);
+
+    // Picking again moves the entry to the top.
+    EXPECT_TRUE(h.engine.SelectUserByNodeID(205, false, true));
+    EXPECT_EQ(h.Commands(), Strings({"remove 17", "insert 1 u5", "select 1"}));
+}
+
+TEST(RecentEntries, PanelMeetingSectionAndDepartures) {
+    MenuHarness h({3});
+    h.engine.SetRosters(ROLE_PANELIST, 1);
+    h.Seed(kPanelTail);
+    h.Enroll({{201, "a1"}, {202, "a2"}});
+    h.Commands();
+    TraceCapture trace;
+    EXPECT_TRUE(h.engine.SelectUserByNodeID(201, false, true));
+    EXPECT_TRUE(h.engine.SelectUserByNodeID(202, false, true));
+    EXPECT_EQ(h.Commands(),
+              Strings({"insert 7 ---", "insert 8 a1", "select 8", "insert 8 a2", "select 8"}));
+    EXPECT_FALSE(trace.Has("CChatClient::InsertRecentUserName : add sep indexStart+2 != indexEnd"));
+    h.Leave({201, "a1"});
+    EXPECT_EQ(h.Commands(), Strings({"remove 9"}));
+    h.Leave({202, "a2"});
+    EXPECT_EQ(h.Commands(), Strings({"remove 8", "remove 8", "select 6"}));
+    EXPECT_EQ(h.Titles(), Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists",
+                                   "---", "*All Participants", "---", "Select an Attendee..."}));
+}
+
+TEST(SelectUserByNodeID, FollowsRolesEntriesAndTestOnly) {
+    MenuHarness h({1});
+    h.engine.OnHostChanged(300);
+    h.engine.OnPresenterChanged(301);
+    h.Seed({{"Host", 1}, {"Presenter", 2}, {"All Attendees", 8}});
+    h.Enroll({{300, "hank", ROLE_HOST}, {301, "pia", ROLE_PRESENTER}, {201, "ann"}, {202, "bea"}});
+    h.engine.RemoveChatUserName("bea", 202, 0);
+    ASSERT_EQ(h.Titles(), Strings({"Host", "Presenter", "All Attendees", "ann"}));
+    h.Commands();
+
+    struct Case {
+        std::uint32_t node;
+        bool testOnly, select, result;
+        Strings commands;
+    };
+    const Case cases[] = {
+        {300, false, true, true, {"select 0"}},
+        {301, false, true, true, {"select 1"}},
+        {201, false, true, true, {"select 3"}},
+        {201, false, true, true, {}},
+        {300, true, true, true, {}},
+        {201, false, false, false, {}},
+        {202, true, true, false, {}},
+        {999, false, true, false, {}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.node);
+        EXPECT_EQ(h.engine.SelectUserByNodeID(c.node, c.testOnly, c.select), c.result);
+        EXPECT_EQ(h.Commands(), c.commands);
+    }
+    EXPECT_TRUE(h.engine.CanChatWith(301, false));
+    h.engine.SetGroupMenuEnable(2, false);
+    EXPECT_FALSE(h.engine.CanChatWith(301, false));
+}
+
+TEST(SelectUserByNodeID, QMCombinedHolderSelectsItsRoleEntry) {
+    MenuHarness h({1, false, 0, kQM});
+    h.engine.OnHostChanged(300);
+    h.engine.OnPresenterChanged(300);
+    h.Seed({{"Host & Presenter", 3}});
+    h.Enroll({{300, "hank", ROLE_HOST}});
+    EXPECT_EQ(h.Titles(), Strings({"Everyone", "hank (Host & Presenter)"}));
+    h.Commands();
+    EXPECT_TRUE(h.engine.SelectUserByNodeID(300, false, true));
+    EXPECT_EQ(h.Commands(), Strings({"select+input 1"}));
+}
+
+TEST(CanChatWith, PanelMeetingMenuOnlyPracticeAndAttendeeTest) {
+    MenuHarness h({3});
+    h.engine.OnHostChanged(kMyNode);
+    h.engine.OnPresenterChanged(301);
+    h.Seed(kPanelTail);
+    h.Enroll(
+        {{301, "pia", ROLE_PRESENTER | ROLE_PANELIST}, {302, "pat", ROLE_PANELIST}, {201, "ann"}});
+    TraceCapture trace;
+    EXPECT_TRUE(h.engine.CanChatWith(302, true));   // own entry
+    EXPECT_TRUE(h.engine.CanChatWith(301, true));   // presenter entry
+    EXPECT_FALSE(h.engine.CanChatWith(201, true));  // no entry, menu only
+    EXPECT_TRUE(h.engine.CanChatWith(201, false));  // may pick attendees
+    EXPECT_TRUE(trace.Has("CChatClient::SelectUserByNodeID, Only Test attendee"));
+    h.engine.SetPracticeStatus(1);  // only panelists reach each other
+    EXPECT_FALSE(h.engine.SelectUserByNodeID(201, true, true));
+    EXPECT_TRUE(h.engine.SelectUserByNodeID(302, true, true));
+    h.engine.SetPracticeStatus(0);
+    h.engine.OnPrivilegeChanged(0, 0);
+    EXPECT_FALSE(h.engine.CanChatWith(201, false));
+}
+
+TEST(EveryoneOnly, SelectionAlwaysLandsOnEveryone) {
+    MenuHarness h({3, false, 0, FEATURE_EVERYONE_ONLY});
+    h.Seed(kPanelTail);
+    h.engine.InsertChatUserName("bob", 201, 0);
+    h.Commands();
+    h.engine.SelectMenuItemByIndex(0);
+    h.engine.SelectMenuItemByIndex(8);
+    EXPECT_EQ(h.Commands(), Strings({"select 6", "select 6"}));
+    EXPECT_FALSE(h.engine.CanChatWith(201, false));
+    EXPECT_FALSE(h.engine.CanChatWith(201, true));
+}
+
+TEST(SelectMenuItemByIndex, IgnoresIndicesOutsideTheMenu) {
+    MenuHarness h({1});
+    h.Seed({{"All Attendees", 8}});
+    h.engine.SelectMenuItemByIndex(0);
+    h.Commands();
+    h.engine.SelectMenuItemByIndex(5);
+    h.engine.SelectMenuItemByIndex(-1);
+    EXPECT_EQ(h.Commands(), Strings());
+    EXPECT_EQ(h.Titles(), Strings({"*All Attendees"}));
+}
+
+TEST(ExternalInternalTags, MarkFollowsTheTaggingMode) {
+    struct Case {
+        std::int32_t mode;
+        std::uint32_t tag;
+        const char* title;
+    };
+    const Case cases[] = {{0, 1, "ann"},
+                          {1, 1, "ann (internal)"},
+                          {1, 2, "ann"},
+                          {2, 2, "ann (external)"},
+                          {2, 1, "ann"}};
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.title);
+        MenuHarness h({1, false, c.mode});
+        h.engine.OnHostChanged(300);
+        h.Seed({{"All Attendees", 8}});
+        h.Enroll({{201, "ann", 0, c.tag}, {300, "hank", ROLE_HOST, c.tag}});
+        h.engine.InsertExternalInternalChatUserName("hank", 300, c.tag);  // hosts go unmarked
+        EXPECT_EQ(h.Titles(), Strings({"All Attendees", c.title, "hank"}));
+        EXPECT_EQ(h.engine.GetUserExternalInternalString(c.tag, 1),
+                  std::string(c.title) == "ann" ? "" : (c.tag == 1 ? ", internal" : ", external"));
+    }
+}

@@ -1,0 +1,329 @@
+// Roster change processing: hand-made application-roster reports as the conference service
+// lays them out, including enroll data that no honest participant would send.
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "platform/inproc_conference.h"
+#include "platform/virtual_run_loop.h"
+#include "tests/engine/menu_harness.h"
+#include "tests/support/trace_capture.h"
+
+using namespace menutest;
+
+namespace {
+
+using Strings = std::vector<std::string>;
+
+constexpr const char* kPrivilegeReapplied =
+    "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65607";
+
+// Adds the entries in one callback as one record of this session.
+void Add(MenuHarness& h, std::vector<ReportEntry> entries) {
+    RosterReport report;
+    report.Record(kSession, std::move(entries));
+    h.engine.ApeRosterChanged(1, 0, 1, 0, 0, report.Records());
+}
+
+const UserItem* Find(const MenuHarness& h, std::uint32_t node) {
+    return h.engine.UserList().GetUserItemFromNodeId(node);
+}
+
+}  // namespace
+
+TEST(ApeRosterChanged, WalksOnlyRecordsOfTheOwnSession) {
+    MenuHarness h({1});
+    h.Seed({{"All Attendees", 8}});
+    h.Commands();
+    RosterReport report;
+    report.Record(kSession + 1, {EntryFor({201, "other"})})
+        .Record(kSession, {EntryFor({202, "bob"}), EntryFor({203, "amy"})})
+        .Record(kSession, {EntryFor({204, "cy"})});
+    EXPECT_EQ(h.engine.ApeRosterChanged(1, 0, 3, 0, 0, report.Records()), 0);
+    EXPECT_EQ(Find(h, 201), nullptr);
+    EXPECT_EQ(h.engine.UserList().GetCount(), 3u);
+    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "amy", "bob", "cy"}));
+    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "insert 1 amy", "insert -1 cy"}));
+    EXPECT_EQ(h.engine.ApeRosterChanged(1, 0, 1, 1, 1, nullptr), 0);
+}
+
+TEST(ApeRosterChanged, AddsThenDeletesThenModifiesInOneCallback) {
+    MenuHarness h({1});
+    h.Seed({{"All Attendees", 8}});
+    h.Enroll({{201, "ann"}});
+    RosterReport report;
+    report.Record(kSession, {EntryFor({202, "bob"})})
+        .Record(kSession, {EntryFor({201, "ann"})})
+        .Record(kSession, {EntryFor({202, "bob", ROLE_PANELIST})});
+    h.engine.ApeRosterChanged(1, 0, 1, 1, 1, report.Records());
+    EXPECT_EQ(Find(h, 201), nullptr);
+    ASSERT_NE(Find(h, 202), nullptr);
+    EXPECT_EQ(Find(h, 202)->dwRoles, ROLE_PANELIST);
+    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "bob"}));
+}
+
+TEST(ProcessAddEnrollInfo, IgnoresDuplicatesAndTheRecorder) {
+    MenuHarness h({1});
+    h.Seed({{"All Attendees", 8}});
+    h.Enroll({{201, "ann"}});
+    h.Enroll({{201, "ann"}});
+    h.Enroll({{202, "KVO_SSR_987_RECORDER-654"}, {203, "Kvo_Ssr_987_Recorder-654"}});
+    EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
+    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "ann"}));
+}
+
+TEST(ProcessAddEnrollInfo, PanelMeetingListsPanelistsNotAttendees) {
+    MenuHarness h({3});
+    h.Commands();
+    h.Enroll({{201, "carl"}, {202, "zoe", ROLE_PANELIST}, {203, "Adam", ROLE_PANELIST}});
+    EXPECT_EQ(h.engine.UserList().GetCount(), 3u);
+    EXPECT_EQ(h.Titles(), Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists",
+                                   "Adam", "zoe"}));
+    EXPECT_EQ(h.Commands(), Strings({"insert 5 zoe", "insert 5 Adam"}));
+    EXPECT_TRUE(h.engine.Menu()[5].bPanelist);
+}
+
+TEST(ProcessAddEnrollInfo, PrivateChatPrivilegeOrHostGivesEntries) {
+    struct Case {
+        const char* scenario;
+        std::int32_t meetingType;
+        std::uint32_t privilege;
+        bool host;
+        Strings menu;
+    };
+    const Case cases[] = {
+        {"type 1 attendee without private chat", 1, 0x1, false, {"All Attendees"}},
+        {"type 2 attendee without private chat", 2, 0x1, false, {"All Attendees"}},
+        {"type 1 attendee with private chat", 1, 0x8, false, {"All Attendees", "ann"}},
+        {"type 1 host whatever the privilege", 1, 0, true, {"All Attendees", "ann"}},
+        {"type 2 host whatever the privilege", 2, 0, true, {"All Attendees", "ann"}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.scenario);
+        MenuHarness h({c.meetingType});
+        if (c.host) h.engine.OnHostChanged(kMyNode);
+        h.engine.OnPrivilegeChanged(c.privilege, 0);
+        h.Seed({{"All Attendees", 8}});
+        h.Enroll({{201, "ann"}});
+        EXPECT_EQ(h.Titles(), c.menu);
+    }
+}
+
+TEST(ProcessAddEnrollInfo, OwnRecordReappliesThePrivilege) {
+    for (const bool scheme2 : {false, true}) {
+        SCOPED_TRACE(scheme2);
+        MenuHarness h({1, false, 0, scheme2 ? FEATURE_GROUP_SCHEME2 : 0u});
+        TraceCapture trace;
+        Add(h, {{kMyNode, kMyUser, EnrollBytes({kMyNode, "me"}), true}});
+        EXPECT_EQ(trace.Has(kPrivilegeReapplied), !scheme2);
+        EXPECT_EQ(h.engine.GetIndexOfMenuByNodeID(kMyNode), -1);
+    }
+}
+
+TEST(ProcessAddEnrollInfo, QMHostEntryCarriesTheHostsName) {
+    MenuHarness h({1, false, 1, FEATURE_QM_MODE});
+    h.engine.OnHostChanged(300);
+    h.Commands();
+    TraceCapture trace;
+    h.Enroll({{300, "Hank", ROLE_HOST, 1}});
+    EXPECT_EQ(h.Titles(), Strings({"Everyone", "Hank (Host, internal)"}));
+    EXPECT_EQ(h.Commands(), Strings({"insert -1 Host", "rename 1 Hank (Host, internal)"}));
+    EXPECT_TRUE(
+        trace.Has("CChatClient::ProcessAddEnrollInfo item \"Host\" is not in menu, add it "));
+
+    // The local participant as host: its own record selects Everyone.
+    MenuHarness me({1, false, 0, FEATURE_QM_MODE});
+    me.engine.OnHostChanged(kMyNode);
+    me.Commands();
+    Add(me, {{kMyNode, kMyUser, EnrollBytes({kMyNode, "me", ROLE_HOST}), true}});
+    EXPECT_EQ(me.Titles(), Strings({"*Everyone"}));
+}
+
+TEST(ProcessAddEnrollInfo, QMPrivateOnlyOpensAndClosesTheUserList) {
+    MenuHarness h({2, false, 0, FEATURE_QM_MODE});
+    h.engine.OnPrivilegeChanged(0x8, 0);
+    h.Commands();
+    h.Enroll({{201, "bob"}});
+    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "input 1", "enable list"}));
+    h.Leave({201, "bob"});
+    EXPECT_EQ(h.Commands(), Strings({"remove 0", "input 0", "disable list"}));
+    EXPECT_EQ(h.engine.UserList().GetCount(), 0u);
+}
+
+TEST(ExtractEnrollInfo, HostileEnrollDataCannotHurt) {
+    const std::string valid = EnrollBytes({201, "ann", ROLE_PANELIST, 2});
+    const std::string wide(200, 'x');
+    std::string accents;
+    for (int i = 0; i < 200; ++i)
+        accents += "\xC3\xA9";  // 400 bytes of two-byte characters
+    struct Case {
+        const char* scenario;
+        std::string bytes;
+        std::int32_t length;  // -2: the bytes' own length
+        bool withData;
+        int result;
+        std::string name;
+        std::uint32_t roles;
+    };
+    const Case cases[] = {
+        {"a roster record", valid, -2, true, 0, "ann", ROLE_PANELIST},
+        {"not a record", "hello", -2, true, 0, "", 0},
+        {"cut short by the given length", valid, static_cast<std::int32_t>(valid.size() - 9), true,
+         0, "", 0},
+        {"trailing bytes past the given length", valid + "<<garbage",
+         static_cast<std::int32_t>(valid.size()), true, 0, "ann", ROLE_PANELIST},
+        {"no data", valid, -2, false, -1, "", 0},
+        {"negative length", valid, -1, true, -1, "", 0},
+        {"control characters",
+         EnrollBytes({201,
+                      "ev\til\x01"
+                      "name\x7f"}),
+         -2, true, 0, "ev il name ", 0},
+        {"a huge name", EnrollBytes({201, wide + wide + wide}), -2, true, 0, std::string(255, 'x'),
+         0},
+        {"a huge name of two-byte characters", EnrollBytes({201, accents}), -2, true, 0,
+         accents.substr(0, 254), 0},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.scenario);
+        MenuHarness h({1});
+        ReportEntry entry{201, 1201, c.bytes, c.withData};
+        RosterReport report;
+        report.Record(kSession, {entry});
+        ARMApeRoster* records = report.Records();
+        if (c.length != -2) records[0].pUsers[0].nEnrollInfoLen = c.length;
+        UserItem item;
+        EXPECT_EQ(h.engine.ExtractEnrollInfoAndReturnLen(0, &item, records), c.result);
+        EXPECT_EQ(item.dwNodeID, 201u);
+        EXPECT_EQ(item.dwUserID, 1201u);
+        EXPECT_EQ(std::string(item.strName.GetData() ? item.strName.GetData() : ""), c.name);
+        EXPECT_EQ(item.dwRoles, c.roles);
+
+        h.engine.ApeRosterChanged(1, 0, 1, 0, 0, records);
+        EXPECT_EQ(h.engine.UserList().GetCount(), c.result == 0 ? 1u : 0u);
+    }
+}
+
+TEST(ProcessDeleteEnrollInfo, RemovesEntryAndItemOnlyForKnownNodes) {
+    MenuHarness h({1});
+    h.Seed({{"All Attendees", 8}});
+    h.Enroll({{201, "ann"}, {202, "bob"}});
+    h.Commands();
+    h.Leave({999, "ghost"});
+    EXPECT_EQ(h.Commands(), Strings());
+    h.Leave({201, "ann"});
+    EXPECT_EQ(h.Commands(), Strings({"remove 1"}));
+    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "bob"}));
+    EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
+}
+
+TEST(ProcessModifyEnrollInfo, UpdatesTheItemButNotTheTitle) {
+    MenuHarness h({1});
+    h.Seed({{"All Attendees", 8}});
+    h.Enroll({{201, "ann"}});
+    TraceCapture trace;
+    h.Modify({201, "anne", ROLE_PANELIST, 2});
+    const UserItem* ann = Find(h, 201);
+    ASSERT_NE(ann, nullptr);
+    EXPECT_STREQ(ann->strName.GetData(), "anne");
+    EXPECT_EQ(ann->dwRoles, ROLE_PANELIST);
+    EXPECT_EQ(ann->dwExternalTag, 2u);
+    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "ann"}));
+    EXPECT_TRUE(trace.Has(kPrivilegeReapplied));
+
+    trace.Clear();
+    h.Modify({999, "ghost"});
+    EXPECT_FALSE(trace.Has(kPrivilegeReapplied));
+}
+
+namespace {
+
+// Participants on one in-process conference, each an engine with its own service object.
+class ConferenceRoster : public ::testing::Test {
+protected:
+    void SetUp() override { RecordingWindow::Install(); }
+    void TearDown() override {
+        members.clear();
+        RecordingWindow::Uninstall();
+    }
+
+    CChatClient& Join(std::uint32_t node, const char* name, std::int32_t meetingType) {
+        members.push_back(std::make_unique<CChatClient>());
+        ChatData data{};
+        data.pArmClient = conference.CreateClient(loop, node);
+        data.wConferenceID = conference.ConferenceId();
+        data.dwSessionID = kSession;
+        data.lpszUserName = name;
+        data.dwNodeID = node;
+        data.lMeetingType = meetingType;
+        members.back()->Initialize(data);
+        loop.RunUntilIdle();
+        return *members.back();
+    }
+    void Leave(const CChatClient& engine) {
+        for (auto it = members.begin(); it != members.end(); ++it) {
+            if (it->get() != &engine) continue;
+            members.erase(it);
+            break;
+        }
+        loop.RunUntilIdle();
+    }
+    static Strings Titles(const CChatClient& engine) {
+        Strings titles;
+        for (const MenuStatus& e : engine.Menu())
+            titles.push_back(e.bSeparator ? "---" : e.strTitle);
+        return titles;
+    }
+
+    VirtualRunLoop loop;
+    ScopedCurrentRunLoop current{&loop};
+    InProcessConference conference;
+    std::vector<std::unique_ptr<CChatClient>> members;
+};
+
+}  // namespace
+
+TEST_F(ConferenceRoster, PrivateChatEntriesFollowArrivalsAndDepartures) {
+    // The host allows private chat once each participant is in.
+    CChatClient& alice = Join(7, "Alice", 1);
+    alice.OnPrivilegeChanged(0x4F, 0);
+    CChatClient& bob = Join(9, "Bob", 1);
+    bob.OnPrivilegeChanged(0x4F, 0);
+    CChatClient& carl = Join(11, "Carl", 1);
+    carl.OnPrivilegeChanged(0x4F, 0);
+    Join(13, kRecorderName, 1);
+    EXPECT_EQ(alice.UserList().GetCount(), 3u);
+    EXPECT_EQ(Titles(alice), Strings({"Bob", "Carl"}));
+    EXPECT_EQ(Titles(bob), Strings({"Alice", "Carl"}));
+    EXPECT_EQ(Titles(carl), Strings({"Alice", "Bob"}));
+
+    Leave(carl);
+    EXPECT_EQ(Titles(alice), Strings({"Bob"}));
+    EXPECT_EQ(Titles(bob), Strings({"Alice"}));
+    EXPECT_EQ(alice.UserList().GetUserItemFromNodeId(11), nullptr);
+}
+
+TEST_F(ConferenceRoster, PanelistRoleReachesOthersAndLateJoiners) {
+    CChatClient& alice = Join(7, "Alice", 3);
+    CChatClient& bob = Join(9, "Bob", 3);
+    EXPECT_EQ(Titles(alice),
+              Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists"}));
+
+    bob.SetRosters(ROLE_PANELIST, 0);  // enrolls again with the new roles
+    loop.RunUntilIdle();
+    const UserItem* seen = alice.UserList().GetUserItemFromNodeId(9);
+    ASSERT_NE(seen, nullptr);
+    EXPECT_EQ(seen->dwRoles, ROLE_PANELIST);
+
+    CChatClient& dana = Join(13, "Dana", 3);
+    EXPECT_EQ(Titles(dana),
+              Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists", "Bob"}));
+    EXPECT_EQ(dana.UserList().GetCount(), 3u);
+
+    Leave(bob);
+    EXPECT_EQ(Titles(dana),
+              Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists"}));
+    EXPECT_EQ(alice.UserList().GetCount(), 2u);
+}
