@@ -115,7 +115,9 @@ void CChatClient::InsertExternalInternalChatUserName(const char* name, std::uint
 }
 
 void CChatClient::InsertChatUserName(const char* name, std::uint32_t nodeId, int bSelect) {
-    const char* text = TextOrEmpty(name);
+    // A copy: the name may live in an entry that the insertion moves.
+    const std::string title = TextOrEmpty(name);
+    const char* text = title.c_str();
     CFuncTrace trace("CChatClient::InsertChatUserName : %s", text);
     const bool privileged = IsPrivileged();
     if (nodeId == m_dwMyNodeID) {
@@ -135,7 +137,7 @@ void CChatClient::InsertChatUserName(const char* name, std::uint32_t nodeId, int
                     [](const MenuStatus& entry) { return entry.bSelected && !entry.bEnabled; });
 
     MenuStatus entry;
-    entry.strTitle = text;
+    entry.strTitle = title;
     entry.dwNodeID = nodeId;
     entry.dwExternalTag = GetUserExternalInternalTag(nodeId);
 
@@ -211,7 +213,8 @@ int CChatClient::PanelAttendeeInsertPosition(const char* name) {
 }
 
 void CChatClient::InsertRecentUserName(const char* name, std::uint32_t nodeId) {
-    const char* text = TextOrEmpty(name);
+    const std::string title = TextOrEmpty(name);
+    const char* text = title.c_str();
     CFuncTrace trace("CChatClient::InsertRecentUserName : %s", text);
     if (nodeId == m_dwMyNodeID) {
         if (IsPrivileged()) OnPrivilegeChanged(m_dwPrivilege, 0);
@@ -226,7 +229,7 @@ void CChatClient::InsertRecentUserName(const char* name, std::uint32_t nodeId) {
         return;
 
     MenuStatus entry;
-    entry.strTitle = text;
+    entry.strTitle = title;
     entry.dwNodeID = nodeId;
     entry.bRecent = true;
 
