@@ -1,5 +1,6 @@
 #include "engine/chat_content_storage.h"
 
+#include <algorithm>
 #include <utility>
 
 void CChatContentStorage::InsertNewLine(const std::string& header) {
@@ -16,22 +17,28 @@ void CChatContentStorage::InsertTime(const DateTimeRec& time) {
     m_times.push_back(time);
 }
 
-void CChatContentStorage::AppendEntries(std::vector<ChatEntry>&& entries) {
-    for (ChatEntry& entry : entries) {
-        m_times.push_back(entry.time);
-        m_lines.push_back(std::move(entry.line));
+void CChatContentStorage::AppendEntries(std::vector<DateTimeRec>&& times,
+                                        std::vector<std::string>&& lines) {
+    const std::size_t count = std::min(times.size(), lines.size());
+    times.resize(count);
+    lines.resize(count);
+    if (m_times.empty() && m_lines.empty()) {
+        m_times = std::move(times);
+        m_lines = std::move(lines);
+        return;
     }
+    // Room for the whole batch at once, still growing geometrically over many batches.
+    if (m_lines.size() + count > m_lines.capacity()) {
+        m_lines.reserve(std::max(m_lines.size() + count, 2 * m_lines.capacity()));
+    }
+    m_times.insert(m_times.end(), times.begin(), times.end());
+    for (std::string& line : lines)
+        m_lines.push_back(std::move(line));
 }
 
-DateTimeRec CChatContentStorage::GetTimeAt(std::size_t index) const {
-    if (index >= m_times.size()) return DateTimeRec{};
-    return m_times[index];
-}
-
-const std::string& CChatContentStorage::GetLineAtIndex(std::size_t index) const {
+const std::string& CChatContentStorage::NoLine() {
     static const std::string kNoLine;
-    if (index >= m_lines.size()) return kNoLine;
-    return m_lines[index];
+    return kNoLine;
 }
 
 void CChatContentStorage::Clear() {

@@ -18,12 +18,6 @@ struct DateTimeRec {
     std::uint16_t valid;
 };
 
-// One whole transcript entry: a time and its line.
-struct ChatEntry {
-    DateTimeRec time;
-    std::string line;
-};
-
 class CChatContentStorage {
 public:
     CChatContentStorage() = default;
@@ -36,13 +30,18 @@ public:
     void ModifyLatestLineByAdd(const std::string& text);
     // Appends a time.
     void InsertTime(const DateTimeRec& time);
-    // Appends every entry, each time with its line, in order; the lines are moved out.
-    void AppendEntries(std::vector<ChatEntry>&& entries);
+    // Appends whole entries, times[i] with lines[i], in order; both are moved out. Pairs
+    // beyond the shorter of the two are dropped.
+    void AppendEntries(std::vector<DateTimeRec>&& times, std::vector<std::string>&& lines);
 
     // The time at index, or an all-zero record when index is out of range.
-    DateTimeRec GetTimeAt(std::size_t index) const;
+    DateTimeRec GetTimeAt(std::size_t index) const {
+        return index < m_times.size() ? m_times[index] : DateTimeRec{};
+    }
     // The line at index, or an empty string when index is out of range.
-    const std::string& GetLineAtIndex(std::size_t index) const;
+    const std::string& GetLineAtIndex(std::size_t index) const {
+        return index < m_lines.size() ? m_lines[index] : NoLine();
+    }
 
     std::size_t GetTimeCount() const { return m_times.size(); }
     std::size_t GetLineCount() const { return m_lines.size(); }
@@ -51,6 +50,8 @@ public:
     void Clear();
 
 private:
+    static const std::string& NoLine();
+
     std::vector<DateTimeRec> m_times;
     std::vector<std::string> m_lines;
 };

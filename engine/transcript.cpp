@@ -181,7 +181,7 @@ void CChatClient::OpenChatFile() {
     bytes.reset();
 
     const std::size_t firstLine = m_ChatContent.GetLineCount();
-    m_ChatContent.AppendEntries(std::move(batch.entries));
+    m_ChatContent.AppendEntries(std::move(batch.times), std::move(batch.lines));
     std::string text;
     for (const TranscriptPiece& piece : batch.pieces) {
         text.assign(m_ChatContent.GetLineAtIndex(firstLine + piece.entry), piece.offset,

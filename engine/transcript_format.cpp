@@ -1,17 +1,22 @@
 #include "engine/transcript_format.h"
 
+#include <algorithm>
 #include <cstring>
-#include <utility>
 
 namespace {
 
-// Writes value as digits decimal digits with leading zeros; higher digits are dropped so
-// the prefix keeps its width.
-void PutDigits(char* out, unsigned value, int digits) {
-    for (int i = digits - 1; i >= 0; --i) {
-        out[i] = static_cast<char>('0' + value % 10);
-        value /= 10;
-    }
+// Entries reserved ahead at most; bigger files grow their batch as they go.
+constexpr std::size_t kMaxReserved = std::size_t{1} << 20;
+
+// "00" to "99", so each two-digit field is one copy.
+constexpr char kDigitPairs[] =
+    "00010203040506070809101112131415161718192021222324252627282930313233343536373839"
+    "40414243444546474849505152535455565758596061626364656667686970717273747576777879"
+    "8081828384858687888990919293949596979899";
+
+// Writes the last two decimal digits of value, so a field keeps its width.
+void PutTwoDigits(char* out, unsigned value) {
+    std::memcpy(out, kDigitPairs + 2 * (value % 100), 2);
 }
 
 bool ReadDigits(const char* in, int digits, std::uint16_t* value) {
@@ -56,8 +61,8 @@ std::size_t KeptHeaderSize(const char* header, std::size_t size) {
 }
 
 void AppendText(TranscriptBatch* batch, const char* text, std::size_t size) {
-    const std::size_t entry = batch->entries.size() - 1;
-    std::string& line = batch->entries[entry].line;
+    const std::size_t entry = batch->lines.size() - 1;
+    std::string& line = batch->lines[entry];
     batch->pieces.push_back(TranscriptPiece{false, entry, line.size(), size});
     line.append(text, size);
 }
@@ -65,21 +70,15 @@ void AppendText(TranscriptBatch* batch, const char* text, std::size_t size) {
 }  // namespace
 
 void FormatTimePrefix(const DateTimeRec& time, char* out) {
-    PutDigits(out, time.month, 2);
-    out[2] = '/';
-    PutDigits(out + 3, time.day, 2);
-    out[5] = '/';
-    PutDigits(out + 6, time.year, 4);
-    std::memset(out + 10, ' ', 4);
-    PutDigits(out + 14, time.hour, 2);
-    out[16] = ':';
-    PutDigits(out + 17, time.minute, 2);
-    out[19] = ':';
-    PutDigits(out + 20, time.second, 2);
-    out[22] = ' ';
-    out[23] = time.hour < 12 ? 'A' : 'P';
-    out[24] = 'M';
-    std::memset(out + 25, ' ', 4);
+    std::memcpy(out, "00/00/0000    00:00:00 AM    ", kTimePrefixSize);
+    PutTwoDigits(out, time.month);
+    PutTwoDigits(out + 3, time.day);
+    PutTwoDigits(out + 6, time.year / 100u);
+    PutTwoDigits(out + 8, time.year);
+    PutTwoDigits(out + 14, time.hour);
+    PutTwoDigits(out + 17, time.minute);
+    PutTwoDigits(out + 20, time.second);
+    if (time.hour >= 12) out[23] = 'P';
 }
 
 void AppendTranscriptEntry(const DateTimeRec& time, const std::string& line, std::string& out) {
@@ -123,8 +122,16 @@ bool ParseTimePrefix(const char* data, std::size_t size, DateTimeRec* time) {
 }
 
 bool ParseTranscript(const char* data, std::size_t size, TranscriptBatch* batch) {
-    batch->entries.clear();
+    batch->times.clear();
+    batch->lines.clear();
     batch->pieces.clear();
+    // Every entry takes at least its prefix and TAB, so this seldom falls short; what is
+    // reserved beyond the entries read is never touched.
+    const std::size_t mostEntries = std::min(size / (kTimePrefixSize + 1) + 1, kMaxReserved);
+    batch->times.reserve(mostEntries);
+    batch->lines.reserve(mostEntries);
+    batch->pieces.reserve(2 * mostEntries);
+
     std::size_t pos = SkipByteOrderMark(data, size);
     while (pos < size) {
         while (pos < size && data[pos] == '\n')
@@ -134,7 +141,7 @@ bool ParseTranscript(const char* data, std::size_t size, TranscriptBatch* batch)
         DateTimeRec time;
         if (!ParseTimePrefix(data + pos, size - pos, &time)) {
             // The first line must be an entry; any later one continues the entry before it.
-            if (batch->entries.empty()) return false;
+            if (batch->lines.empty()) return false;
             const std::size_t end = LineEnd(data, pos, size);
             AppendText(batch, data + pos, end - pos);
             pos = end + 1;
@@ -152,17 +159,19 @@ bool ParseTranscript(const char* data, std::size_t size, TranscriptBatch* batch)
         const std::size_t textStart = tabAt + 1;
         const std::size_t textEnd = textStart < size ? LineEnd(data, textStart, size) : size;
 
-        ChatEntry entry{time, std::string()};
-        entry.line.reserve(kept + 2 + (textEnd - textStart));
-        entry.line.append(header, kept);
-        if (kept == 0 || header[kept - 1] != '\r') entry.line.push_back('\r');
-        batch->pieces.push_back(TranscriptPiece{true, batch->entries.size(), 0, entry.line.size()});
-        entry.line.push_back('\t');
-        batch->entries.push_back(std::move(entry));
+        const std::size_t entry = batch->lines.size();
+        batch->times.push_back(time);
+        batch->lines.emplace_back();
+        std::string& line = batch->lines.back();
+        line.reserve(kept + 2 + (textEnd - textStart));
+        line.append(header, kept);
+        if (kept == 0 || header[kept - 1] != '\r') line.push_back('\r');
+        batch->pieces.push_back(TranscriptPiece{true, entry, 0, line.size()});
+        line.push_back('\t');
 
         if (textStart >= size) break;  // nothing follows the TAB
         AppendText(batch, data + textStart, textEnd - textStart);
         pos = textEnd + 1;
     }
-    return !batch->entries.empty();
+    return !batch->lines.empty();
 }

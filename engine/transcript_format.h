@@ -32,7 +32,7 @@ std::string FormatTranscript(const CChatContentStorage& content);
 bool ParseTimePrefix(const char* data, std::size_t size, DateTimeRec* time);
 
 // One text an opened file shows, in file order: a title (the header ending in CR) or a
-// message text, taken as bytes [offset, offset + size) of the line of entries[entry].
+// message text, taken as bytes [offset, offset + size) of the line of entry `entry`.
 struct TranscriptPiece {
     bool bTitle;
     std::size_t entry;
@@ -40,9 +40,10 @@ struct TranscriptPiece {
     std::size_t size;
 };
 
-// What a transcript file holds: whole entries (time and line) and what to show of them.
+// What a transcript file holds: whole entries (times[i] with lines[i]) and what to show.
 struct TranscriptBatch {
-    std::vector<ChatEntry> entries;
+    std::vector<DateTimeRec> times;
+    std::vector<std::string> lines;
     std::vector<TranscriptPiece> pieces;
 };
 

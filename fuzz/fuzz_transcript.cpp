@@ -28,12 +28,13 @@ bool SameTime(const DateTimeRec& a, const DateTimeRec& b) {
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     TranscriptBatch batch;
     const bool ok = ParseTranscript(reinterpret_cast<const char*>(data), size, &batch);
-    Check(ok == !batch.entries.empty());
+    Check(ok == !batch.lines.empty());
+    Check(batch.times.size() == batch.lines.size());
     if (!ok) return 0;
 
     for (const TranscriptPiece& piece : batch.pieces) {
-        Check(piece.entry < batch.entries.size());
-        const std::string& line = batch.entries[piece.entry].line;
+        Check(piece.entry < batch.lines.size());
+        const std::string& line = batch.lines[piece.entry];
         Check(piece.offset <= line.size() && piece.size <= line.size() - piece.offset);
         if (piece.bTitle) {
             Check(piece.offset == 0 && piece.size >= 1 && piece.size <= kMaxHeaderSize);
@@ -42,15 +43,15 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     }
 
     CChatContentStorage content;
-    std::vector<ChatEntry> entries = batch.entries;
-    content.AppendEntries(std::move(entries));
+    std::vector<DateTimeRec> times = batch.times;
+    std::vector<std::string> lines = batch.lines;
+    content.AppendEntries(std::move(times), std::move(lines));
     const std::string written = FormatTranscript(content);
     TranscriptBatch again;
     Check(ParseTranscript(written.data(), written.size(), &again));
-    Check(again.entries.size() == batch.entries.size());
-    for (std::size_t i = 0; i < batch.entries.size(); ++i) {
-        Check(again.entries[i].line == batch.entries[i].line);
-        Check(SameTime(again.entries[i].time, batch.entries[i].time));
+    Check(again.lines == batch.lines);
+    for (std::size_t i = 0; i < batch.times.size(); ++i) {
+        Check(SameTime(again.times[i], batch.times[i]));
     }
     return 0;
 }

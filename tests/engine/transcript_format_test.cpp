@@ -35,7 +35,7 @@ std::vector<std::string> Shown(const TranscriptBatch& batch) {
     std::vector<std::string> shown;
     for (const TranscriptPiece& piece : batch.pieces) {
         shown.push_back((piece.bTitle ? "T:" : "M:") +
-                        batch.entries[piece.entry].line.substr(piece.offset, piece.size));
+                        batch.lines[piece.entry].substr(piece.offset, piece.size));
     }
     return shown;
 }
@@ -128,10 +128,11 @@ TEST(TranscriptFormat, SavedBytesParseBackIntoTheSameEntries) {
 
     TranscriptBatch batch;
     ASSERT_TRUE(ParseTranscript(bytes.data(), bytes.size(), &batch));
-    ASSERT_EQ(batch.entries.size(), 3u);
+    ASSERT_EQ(batch.times.size(), 3u);
+    ASSERT_EQ(batch.lines.size(), 3u);
     for (std::size_t i = 0; i < 3; ++i) {
-        EXPECT_TRUE(SameTime(batch.entries[i].time, content.GetTimeAt(i))) << i;
-        EXPECT_EQ(batch.entries[i].line, content.GetLineAtIndex(i)) << i;
+        EXPECT_TRUE(SameTime(batch.times[i], content.GetTimeAt(i))) << i;
+        EXPECT_EQ(batch.lines[i], content.GetLineAtIndex(i)) << i;
     }
     EXPECT_EQ(Shown(batch), (std::vector<std::string>{"T:from Ann:\r", "M:one\rtwo", "T:from Bo:\r",
                                                       "M:", "T:from Cy:\r", "M:last"}));
@@ -188,10 +189,8 @@ TEST(TranscriptFormat, ParsingFollowsTheFileLayoutCaseByCase) {
         const std::vector<char> bytes(c.bytes.begin(), c.bytes.end());
         TranscriptBatch batch;
         EXPECT_EQ(ParseTranscript(bytes.data(), bytes.size(), &batch), c.ok);
-        std::vector<std::string> lines;
-        for (const ChatEntry& entry : batch.entries)
-            lines.push_back(entry.line);
-        EXPECT_EQ(lines, c.lines);
+        EXPECT_EQ(batch.lines, c.lines);
+        EXPECT_EQ(batch.times.size(), batch.lines.size());
         EXPECT_EQ(Shown(batch), c.shown);
     }
 }
@@ -215,8 +214,8 @@ TEST(TranscriptFormat, LongHeadersAreCutAtACharacterBoundary) {
         const std::string bytes = kFirst + c.header + "\tmsg\n";
         TranscriptBatch batch;
         ASSERT_TRUE(ParseTranscript(bytes.data(), bytes.size(), &batch));
-        ASSERT_EQ(batch.entries.size(), 1u);
-        const std::string& line = batch.entries[0].line;
+        ASSERT_EQ(batch.lines.size(), 1u);
+        const std::string& line = batch.lines[0];
         const std::size_t title = batch.pieces[0].size;
         EXPECT_LE(title, kMaxHeaderSize);
         EXPECT_EQ(line.substr(0, c.keptBytes), c.header.substr(0, c.keptBytes));
@@ -233,9 +232,7 @@ TEST(ChatContentStorage, TimesAndLinesAreKeptInParallel) {
     content.InsertNewLine("title:\r");
     content.ModifyLatestLineByAdd("a");
     content.ModifyLatestLineByAdd("b");
-    std::vector<ChatEntry> batch{{At(2010, 1, 1, 1, 1, 1), "x\r\ty"},
-                                 {At(2011, 2, 2, 2, 2, 2), "z"}};
-    content.AppendEntries(std::move(batch));
+    content.AppendEntries({At(2010, 1, 1, 1, 1, 1), At(2011, 2, 2, 2, 2, 2)}, {"x\r\ty", "z"});
 
     ASSERT_EQ(content.GetTimeCount(), 3u);
     ASSERT_EQ(content.GetLineCount(), 3u);
@@ -248,6 +245,21 @@ TEST(ChatContentStorage, TimesAndLinesAreKeptInParallel) {
     EXPECT_EQ(none.valid, 0);
     content.Clear();
     EXPECT_EQ(content.GetTimeCount() + content.GetLineCount(), 0u);
+}
+
+TEST(ChatContentStorage, ABatchIsAppendedInWholeEntriesOnly) {
+    CChatContentStorage empty;
+    // A time without its line is not an entry.
+    empty.AppendEntries({At(2010, 1, 1, 1, 1, 1), At(2011, 2, 2, 2, 2, 2)}, {"only one"});
+    EXPECT_EQ(empty.GetTimeCount(), 1u);
+    EXPECT_EQ(empty.GetLineCount(), 1u);
+    EXPECT_EQ(empty.GetLineAtIndex(0), "only one");
+
+    empty.AppendEntries({At(2012, 3, 3, 3, 3, 3)}, {"second", "no time"});
+    EXPECT_EQ(empty.GetTimeCount(), 2u);
+    EXPECT_EQ(empty.GetLineCount(), 2u);
+    EXPECT_EQ(empty.GetLineAtIndex(1), "second");
+    EXPECT_TRUE(SameTime(empty.GetTimeAt(1), At(2012, 3, 3, 3, 3, 3)));
 }
 
 }  // namespace
