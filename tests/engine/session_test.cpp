@@ -235,7 +235,10 @@ TEST_P(ConnectResultTest, ConnectResultDecidesWhetherTheChainGoesOn) {
 
 INSTANTIATE_TEST_SUITE_P(Results, ConnectResultTest,
                          ::testing::Values(ConnectCase{1202, true}, ConnectCase{1, false},
-                                           ConnectCase{19, false}));
+                                           ConnectCase{19, false}),
+                         [](const ::testing::TestParamInfo<ConnectCase>& info) {
+                             return "Connect" + std::to_string(info.param.connectResult);
+                         });
 
 TEST_F(SessionTest, AlreadyConnectedGoesStraightIntoConferenceJoin) {
     InProcessArmClient* client = conference.CreateClient(loop, 7);
