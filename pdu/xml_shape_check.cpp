@@ -1,9 +1,9 @@
 #include "pdu/xml_shape_check.h"
 
+#include <array>
 #include <cstring>
 #include <string>
 #include <string_view>
-#include <vector>
 
 #include "pdu/tiny_lexer.h"
 #include "pdu/xml_limits.h"
@@ -21,9 +21,18 @@ public:
     bool Fits(const char* text);
 
 private:
-    const char* Skip(const char* p) const { return TinyLexer::SkipWhiteSpace(p, m_encoding); }
+    // SkipWhiteSpace, without the call where there is nothing to skip (in UTF-8 it also
+    // steps over byte-order marks, which start with 0xEF).
+    const char* Skip(const char* p) const {
+        if (!p || !*p) return nullptr;
+        if (!TinyLexer::IsWhiteSpace(*p) && static_cast<unsigned char>(*p) != 0xEF) return p;
+        return TinyLexer::SkipWhiteSpace(p, m_encoding);
+    }
+    // Identify's test for an element after the '<' at p; ASCII letters pass in any locale.
     bool StartsElement(const char* p) const {
-        return TinyLexer::IsAlpha(static_cast<unsigned char>(p[1]), m_encoding) || p[1] == '_';
+        const char c = p[1];
+        return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_' ||
+               TinyLexer::IsAlpha(static_cast<unsigned char>(c), m_encoding);
     }
     const char* Over() {
         m_over = true;
@@ -31,6 +40,8 @@ private:
     }
     bool AddNode() { return ++m_nodes <= kMaxXmlNodes; }
 
+    const char* ReadUntil(const char* from, char end, bool trim);
+    const char* NameEnd(const char* p);
     const char* Node(const char* p);
     const char* Text(const char* withBlanks, const char* p);
     const char* EndTag(const char* p);
@@ -41,7 +52,8 @@ private:
 
     const TiXmlEncoding m_encoding;
     // Names of the elements whose content is being read, outermost first.
-    std::vector<std::string_view> m_open;
+    std::array<std::string_view, kMaxXmlDepth> m_open;
+    size_t m_depth = 0;
     size_t m_nodes = 0;
     bool m_over = false;
     // Receives names and values the lexing functions read; only their end positions count.
@@ -53,7 +65,7 @@ bool ShapeWalk::Fits(const char* p) {
     p = Skip(p);
     while (p && *p) {
         const char* start = p;
-        if (m_open.empty()) {
+        if (m_depth == 0) {
             // At document level anything but markup ends the document, without an error.
             if (*p != '<') return true;
             p = Node(p);
@@ -75,13 +87,16 @@ bool ShapeWalk::Fits(const char* p) {
 // What the parser makes of markup at p: declaration, comment, CDATA, element or something else.
 const char* ShapeWalk::Node(const char* p) {
     if (!AddNode()) return Over();
-    if (TinyLexer::StringEqual(p, "<?xml", true, m_encoding)) return Declaration(p + 5);
-    if (TinyLexer::StringEqual(p, "<!--", false, m_encoding)) {
+    // Every special form starts with "<?" or "<!", so other markup skips their comparisons.
+    if (p[1] == '?' && TinyLexer::StringEqual(p, "<?xml", true, m_encoding)) {
+        return Declaration(p + 5);
+    }
+    if (p[1] == '!' && TinyLexer::StringEqual(p, "<!--", false, m_encoding)) {
         // An unclosed comment runs to the end of the text.
         const char* end = std::strstr(p + 4, "-->");
         return end ? end + 3 : p + std::strlen(p);
     }
-    if (TinyLexer::StringEqual(p, "<![CDATA[", false, m_encoding)) {
+    if (p[1] == '!' && TinyLexer::StringEqual(p, "<![CDATA[", false, m_encoding)) {
         const char* end = std::strstr(p + 9, "]]>");
         return end && end[3] ? end + 3 : nullptr;
     }
@@ -95,26 +110,57 @@ const char* ShapeWalk::Node(const char* p) {
 const char* ShapeWalk::Text(const char* withBlanks, const char* p) {
     if (!AddNode()) return Over();
     const char* from = TiXmlBase::IsWhiteSpaceCondensed() ? p : withBlanks;
-    p = TinyLexer::ReadText(from, &m_scratch, true, "<", false, m_encoding);
+    p = ReadUntil(from, '<', true);
     return p && *p ? p - 1 : nullptr;
+}
+
+// ReadText up to the end character: where it returns after the end character, or null. Text
+// without '&' (and in UTF-8 without multi-byte sequences) simply ends at the first end
+// character, so that case needs no call.
+const char* ShapeWalk::ReadUntil(const char* from, char end, bool trim) {
+    const char* p = from;
+    for (; *p && *p != end; ++p) {
+        if (*p == '&' || (m_encoding == TIXML_ENCODING_UTF8 && (*p & 0x80))) {
+            const char terminator[] = {end, '\0'};
+            return TinyLexer::ReadText(from, &m_scratch, trim, terminator, false, m_encoding);
+        }
+    }
+    return *p && p[1] ? p + 1 : nullptr;
 }
 
 // "</" closing the innermost open element: its exact name, blanks, then '>'.
 const char* ShapeWalk::EndTag(const char* p) {
-    const std::string_view name = m_open.back();
+    const std::string_view name = m_open[m_depth - 1];
     if (std::strncmp(p + 2, name.data(), name.size()) != 0) return nullptr;
     p = Skip(p + 2 + name.size());
     if (!p || *p != '>') return nullptr;
-    m_open.pop_back();
+    --m_depth;
     return p + 1;
+}
+
+// ReadName: just past the name at p, or null when p holds none. A name of ASCII letters,
+// digits and "_-.:" that ends in a blank, '>', '/', '=' or the end of the text ends there
+// whatever the locale, so that case needs no call.
+const char* ShapeWalk::NameEnd(const char* p) {
+    const auto letter = [](char c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'); };
+    const auto inName = [&](char c) {
+        return letter(c) || (c >= '0' && c <= '9') || c == '_' || c == '-' || c == '.' || c == ':';
+    };
+    if (letter(*p) || *p == '_') {
+        const char* q = p + 1;
+        while (inName(*q))
+            ++q;
+        if (!*q || *q == ' ' || *q == '>' || *q == '/' || *q == '=') return q;
+    }
+    return TinyLexer::ReadName(p, &m_scratch, m_encoding);
 }
 
 // An element's start tag, from just after its '<'.
 const char* ShapeWalk::Element(const char* p) {
-    if (m_open.size() + 1 > kMaxXmlDepth) return Over();
+    if (m_depth == kMaxXmlDepth) return Over();
     p = Skip(p);
     const char* name = p;
-    p = TinyLexer::ReadName(p, &m_scratch, m_encoding);
+    p = NameEnd(p);
     if (!p || !*p) return nullptr;
     const std::string_view elementName(name, static_cast<size_t>(p - name));
     size_t attributes = 0;
@@ -123,7 +169,7 @@ const char* ShapeWalk::Element(const char* p) {
         if (!p || !*p) return nullptr;
         if (*p == '/') return p[1] == '>' ? p + 2 : nullptr;
         if (*p == '>') {
-            m_open.push_back(elementName);
+            m_open[m_depth++] = elementName;
             return p + 1;
         }
         if (++attributes > kMaxXmlAttributes || !AddNode()) return Over();
@@ -136,16 +182,13 @@ const char* ShapeWalk::Element(const char* p) {
 const char* ShapeWalk::Attribute(const char* p) {
     p = Skip(p);
     if (!p || !*p) return nullptr;
-    p = TinyLexer::ReadName(p, &m_scratch, m_encoding);
+    p = NameEnd(p);
     if (!p || !*p) return nullptr;
     p = Skip(p);
     if (!p || *p != '=') return nullptr;
     p = Skip(p + 1);
     if (!p || !*p) return nullptr;
-    if (*p == '\'' || *p == '"') {
-        const char quote[] = {*p, '\0'};
-        return TinyLexer::ReadText(p + 1, &m_scratch, false, quote, false, m_encoding);
-    }
+    if (*p == '\'' || *p == '"') return ReadUntil(p + 1, *p, false);
     for (; *p && !TinyLexer::IsWhiteSpace(*p) && *p != '/' && *p != '>'; ++p) {
         if (*p == '\'' || *p == '"') return nullptr;
     }
@@ -187,7 +230,7 @@ bool ShapeWalk::RestFits(const char* from) const {
             if (StartsElement(p)) ++starts;
         }
     }
-    return m_open.size() + starts <= kMaxXmlDepth && signs <= kMaxXmlAttributes &&
+    return m_depth + starts <= kMaxXmlDepth && signs <= kMaxXmlAttributes &&
            m_nodes + 2 * markups + 1 + signs <= kMaxXmlNodes;
 }
 
