@@ -28,6 +28,10 @@ constexpr std::uint32_t kMaxCacheGroupId = 4096;
 // The group id GetCacheHandleFromGroupId never matches.
 constexpr std::uint32_t kReservedGroupId = 4096;
 
+// A cache is initialised with two zero bytes; the status cache is marked with "1" and its NUL.
+const std::string kEmptyCacheBytes(2, '\0');
+const std::string kStatusMarkBytes("1", 2);
+
 // Copies name into a NameHandle, cut at 64 bytes and NUL-padded.
 void SetHandleName(NameHandle& handle, const std::string& name) {
     std::memset(handle.name, 0, sizeof handle.name);
@@ -152,43 +156,24 @@ void CChatClient::OnChatStatusCacheAnswer(std::uint32_t memHandle, short result,
 void CChatClient::SetAllCaches() {
     CFuncTrace trace("CChatClient::SetAllCaches");
     if (!m_pArmClient) return;
-    const char zero[2] = {0, 0};
-    std::uint32_t size = sizeof zero;
-    const std::uint32_t mem = GetATMemHandle(size, zero);
-    if (mem == 0) return;
-    m_pArmClient->ApeSharedDataActionEx(m_dwApeHandle, m_UserInfoCacheHandle.handle_value, 0, 0,
-                                        CACHE_SET, kCacheFlags, mem, 0, 1);
+    WriteToCache(m_UserInfoCacheHandle.handle_value, CACHE_SET, kEmptyCacheBytes, kCacheFlags);
     for (std::int32_t i = 0; i < m_GroupList.GetGroupsCount(); ++i) {
         const CUsersGroup* group = m_GroupList.GetGroupByIndex(i);
-        if (!IsCacheGroup(group) || group->GetCacheHandle() == 0) continue;
-        m_pArmClient->ApeSharedDataActionEx(m_dwApeHandle, group->GetCacheHandle(), 0, 0, CACHE_SET,
-                                            kCacheFlags, mem, 0, 1);
+        if (IsCacheGroup(group) && group->GetCacheHandle() != 0)
+            WriteToCache(group->GetCacheHandle(), CACHE_SET, kEmptyCacheBytes, kCacheFlags);
     }
     if (m_pRecoveryMgr && m_pRecoveryMgr->GetCustomerId() != 0) SetCustomerCache();
     m_bInitCaches = 0;
-    m_pArmClient->FreeMemHandle(mem);
 }
 
 void CChatClient::SetChatStatusCache() {
-    if (!m_pArmClient) return;
-    const char mark[2] = {'1', 0};
-    std::uint32_t size = sizeof mark;
-    const std::uint32_t mem = GetATMemHandle(size, mark);
-    if (mem == 0) return;
-    m_pArmClient->ApeSharedDataActionEx(m_dwApeHandle, m_ChatStatusCacheHandle.handle_value, 0, 0,
-                                        CACHE_SET, kStatusCacheFlags, mem, 0, 1);
-    m_pArmClient->FreeMemHandle(mem);
+    WriteToCache(m_ChatStatusCacheHandle.handle_value, CACHE_SET, kStatusMarkBytes,
+                 kStatusCacheFlags);
 }
 
 void CChatClient::SetCustomerCache() {
-    if (m_CustomerCacheHandle.handle_value == 0 || !m_pArmClient || m_dwApeHandle == 0) return;
-    const char zero[2] = {0, 0};
-    std::uint32_t size = sizeof zero;
-    const std::uint32_t mem = GetATMemHandle(size, zero);
-    if (mem == 0) return;
-    m_pArmClient->ApeSharedDataActionEx(m_dwApeHandle, m_CustomerCacheHandle.handle_value, 0, 0,
-                                        CACHE_SET, kCacheFlags, mem, 0, 1);
-    m_pArmClient->FreeMemHandle(mem);
+    if (m_dwApeHandle == 0) return;
+    WriteToCache(m_CustomerCacheHandle.handle_value, CACHE_SET, kEmptyCacheBytes, kCacheFlags);
 }
 
 int CChatClient::SendOwnUserInfoToCache() {
@@ -200,17 +185,19 @@ int CChatClient::SendOwnUserInfoToCache() {
     pdu.SetUserName(m_strMyName);
     pdu.SetUserExternalTag(m_dwUserExternalTag);
     pdu.GenerateXMLPDU();
-    return AppendToCache(m_UserInfoCacheHandle.handle_value, pdu.ToWireText(), kCacheFlags) ? 1 : 0;
+    return WriteToCache(m_UserInfoCacheHandle.handle_value, CACHE_APPEND, pdu.ToWireText(),
+                        kCacheFlags)
+               ? 1
+               : 0;
 }
 
-bool CChatClient::AppendToCache(std::uint32_t cacheHandle, const std::string& bytes,
-                                std::uint32_t flags) {
+bool CChatClient::WriteToCache(std::uint32_t cacheHandle, tagCacheAction action,
+                               const std::string& bytes, std::uint32_t flags) {
     if (!m_pArmClient || cacheHandle == 0) return false;
     std::uint32_t size = static_cast<std::uint32_t>(bytes.size());
     const std::uint32_t mem = GetATMemHandle(size, bytes.data());
     if (mem == 0) return false;
-    m_pArmClient->ApeSharedDataActionEx(m_dwApeHandle, cacheHandle, 0, 0, CACHE_APPEND, flags, mem,
-                                        0, 1);
+    m_pArmClient->ApeSharedDataActionEx(m_dwApeHandle, cacheHandle, 0, 0, action, flags, mem, 0, 1);
     m_pArmClient->FreeMemHandle(mem);
     return true;
 }
@@ -226,7 +213,7 @@ void CChatClient::SetAllGroupCacheSetFlag() {
 void CChatClient::SendCopyToCustomerCache(CKvoChatXMLPDU* pdu) {
     if (!pdu || m_CustomerCacheHandle.handle_value == 0 || !m_pArmClient || m_dwApeHandle == 0)
         return;
-    AppendToCache(m_CustomerCacheHandle.handle_value, pdu->ToWireText(), kCacheFlags);
+    WriteToCache(m_CustomerCacheHandle.handle_value, CACHE_APPEND, pdu->ToWireText(), kCacheFlags);
 }
 
 int CChatClient::ApeCacheActionConfirmEx(std::uint32_t apeHandle, std::uint32_t entityId,
@@ -429,7 +416,7 @@ int CChatClient::SendGroupInfoToCache(std::uint32_t groupId, const char* groupNa
     pdu.SetGroupName(groupName);
     pdu.GenerateXMLPDU();
     const std::uint32_t flags = kCacheFlags | (IsRecording() ? kRecordFlags : 0);
-    return AppendToCache(handle, pdu.ToWireText(), flags) ? 1 : 0;
+    return WriteToCache(handle, CACHE_APPEND, pdu.ToWireText(), flags) ? 1 : 0;
 }
 
 bool CChatClient::IsRecording() const {

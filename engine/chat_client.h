@@ -467,8 +467,9 @@ private:
     bool IsPrivileged() const;
     // True when the local participant is the host or the presenter (node ids alone).
     bool IsHostOrPresenter() const;
-    // Appends bytes to a cache through a memory handle; false when nothing was written.
-    bool AppendToCache(std::uint32_t cacheHandle, const std::string& bytes, std::uint32_t flags);
+    // Sets or appends bytes to a cache through a memory handle; false when nothing was written.
+    bool WriteToCache(std::uint32_t cacheHandle, tagCacheAction action, const std::string& bytes,
+                      std::uint32_t flags);
     // The first group with a cache (not a separator) of that id, or null.
     CUsersGroup* FindCacheGroup(std::uint32_t groupId);
 
