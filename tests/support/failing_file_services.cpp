@@ -8,25 +8,13 @@ FailingFileServices::~FailingFileServices() {
     SetFileServices(m_pPrevious);
 }
 
-void FailingFileServices::Fail(FileOp op, FileResult result, const std::string& pathPart,
-                               int skip) {
-    m_rules.push_back(Rule{op, result, pathPart, skip});
+void FailingFileServices::Fail(FileOp op, FileResult result, const std::string& pathPart) {
+    m_rules.push_back(Rule{op, result, pathPart});
 }
 
-int FailingFileServices::Calls(FileOp op) const {
-    const auto found = m_calls.find(op);
-    return found == m_calls.end() ? 0 : found->second;
-}
-
-FileResult FailingFileServices::Injected(FileOp op, const std::string& path) {
-    ++m_calls[op];
-    for (Rule& rule : m_rules) {
-        if (rule.op != op || path.find(rule.pathPart) == std::string::npos) continue;
-        if (rule.skip > 0) {
-            --rule.skip;
-            continue;
-        }
-        return rule.result;
+FileResult FailingFileServices::Injected(FileOp op, const std::string& path) const {
+    for (const Rule& rule : m_rules) {
+        if (rule.op == op && path.find(rule.pathPart) != std::string::npos) return rule.result;
     }
     return kFileOk;
 }

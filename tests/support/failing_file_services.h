@@ -31,13 +31,11 @@ public:
     FailingFileServices(const FailingFileServices&) = delete;
     FailingFileServices& operator=(const FailingFileServices&) = delete;
 
-    // Makes op fail with result on paths containing pathPart (every path when empty), once
-    // skip matching calls have passed. For Rename the path is the destination; for calls on
-    // an open file it is the path it was opened with. A failed call does nothing, except
-    // that a failed Close still releases the file, as a real one does.
-    void Fail(FileOp op, FileResult result, const std::string& pathPart = "", int skip = 0);
-    // How many times op was called, failed calls included.
-    int Calls(FileOp op) const;
+    // Makes op fail with result on paths containing pathPart (every path when empty). For
+    // Rename the path is the destination; for calls on an open file it is the path it was
+    // opened with. A failed call does nothing, except that a failed Close still releases the
+    // file, as a real one does.
+    void Fail(FileOp op, FileResult result, const std::string& pathPart = "");
 
     FileResult Resolve(const std::string& path) override;
     FileResult GetInfo(const std::string& path, FileInfo* info) override;
@@ -57,15 +55,13 @@ private:
         FileOp op;
         FileResult result;
         std::string pathPart;
-        int skip;
     };
-    // Counts the call; the injected result when a rule matches, else kFileOk.
-    FileResult Injected(FileOp op, const std::string& path);
+    // The injected result when a rule matches, else kFileOk.
+    FileResult Injected(FileOp op, const std::string& path) const;
     std::string PathOf(FileId file) const;
 
     PosixFileServices m_posix;
     FileServices* m_pPrevious;
     std::vector<Rule> m_rules;
-    std::map<FileOp, int> m_calls;
     std::map<FileId, std::string> m_openPaths;
 };
