@@ -196,9 +196,9 @@ bool CChatClient::WriteChatFileToFolder(const std::string& path) {
     // The new file is written beside the old one and then renamed over it, so the old file
     // stays whole until the new one is complete.
     const std::size_t slash = path.rfind('/');
-    const std::string folder =
-        slash == std::string::npos ? std::string() : path.substr(0, slash + 1);
-    const std::string tempName = "." + FileNameOf(path) + ".saving";
+    const std::size_t nameAt = slash == std::string::npos ? 0 : slash + 1;
+    const std::string folder = path.substr(0, nameAt);
+    const std::string tempName = "." + path.substr(nameAt) + ".saving";
     const std::string tempPath = folder + tempName;
 
     FileServices& files = CurrentFileServices();

@@ -97,7 +97,6 @@ public:
     FileResult Open(const std::string& path, FilePermission permission);
     // Closes the file; kFileOk when none was open.
     FileResult Close();
-    bool IsOpen() const { return m_bOpen; }
     FileId Id() const { return m_id; }
 
 private:

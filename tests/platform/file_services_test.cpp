@@ -25,4 +25,22 @@ TEST(PosixFiles, MissingFilesAreToldApartFromOtherFailures) {
     EXPECT_EQ(files.Delete(dir.Path()), kFileError);
 }
 
+TEST(PosixFiles, AnOpenFileIsWrittenCutAndReadExactly) {
+    PosixFileServices files;
+    TempDir dir;
+    ASSERT_TRUE(PutFile(dir.File("f"), "old content"));
+    OpenFile file(files);
+    ASSERT_EQ(file.Open(dir.File("f"), kFileReadWrite), kFileOk);
+    ASSERT_EQ(files.Truncate(file.Id(), 0), kFileOk);
+    ASSERT_EQ(files.Write(file.Id(), "hello", 5), kFileOk);
+    std::uint64_t size = 0;
+    EXPECT_EQ(files.GetSize(file.Id(), &size), kFileOk);
+    EXPECT_EQ(size, 5u);
+    ASSERT_EQ(file.Open(dir.File("f"), kFileRead), kFileOk);  // closes the first
+    char buffer[4];
+    EXPECT_EQ(files.Read(file.Id(), buffer, 4), kFileOk);
+    EXPECT_EQ(files.Read(file.Id(), buffer, 4), kFileError);  // one byte was left
+    EXPECT_EQ(file.Close(), kFileOk);
+}
+
 }  // namespace
