@@ -1,6 +1,12 @@
 #include <gtest/gtest.h>
 
+#include <cstdio>
+#include <cstdlib>
+#include <fstream>
+#include <iterator>
 #include <string>
+
+#include <unistd.h>
 
 #include "tests/support/trace_capture.h"
 
@@ -33,4 +39,24 @@ TEST(Trace, LongTextsAreCutAtTheBound) {
     MacInfoTrace2("Chat", "%s", longText.c_str());
     ASSERT_EQ(capture.Lines().size(), 1u);
     EXPECT_EQ(capture.Lines()[0].text.size(), static_cast<size_t>(kMaxTraceText));
+}
+
+TEST(Trace, DefaultSinkWritesEveryLineToTheLogFileNamedByTheEnvironment) {
+    char folder[] = "/tmp/qc-trace-XXXXXX";
+    ASSERT_NE(mkdtemp(folder), nullptr);
+    const std::string path = std::string(folder) + "/chat.log";
+    setenv("QUINTARA_CHAT_LOG", path.c_str(), 1);
+    SetTraceSink(nullptr);  // the default sink opens the file on its first line
+    MacInfoTrace2("Chat", "hello %d", 1);
+    MacWarnTrace2("Chat", "%s", "careful");
+    SetTraceSink([](TraceLevel, const char*, const char*) {});
+    unsetenv("QUINTARA_CHAT_LOG");
+
+    std::ifstream file(path);
+    const std::string text((std::istreambuf_iterator<char>(file)),
+                           std::istreambuf_iterator<char>());
+    EXPECT_NE(text.find(" INFO Chat hello 1\n"), std::string::npos) << text;
+    EXPECT_NE(text.find(" WARN Chat careful\n"), std::string::npos) << text;
+    std::remove(path.c_str());
+    rmdir(folder);
 }
