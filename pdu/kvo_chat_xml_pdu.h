@@ -37,6 +37,8 @@ public:
     // builds nothing and returns 0.
     virtual int GenerateXMLPDU();
     // Reads the fields from text; 1 on success, 0 otherwise. The base reads nothing (0).
+    // Subclasses parse through ParseDocument, so a text beyond the caps of xml_limits.h, or
+    // anything after its first NUL, never reaches tinyxml.
     virtual int ParseXMLPDU(const std::string& text);
     // The main type of a received text (1 to 11), or 0 when the text is empty, does not parse,
     // has no "chat" root with an "mtype" child, or names a value outside 1 to 11. Keeps nothing.

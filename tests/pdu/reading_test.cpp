@@ -1,0 +1,178 @@
+// What each PDU requires of a received text, and what reading leaves in its fields.
+#include <gtest/gtest.h>
+
+#include <functional>
+#include <string>
+
+#include "pdu/chat_user_info_pdu.h"
+#include "pdu/customer_id_pdu.h"
+#include "pdu/faq_macro_info_pdu.h"
+#include "pdu/group_info_pdu.h"
+#include "pdu/group_message_pdu.h"
+#include "pdu/prim_cust_node_id_pdu.h"
+#include "pdu/private_message_pdu.h"
+#include "pdu/roster_info_pdu.h"
+
+namespace {
+
+std::string Chat(int type, const std::string& body) {
+    return "<chat ver=\"1.0\"><mtype>" + std::to_string(type) + "</mtype>" + body + "</chat>";
+}
+
+template <typename Pdu>
+int Parse(const std::string& text) {
+    Pdu pdu;
+    return pdu.ParseXMLPDU(text);
+}
+
+}  // namespace
+
+TEST(Reading, RequiredAndOptionalElementsOfEachKind) {
+    const struct {
+        std::function<int(const std::string&)> parse;
+        int type;
+        const char* body;
+        int result;
+    } cases[] = {
+        {Parse<CPrivateMessagePDU>, 2, "<sendid>7</sendid><recid>1</recid><message/>", 1},
+        {Parse<CPrivateMessagePDU>, 2, "<message/><recid>1</recid><sendid>7</sendid>", 1},
+        {Parse<CPrivateMessagePDU>, 2, "<recid>1</recid><message/>", 0},
+        {Parse<CPrivateMessagePDU>, 2, "<sendid></sendid><recid>1</recid><message/>", 0},
+        {Parse<CPrivateMessagePDU>, 2, "<sendid>7</sendid><message/>", 0},
+        {Parse<CPrivateMessagePDU>, 2, "<sendid>7</sendid><recid>1</recid>", 0},
+        {Parse<CPrivateMessagePDU>, 3, "<sendid>7</sendid><recid>1</recid><message/>", 0},
+        {Parse<CGroupMessagePDU>, 3, "<sendid>7</sendid><groupid>15</groupid><message/>", 1},
+        {Parse<CGroupMessagePDU>, 3, "<groupid>15</groupid><message/>", 0},
+        {Parse<CGroupMessagePDU>, 3, "<sendid>7</sendid><groupid/><message/>", 0},
+        {Parse<CGroupMessagePDU>, 3, "<sendid>7</sendid><groupid>15</groupid>", 0},
+        {Parse<CChatUserInfoPDU>, 4, "<uid>5</uid><un/>", 1},
+        {Parse<CChatUserInfoPDU>, 4, "<uid>5</uid>", 0},
+        {Parse<CChatUserInfoPDU>, 4, "<un>Al</un>", 0},
+        {Parse<CGroupInfoPDU>, 1, "<grouphandle>1</grouphandle><groupname/>", 1},
+        {Parse<CGroupInfoPDU>, 1, "<groupname>x</groupname>", 0},
+        {Parse<CGroupInfoPDU>, 1, "<grouphandle>1</grouphandle>", 0},
+        {Parse<CRosterInfoPDU>, 5, "", 1},
+        {Parse<CRosterInfoPDU>, 4, "", 0},
+        {Parse<CFAQMacroInfoPDU>, 8, "", 1},
+        {Parse<CFAQMacroInfoPDU>, 11, "<fname>Bo</fname>", 0},
+        {Parse<CCustomerIdPDU>, 11, "<customerid>0</customerid>", 1},
+        {Parse<CCustomerIdPDU>, 11, "<customerid></customerid>", 0},
+        {Parse<CCustomerIdPDU>, 10, "<customerid>5</customerid>", 0},
+        {Parse<CPrimCustNodeIdPDU>, 10, "<primcust>4096</primcust>", 1},
+        {Parse<CPrimCustNodeIdPDU>, 10, "", 0},
+    };
+    for (const auto& c : cases) {
+        EXPECT_EQ(c.parse(Chat(c.type, c.body)), c.result) << c.type << ": " << c.body;
+    }
+}
+
+TEST(Reading, MissingOptionalElementsLeaveFieldsEmptyAndFailuresKeepWhatWasRead) {
+    CGroupMessagePDU group;
+    ASSERT_EQ(group.ParseXMLPDU(Chat(3, "<sendid>7</sendid><groupid>15</groupid><message/>")), 1);
+    EXPECT_EQ(group.GetSenderName(), "");
+    EXPECT_EQ(group.GetMessageContent(), "");
+    EXPECT_EQ(group.GetGroupCacheId_DWORD(), 0u);
+
+    CRosterInfoPDU roster;
+    ASSERT_EQ(roster.ParseXMLPDU(Chat(5, "")), 1);
+    EXPECT_EQ(roster.GetUserNameW(), "");
+    EXPECT_EQ(roster.GetVisible_BOOL(), 0);
+
+    CPrivateMessagePDU partial;
+    EXPECT_EQ(partial.ParseXMLPDU(Chat(2, "<sendid>7</sendid><SenderName>Ann</SenderName>")), 0);
+    EXPECT_EQ(partial.GetSendID(), "7");
+    EXPECT_EQ(partial.GetSenderName(), "Ann");
+}
+
+TEST(Reading, TheFirstElementOfANameAndTheFirstCdataSectionCount) {
+    CGroupMessagePDU pdu;
+    ASSERT_EQ(pdu.ParseXMLPDU(Chat(3,
+                                   "<message><![CDATA[one]]><![CDATA[two]]></message>"
+                                   "<groupid>15</groupid><sendid>7</sendid><sendid>8</sendid>")),
+              1);
+    EXPECT_EQ(pdu.GetMessageContent(), "one");
+    EXPECT_EQ(pdu.GetSendID(), "7");
+}
+
+TEST(Reading, ReceiveIdsKeepTheirMeaningInEitherDecimalForm) {
+    // 0 all participants, -1 host, -2 host and presenter, -3 presenter, -4 panelists,
+    // -5 host, presenter and panelists, -6 attendees, or a user id.
+    for (const int id : {0, -1, -2, -3, -4, -5, -6, 1001}) {
+        const uint32_t bits = static_cast<uint32_t>(id);
+        CPrivateMessagePDU sent;
+        sent.SetSendID(7u);
+        sent.SetReveID(bits);
+        sent.SetMessageContent("m");
+        sent.GenerateXMLPDU();
+        for (const std::string& text :
+             {sent.ToWireText(),
+              Chat(2, "<sendid>7</sendid><recid>" + std::to_string(id) + "</recid><message/>")}) {
+            CPrivateMessagePDU pdu;
+            ASSERT_EQ(pdu.ParseXMLPDU(text), 1) << text;
+            EXPECT_EQ(pdu.GetReveID_DWORD(), bits) << text;
+        }
+        EXPECT_EQ(sent.GetReveID(), std::to_string(bits));
+    }
+}
+
+TEST(Reading, EndMarkersAreWidenedOnSetForPrivateAndOnPrintForGroupMessages) {
+    CPrivateMessagePDU privateMessage;
+    privateMessage.SetMessageContent("]]>a]]>b]]>]]>");
+    EXPECT_EQ(privateMessage.GetMessageContent(), "]] >a]] >b]] >]] >");
+    CGroupMessagePDU group;
+    group.SetMessageContent("]]>a]]>b]]>]]>");
+    EXPECT_EQ(group.GetMessageContent(), "]]>a]]>b]]>]]>");
+    group.SetSendID(7u);
+    group.SetGroupID(15u);
+    group.GenerateXMLPDU();
+    CGroupMessagePDU back;
+    ASSERT_EQ(back.ParseXMLPDU(group.ToWireText()), 1);
+    EXPECT_EQ(back.GetMessageContent(), "]] >a]] >b]] >]] >");
+}
+
+TEST(Reading, TheCacheHandleValueComesOnlyFromTheNumberSetter) {
+    CGroupMessagePDU pdu;
+    pdu.SetGroupCacheId(4097u);
+    EXPECT_EQ(pdu.GetGroupCacheId(), "4097");
+    EXPECT_EQ(pdu.GetGroupCacheIdValue(), 4097u);
+    pdu.SetGroupCacheId("12");
+    EXPECT_EQ(pdu.GetGroupCacheIdValue(), 4097u);
+    CGroupMessagePDU read;
+    ASSERT_EQ(read.ParseXMLPDU(Chat(3,
+                                    "<sendid>7</sendid><groupid>15</groupid>"
+                                    "<GroupCacheId>4097</GroupCacheId><message/>")),
+              1);
+    EXPECT_EQ(read.GetGroupCacheId_DWORD(), 4097u);
+    EXPECT_EQ(read.GetGroupCacheIdValue(), 0u);
+}
+
+TEST(Reading, OneFaqObjectTakesEveryConfigurationAndKeepsWhatALaterOneLacks) {
+    CFAQMacroInfoPDU pdu;
+    ASSERT_EQ(pdu.ParseXMLPDU(Chat(8,
+                                   "<fname>Ann</fname><lname>Lee</lname>"
+                                   "<phone>+1 &amp; 2</phone><email>a@example.org</email>")),
+              1);
+    ASSERT_EQ(pdu.ParseXMLPDU(Chat(8, "<fname></fname><email>b@example.org</email>")), 1);
+    EXPECT_EQ(pdu.GetFirstName(), "Ann");
+    EXPECT_EQ(pdu.GetLastName(), "Lee");
+    EXPECT_EQ(pdu.GetPhoneNumber(), "+1 & 2");
+    EXPECT_EQ(pdu.GetEmailAddress(), "b@example.org");
+    EXPECT_EQ(pdu.ParseXMLPDU(Chat(11, "<fname>Bo</fname>")), 0);
+    EXPECT_EQ(pdu.GetFirstName(), "Ann");
+    // Configuration is only read, never generated: the document stays what was last read.
+    const std::string read = pdu.ToWireText();
+    EXPECT_EQ(pdu.GenerateXMLPDU(), 0);
+    EXPECT_EQ(pdu.ToWireText(), read);
+}
+
+TEST(Reading, ARefusedCustomerIdKeepsTheOneBefore) {
+    CCustomerIdPDU pdu;
+    ASSERT_EQ(pdu.ParseXMLPDU(Chat(11, "<customerid>77</customerid>")), 1);
+    EXPECT_EQ(pdu.ParseXMLPDU(Chat(11, "<customerid></customerid>")), 0);
+    EXPECT_EQ(pdu.GetCustomerId_DWORD(), 77u);
+    ASSERT_EQ(pdu.ParseXMLPDU(Chat(11, "<customerid>0</customerid>")), 1);
+    EXPECT_EQ(pdu.GetCustomerId(), "0");
+    CPrimCustNodeIdPDU node;
+    ASSERT_EQ(node.ParseXMLPDU(Chat(10, "<primcust>4294967295</primcust>")), 1);
+    EXPECT_EQ(node.GetPrimCustNodeId_DWORD(), 0xFFFFFFFFu);
+}
