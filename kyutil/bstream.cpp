@@ -243,7 +243,10 @@ int CByteStream::Lock() {
 }
 
 int CByteStream::Unlock() {
-    return HUnlock(m_hData) ? 1 : 0;
+    if (m_hData == nullptr) return 0;
+    // An unlock without a matching lock leaves the block as it is; there still is a block.
+    HUnlock(m_hData);
+    return 1;
 }
 
 void CByteStream::Reset(void* pBuffer) {

@@ -168,6 +168,9 @@ TEST(ByteStream, MemoryBlockStorage) {
         EXPECT_TRUE(stream.Failed());
         EXPECT_EQ(1, stream.Unlock());
         EXPECT_EQ(0, hBlock->nLockCount);
+        // A surplus unlock still answers that there is a block, and leaves it unlocked.
+        EXPECT_EQ(1, stream.Unlock());
+        EXPECT_EQ(0, hBlock->nLockCount);
     }
     // The stream did not own the block, so its bytes are still there.
     EXPECT_EQ(8, CByteStream::ReadInt(hBlock->pData, 4));
