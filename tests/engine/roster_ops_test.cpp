@@ -186,6 +186,48 @@ TEST_F(RosterOps, HostGroupsWithOddValuesStillLandInListAndMenu) {
     EXPECT_EQ(Entries(window->Commands()[3].menu), Entries(engine.Menu()));
 }
 
+TEST_F(RosterOps, GroupSchemesPlaceGroupsAndMarkThemForTheRecording) {
+    struct Case {
+        const char* what;
+        std::uint32_t features;
+        Strings groups;
+        std::vector<int> sendGroupInfo;
+    };
+    const Case cases[] = {
+        // At the index; an index past the end appends.
+        {"first scheme", 0, {"1:1:HOST", "1:8:All Attendees", "3:30:ids"}, {1, 1, 0}},
+        // After the group whose sequence number is the index; an unknown one goes to the front.
+        {"second scheme",
+         FEATURE_GROUP_SCHEME2,
+         {"3:30:ids", "1:1:HOST", "1:8:All Attendees"},
+         {0, 0, 0}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.what);
+        CChatClient other;
+        other.SelectFeature(c.features, 0, 0, 0, 0, nullptr);
+        other.SetNBRStatus(0, 1, 0);  // recorded: new role groups owe their cache a description
+        const auto add = [&other](std::uint32_t index, std::uint32_t type, std::uint32_t id,
+                                  const char* name) {
+            _tagChatGroupInfo info{};
+            info.dwIndex = index;
+            info.dwGroupType = type;
+            info.dwGroupId = id;
+            info.cszGroupName = name;
+            other.AddGroup(&info, 0);
+        };
+        add(0, 1, 1, "Host");
+        add(1, 1, 8, "All Attendees");
+        add(7, 3, 30, "ids");
+        add(2, 1, 1, "HOST");  // matches the host group, which is updated
+        EXPECT_EQ(Groups(other.GroupList()), c.groups);
+        std::vector<int> sendGroupInfo;
+        for (std::int32_t i = 0; i < other.GroupList().GetGroupsCount(); ++i)
+            sendGroupInfo.push_back(other.GroupList().GetGroupByIndex(i)->GetNeedSendGroupInfo());
+        EXPECT_EQ(sendGroupInfo, c.sendGroupInfo);
+    }
+}
+
 TEST_F(RosterOps, OwnRolesGainThePanelistBitOutsideMeetingTypeOne) {
     struct Case {
         std::int32_t meetingType;
