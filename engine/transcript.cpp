@@ -5,6 +5,7 @@
 #include <memory>
 #include <new>
 #include <string>
+#include <string_view>
 #include <utility>
 
 #include "engine/chat_client.h"
@@ -31,8 +32,6 @@ constexpr const char* kChatFileNameKey = "Chat.txt";
 
 // Warning messages are cut to fit the host's 2048-byte message buffer.
 constexpr std::size_t kMaxWarningBytes = 2047;
-// Bytes gathered before each write while saving.
-constexpr std::size_t kWriteChunkBytes = 256 * 1024;
 
 // The text after the last "/", or the whole path when there is none or it ends the path.
 std::string FileNameOf(const std::string& path) {
@@ -60,7 +59,8 @@ void ShowChatWarning(const std::string& message) {
     ShowWarningWindow2(GetLocalizedString(kWarningTitleKey).c_str(), message.c_str());
 }
 
-// Reads the whole file at path into bytes; false when any step fails.
+// Reads the whole file at path into bytes, with one spare byte after it; false when any step
+// fails.
 bool ReadWholeFile(FileServices& files, const std::string& path, std::unique_ptr<char[]>* bytes,
                    std::size_t* size) {
     OpenFile file(files);
@@ -68,7 +68,7 @@ bool ReadWholeFile(FileServices& files, const std::string& path, std::unique_ptr
     if (file.Open(path, kFileRead) != kFileOk) return false;
     if (files.GetSize(file.Id(), &fileSize) != kFileOk) return false;
     if (fileSize >= SIZE_MAX) return false;
-    std::unique_ptr<char[]> buffer(new (std::nothrow) char[fileSize]);
+    std::unique_ptr<char[]> buffer(new (std::nothrow) char[fileSize + 1]);
     if (!buffer) return false;
     if (files.Read(file.Id(), buffer.get(), fileSize) != kFileOk) return false;
     if (file.Close() != kFileOk) return false;
@@ -90,19 +90,10 @@ FileResult WriteNewTranscriptFile(FileServices& files, const std::string& folder
     result = file.Open(path, kFileWrite);
     if (result != kFileOk) return result;
 
-    std::string chunk;
-    chunk.reserve(kWriteChunkBytes * 2);
-    chunk.append(kUtf8Bom, kUtf8BomSize);
-    const std::size_t count = content.GetTimeCount();
-    for (std::size_t i = 0; i < count; ++i) {
-        AppendTranscriptEntry(content.GetTimeAt(i), content.GetLineAtIndex(i), chunk);
-        if (chunk.size() >= kWriteChunkBytes) {
-            result = files.Write(file.Id(), chunk.data(), chunk.size());
-            if (result != kFileOk) return result;
-            chunk.clear();
-        }
-    }
-    result = files.Write(file.Id(), chunk.data(), chunk.size());
+    WriteTranscript(content, [&files, &file, &result](const char* data, std::size_t size) {
+        result = files.Write(file.Id(), data, size);
+        return result == kFileOk;
+    });
     if (result != kFileOk) return result;
     return file.Close();
 }
@@ -167,27 +158,22 @@ void CChatClient::OpenChatFile() {
     const bool hadEntries = IsChatHaveContent();
     std::unique_ptr<char[]> bytes;
     std::size_t size = 0;
-    TranscriptBatch batch;
-    // Everything is read and checked before anything is stored or shown, so a file that
-    // fails leaves the transcript and the window as they were.
+    ContentBlock content;
+    // The file is read whole first, and whether it opens is settled by its first entry,
+    // before anything is shown; a file that fails leaves the transcript and the window as
+    // they were.
+    const auto show = [this](bool bTitle, std::string_view text) {
+        NotifyUI(bTitle ? msg_ShowTitle : msg_ShowText, const_cast<char*>(text.data()));
+    };
     if (!ReadWholeFile(CurrentFileServices(), m_strFilePath, &bytes, &size) ||
-        !ParseTranscript(bytes.get(), size, &batch)) {
+        !ParseTranscript(std::move(bytes), size, &content, show)) {
         MacWarnTrace2(kChatTag, "CChatClient::OpenChatFile failed, path = %s",
                       m_strFilePath.c_str());
         ShowChatWarning(GetLocalizedString(kOpenFailedKey));
         m_strFilePath.clear();
         return;
     }
-    bytes.reset();
-
-    const std::size_t firstLine = m_ChatContent.GetLineCount();
-    m_ChatContent.AppendEntries(std::move(batch.times), std::move(batch.lines));
-    std::string text;
-    for (const TranscriptPiece& piece : batch.pieces) {
-        text.assign(m_ChatContent.GetLineAtIndex(firstLine + piece.entry), piece.offset,
-                    piece.size);
-        NotifyUI(piece.bTitle ? msg_ShowTitle : msg_ShowText, const_cast<char*>(text.c_str()));
-    }
+    m_ChatContent.AppendEntries(std::move(content));
     if (hadEntries) SetFileNeedSave(1);
     if (m_pHostSink) m_pHostSink->OnChatContentChanged(true);
 }

@@ -2,11 +2,14 @@
 
 #include <algorithm>
 #include <cstring>
+#include <utility>
 
 namespace {
 
 // Entries reserved ahead at most; bigger files grow their batch as they go.
 constexpr std::size_t kMaxReserved = std::size_t{1} << 20;
+// Bytes at the start of a file that tell how long its entries are.
+constexpr std::size_t kSampleBytes = 64 * 1024;
 
 // "00" to "99", so each two-digit field is one copy.
 constexpr char kDigitPairs[] =
@@ -19,15 +22,22 @@ void PutTwoDigits(char* out, unsigned value) {
     std::memcpy(out, kDigitPairs + 2 * (value % 100), 2);
 }
 
-bool ReadDigits(const char* in, int digits, std::uint16_t* value) {
-    unsigned result = 0;
-    for (int i = 0; i < digits; ++i) {
-        const char c = in[i];
-        if (c < '0' || c > '9') return false;
-        result = result * 10 + static_cast<unsigned>(c - '0');
-    }
-    *value = static_cast<std::uint16_t>(result);
-    return true;
+// The number written as two digits at in, or 100 or more when they are not two digits.
+unsigned TwoDigits(const char* in) {
+    const unsigned tens = static_cast<unsigned char>(in[0]) - unsigned{'0'};
+    const unsigned ones = static_cast<unsigned char>(in[1]) - unsigned{'0'};
+    return tens > 9 || ones > 9 ? 100 : tens * 10 + ones;
+}
+
+// About how many entries a file of size bytes holds, judged from its first kSampleBytes,
+// where nearly every line is an entry, with an eighth more for a file whose entries get
+// shorter further on; beyond that the batch grows as it goes. Room reserved far beyond
+// the entries would keep the memory allocator from handing the same memory out again.
+std::size_t EstimatedEntries(const char* data, std::size_t size) {
+    const std::size_t sample = std::min(size, kSampleBytes);
+    const std::size_t lines = static_cast<std::size_t>(std::count(data, data + sample, '\n')) + 1;
+    const std::size_t entries = size / std::max<std::size_t>(sample / lines, 1) + 1;
+    return std::min(entries + entries / 8, kMaxReserved);
 }
 
 // Where the entries start: after a UTF-8 mark or a UTF-16 little-endian mark.
@@ -60,11 +70,59 @@ std::size_t KeptHeaderSize(const char* header, std::size_t size) {
     return kept;
 }
 
-void AppendText(TranscriptBatch* batch, const char* text, std::size_t size) {
-    const std::size_t entry = batch->lines.size() - 1;
-    std::string& line = batch->lines[entry];
-    batch->pieces.push_back(TranscriptPiece{false, entry, line.size(), size});
-    line.append(text, size);
+// Reads the time prefix at data, which holds at least kTimePrefixSize bytes, into *time;
+// false, with *time untouched, when it is not a valid one. It runs for every line of a file,
+// so it is always inlined, and it stores the fields one by one: a record built aside and
+// copied whole would make the processor gather its small fields again.
+[[gnu::always_inline]] inline bool ReadTimePrefix(const char* data, DateTimeRec* time) {
+    const unsigned month = TwoDigits(data);
+    const unsigned day = TwoDigits(data + 3);
+    const unsigned century = TwoDigits(data + 6);
+    const unsigned yearOfCentury = TwoDigits(data + 8);
+    const unsigned hour = TwoDigits(data + 14);
+    const unsigned minute = TwoDigits(data + 17);
+    const unsigned second = TwoDigits(data + 20);
+    const bool valid = (month - 1 < 12) & (day - 1 < 31) & (century < 100) & (yearOfCentury < 100) &
+                       (century + yearOfCentury > 0) & (hour < 100) & (minute < 60) & (second < 60);
+    if (!valid) return false;
+    time->year = static_cast<std::uint16_t>(century * 100 + yearOfCentury);
+    time->month = static_cast<std::uint16_t>(month);
+    time->day = static_cast<std::uint16_t>(day);
+    time->hour = static_cast<std::uint16_t>(hour);
+    time->minute = static_cast<std::uint16_t>(minute);
+    time->second = static_cast<std::uint16_t>(second);
+    time->valid = 1;
+    return true;
+}
+
+// Puts the start of an entry's line in place: the kept header, a CR unless it ends in one,
+// and a TAB. Returns where the line starts and sets *end just past its TAB. A header kept
+// whole that ends in CR already stands so in the file and nothing moves; any other is
+// rewritten over the entry's prefix, where the CR has room.
+std::size_t StartLine(char* data, std::size_t prefixAt, std::size_t headerSize, std::size_t* end) {
+    const std::size_t headerAt = prefixAt + kTimePrefixSize;
+    const std::size_t kept = KeptHeaderSize(data + headerAt, headerSize);
+    if (kept == headerSize && kept > 0 && data[headerAt + kept - 1] == '\r') {
+        *end = headerAt + kept + 1;
+        return headerAt;
+    }
+    std::memmove(data + prefixAt, data + headerAt, kept);
+    std::size_t at = prefixAt + kept;
+    if (kept == 0 || data[at - 1] != '\r') data[at++] = '\r';
+    data[at++] = '\t';
+    *end = at;
+    return prefixAt;
+}
+
+// Shows bytes [at, at + size) of data as one text, with a NUL put after them for the call.
+// The byte there is part of the file's buffer, at worst its spare last byte.
+void Show(char* data, std::size_t at, std::size_t size, bool bTitle,
+          const ShowTranscriptText& show) {
+    char* const end = data + at + size;
+    const char after = *end;
+    *end = '\0';
+    show(bTitle, std::string_view(data + at, size));
+    *end = after;
 }
 
 }  // namespace
@@ -81,56 +139,70 @@ void FormatTimePrefix(const DateTimeRec& time, char* out) {
     if (time.hour >= 12) out[23] = 'P';
 }
 
-void AppendTranscriptEntry(const DateTimeRec& time, const std::string& line, std::string& out) {
-    char prefix[kTimePrefixSize];
-    FormatTimePrefix(time, prefix);
-    out.append(prefix, kTimePrefixSize);
-    out.append(line);
-    out.push_back('\n');
+bool WriteTranscript(const CChatContentStorage& content, const WriteTranscriptBytes& write) {
+    const std::unique_ptr<char[]> chunk(new char[kTranscriptChunkBytes]);
+    std::memcpy(chunk.get(), kUtf8Bom, kUtf8BomSize);
+    std::size_t used = kUtf8BomSize;
+    const std::size_t count = content.GetTimeCount();
+    for (std::size_t i = 0; i < count; ++i) {
+        const std::string_view line = content.GetLineAtIndex(i);
+        const std::size_t entrySize = kTimePrefixSize + line.size() + 1;
+        if (used > 0 && used + entrySize > kTranscriptChunkBytes) {
+            if (!write(chunk.get(), used)) return false;
+            used = 0;
+        }
+        // Formatted in place, so each byte is copied once on its way to the file.
+        char* const entry = chunk.get() + used;
+        FormatTimePrefix(content.GetTimeAt(i), entry);
+        if (entrySize <= kTranscriptChunkBytes) {
+            if (!line.empty()) std::memcpy(entry + kTimePrefixSize, line.data(), line.size());
+            entry[entrySize - 1] = '\n';
+            used += entrySize;
+        } else {
+            if (!write(entry, kTimePrefixSize) || !write(line.data(), line.size())) return false;
+            entry[0] = '\n';
+            used = 1;
+        }
+    }
+    return write(chunk.get(), used);
 }
 
 std::string FormatTranscript(const CChatContentStorage& content) {
-    const std::size_t count = content.GetTimeCount();
-    std::size_t total = kUtf8BomSize;
-    for (std::size_t i = 0; i < count; ++i) {
-        total += kTimePrefixSize + content.GetLineAtIndex(i).size() + 1;
-    }
     std::string out;
-    out.reserve(total);
-    out.append(kUtf8Bom, kUtf8BomSize);
-    for (std::size_t i = 0; i < count; ++i) {
-        AppendTranscriptEntry(content.GetTimeAt(i), content.GetLineAtIndex(i), out);
-    }
+    WriteTranscript(content, [&out](const char* data, std::size_t size) {
+        out.append(data, size);
+        return true;
+    });
     return out;
 }
 
 bool ParseTimePrefix(const char* data, std::size_t size, DateTimeRec* time) {
-    if (size < kTimePrefixSize) return false;
-    DateTimeRec t{};
-    if (!ReadDigits(data, 2, &t.month) || !ReadDigits(data + 3, 2, &t.day) ||
-        !ReadDigits(data + 6, 4, &t.year) || !ReadDigits(data + 14, 2, &t.hour) ||
-        !ReadDigits(data + 17, 2, &t.minute) || !ReadDigits(data + 20, 2, &t.second)) {
-        return false;
-    }
-    if (t.day < 1 || t.day > 31 || t.month < 1 || t.month > 12 || t.year == 0 || t.minute >= 60 ||
-        t.second >= 60) {
-        return false;
-    }
-    t.valid = 1;
-    *time = t;
-    return true;
+    return size >= kTimePrefixSize && ReadTimePrefix(data, time);
 }
 
-bool ParseTranscript(const char* data, std::size_t size, TranscriptBatch* batch) {
-    batch->times.clear();
-    batch->lines.clear();
-    batch->pieces.clear();
-    // Every entry takes at least its prefix and TAB, so this seldom falls short; what is
-    // reserved beyond the entries read is never touched.
-    const std::size_t mostEntries = std::min(size / (kTimePrefixSize + 1) + 1, kMaxReserved);
-    batch->times.reserve(mostEntries);
-    batch->lines.reserve(mostEntries);
-    batch->pieces.reserve(2 * mostEntries);
+bool ParseTranscript(std::unique_ptr<char[]> bytes, std::size_t size, ContentBlock* content,
+                     const ShowTranscriptText& show) {
+    std::vector<DateTimeRec>& times = content->times;
+    std::vector<std::string_view>& lines = content->lines;
+    times.clear();
+    lines.clear();
+    const std::size_t entries = EstimatedEntries(bytes.get(), size);
+    times.reserve(entries);
+    lines.reserve(entries);
+
+    // Each line is put together inside the file's own bytes. A line never starts after its
+    // entry's prefix and every text added to it loses at least the LF before it, so bytes
+    // are only ever moved towards the front, over bytes already read.
+    char* const data = bytes.get();
+    content->text = std::move(bytes);
+    std::size_t lineAt = 0;   // where the last line starts
+    std::size_t lineEnd = 0;  // where it ends, and where its next text goes
+    // Adds bytes [from, from + size) to the last line and shows them as one text.
+    const auto addText = [&](std::size_t from, std::size_t textSize) {
+        if (from != lineEnd) std::memmove(data + lineEnd, data + from, textSize);
+        Show(data, lineEnd, textSize, false, show);
+        lineEnd += textSize;
+    };
 
     std::size_t pos = SkipByteOrderMark(data, size);
     while (pos < size) {
@@ -138,40 +210,41 @@ bool ParseTranscript(const char* data, std::size_t size, TranscriptBatch* batch)
             ++pos;
         if (pos == size) break;
 
-        DateTimeRec time;
-        if (!ParseTimePrefix(data + pos, size - pos, &time)) {
-            // The first line must be an entry; any later one continues the entry before it.
-            if (batch->lines.empty()) return false;
+        // The time goes straight into its place and is taken back when the line is no entry.
+        DateTimeRec& time = times.emplace_back();
+        if (size - pos < kTimePrefixSize || !ReadTimePrefix(data + pos, &time)) {
+            times.pop_back();
+            // The first line must be an entry; any later one continues the entry before it,
+            // joined to its line without the LF.
+            if (lines.empty()) return false;
             const std::size_t end = LineEnd(data, pos, size);
-            AppendText(batch, data + pos, end - pos);
+            addText(pos, end - pos);
+            lines.back() = std::string_view(data + lineAt, lineEnd - lineAt);
             pos = end + 1;
             continue;
         }
 
         // The header runs to the next TAB, which may lie on a later line. Without one the
-        // entry is incomplete and is dropped, so times and lines stay paired.
+        // entry is incomplete and is dropped, so times and lines stay paired. With one the
+        // file is sure to open, so its texts are shown from here on.
         const std::size_t headerStart = pos + kTimePrefixSize;
         const void* tab = std::memchr(data + headerStart, '\t', size - headerStart);
-        if (!tab) break;
+        if (!tab) {
+            times.pop_back();
+            break;
+        }
         const std::size_t tabAt = static_cast<std::size_t>(static_cast<const char*>(tab) - data);
-        const char* header = data + headerStart;
-        const std::size_t kept = KeptHeaderSize(header, tabAt - headerStart);
         const std::size_t textStart = tabAt + 1;
-        const std::size_t textEnd = textStart < size ? LineEnd(data, textStart, size) : size;
-
-        const std::size_t entry = batch->lines.size();
-        batch->times.push_back(time);
-        batch->lines.emplace_back();
-        std::string& line = batch->lines.back();
-        line.reserve(kept + 2 + (textEnd - textStart));
-        line.append(header, kept);
-        if (kept == 0 || header[kept - 1] != '\r') line.push_back('\r');
-        batch->pieces.push_back(TranscriptPiece{true, entry, 0, line.size()});
-        line.push_back('\t');
-
-        if (textStart >= size) break;  // nothing follows the TAB
-        AppendText(batch, data + textStart, textEnd - textStart);
-        pos = textEnd + 1;
+        lineAt = StartLine(data, pos, tabAt - headerStart, &lineEnd);
+        Show(data, lineAt, lineEnd - 1 - lineAt, true, show);
+        if (textStart < size) {  // else nothing follows the TAB
+            const std::size_t textEnd = LineEnd(data, textStart, size);
+            addText(textStart, textEnd - textStart);
+            pos = textEnd + 1;
+        } else {
+            pos = size;
+        }
+        lines.emplace_back(data + lineAt, lineEnd - lineAt);
     }
-    return !batch->lines.empty();
+    return !lines.empty();
 }

@@ -3,8 +3,10 @@
 #pragma once
 
 #include <cstddef>
+#include <functional>
+#include <memory>
 #include <string>
-#include <vector>
+#include <string_view>
 
 #include "engine/chat_content_storage.h"
 
@@ -20,10 +22,18 @@ constexpr std::size_t kMaxHeaderSize = 8191;
 // followed by AM below 12 and PM from 12.
 void FormatTimePrefix(const DateTimeRec& time, char* out);
 
-// Appends one entry as it stands in a file: prefix, line, LF.
-void AppendTranscriptEntry(const DateTimeRec& time, const std::string& line, std::string& out);
+// Takes the next bytes of a file being written; false stops the writing.
+using WriteTranscriptBytes = std::function<bool(const char* data, std::size_t size)>;
+// Bytes gathered before each call of a WriteTranscriptBytes.
+constexpr std::size_t kTranscriptChunkBytes = 1024 * 1024;
 
-// The whole file for content: the mark, then one entry per time, time i with line i.
+// Passes the whole file for content to write, in order: the mark, then one entry per time,
+// time i with line i. The bytes come in chunks of at most kTranscriptChunkBytes, except
+// that a longer line comes by itself, straight from the store. True when every call of
+// write returned true.
+bool WriteTranscript(const CChatContentStorage& content, const WriteTranscriptBytes& write);
+
+// The whole file for content, as WriteTranscript passes it.
 std::string FormatTranscript(const CChatContentStorage& content);
 
 // Reads a time prefix from the first kTimePrefixSize bytes of data. True when there are
@@ -31,24 +41,16 @@ std::string FormatTranscript(const CChatContentStorage& content);
 // second below 60; the separators and the hour's value are not examined.
 bool ParseTimePrefix(const char* data, std::size_t size, DateTimeRec* time);
 
-// One text an opened file shows, in file order: a title (the header ending in CR) or a
-// message text, taken as bytes [offset, offset + size) of the line of entry `entry`.
-struct TranscriptPiece {
-    bool bTitle;
-    std::size_t entry;
-    std::size_t offset;
-    std::size_t size;
-};
+// Receives, in file order, each text an opened file shows: a title (the header ending in CR)
+// or a message text. A NUL follows the text; both are valid only during the call.
+using ShowTranscriptText = std::function<void(bool bTitle, std::string_view text)>;
 
-// What a transcript file holds: whole entries (times[i] with lines[i]) and what to show.
-struct TranscriptBatch {
-    std::vector<DateTimeRec> times;
-    std::vector<std::string> lines;
-    std::vector<TranscriptPiece> pieces;
-};
-
-// Parses the bytes of a transcript file into batch (which is cleared first). True when at
-// least one entry was read. The first entry must have a valid prefix; a later line without
-// one continues the entry before it; an entry whose header has no TAB after it is dropped.
-// A stored line is header, CR, TAB, message and continuations.
-bool ParseTranscript(const char* data, std::size_t size, TranscriptBatch* batch);
+// Parses the size bytes of a transcript file into content (which is cleared first), taking
+// the bytes over; they must be followed by one spare byte. Each line is put together in place
+// inside the bytes, so nothing is copied or allocated per entry. True when at least one entry
+// was read. The first entry must have a valid prefix; a later line without one continues the
+// entry before it; an entry whose header has no TAB after it is dropped. A stored line is
+// header, CR, TAB, message and continuations. Texts are shown as they are read, from the
+// first entry's TAB on, when the file is sure to open: a file that fails shows nothing.
+bool ParseTranscript(std::unique_ptr<char[]> bytes, std::size_t size, ContentBlock* content,
+                     const ShowTranscriptText& show);

@@ -1,11 +1,14 @@
 // Fuzz target for the transcript file parser: any bytes a user may open. Besides not
-// crashing, what it reads must stay whole: every shown piece lies inside its entry's line,
-// every title is bounded and ends in CR, and writing the entries back and reading them
-// again gives the same entries.
+// crashing, what it reads must stay whole: the lines lie in order inside the file's bytes,
+// each entry shows a bounded title ending in CR and texts that make up its line, and writing
+// the entries back and reading them again gives the same entries.
 #include <cstddef>
 #include <cstdint>
 #include <cstdlib>
+#include <cstring>
+#include <memory>
 #include <string>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -23,35 +26,58 @@ bool SameTime(const DateTimeRec& a, const DateTimeRec& b) {
            a.minute == b.minute && a.second == b.second;
 }
 
+// A heap copy of bytes with only the spare byte the parser needs after it, so reading
+// further is reading past the allocation.
+std::unique_ptr<char[]> CopyOf(const void* bytes, std::size_t size) {
+    std::unique_ptr<char[]> copy(new char[size + 1]);
+    if (size > 0) std::memcpy(copy.get(), bytes, size);
+    return copy;
+}
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    TranscriptBatch batch;
-    const bool ok = ParseTranscript(reinterpret_cast<const char*>(data), size, &batch);
-    Check(ok == !batch.lines.empty());
-    Check(batch.times.size() == batch.lines.size());
+    // Every entry shows its title, bounded and ending in CR, and then texts that, with the
+    // TAB after the title, make up exactly its line.
+    std::vector<std::string> shown;
+    ContentBlock content;
+    const bool ok = ParseTranscript(
+        CopyOf(data, size), size, &content, [&shown](bool bTitle, std::string_view text) {
+            Check(text.data()[text.size()] == '\0');
+            if (bTitle) {
+                Check(!text.empty() && text.size() <= kMaxHeaderSize && text.back() == '\r');
+                shown.emplace_back(text).push_back('\t');
+            } else {
+                Check(!shown.empty());
+                shown.back().append(text);
+            }
+        });
+    const std::vector<std::string_view>& lines = content.lines;
+    Check(ok == !lines.empty());
+    Check(content.times.size() == lines.size());
+    const std::vector<std::string> expected(lines.begin(), lines.end());
+    Check(shown == expected);
     if (!ok) return 0;
 
-    for (const TranscriptPiece& piece : batch.pieces) {
-        Check(piece.entry < batch.lines.size());
-        const std::string& line = batch.lines[piece.entry];
-        Check(piece.offset <= line.size() && piece.size <= line.size() - piece.offset);
-        if (piece.bTitle) {
-            Check(piece.offset == 0 && piece.size >= 1 && piece.size <= kMaxHeaderSize);
-            Check(line[piece.size - 1] == '\r' && line[piece.size] == '\t');
-        }
+    // Every line lies inside the bytes, after the one before it.
+    const char* const begin = content.text.get();
+    const char* previousEnd = begin;
+    for (const std::string_view line : lines) {
+        Check(line.data() >= previousEnd && line.data() + line.size() <= begin + size);
+        previousEnd = line.data() + line.size();
     }
 
-    CChatContentStorage content;
-    std::vector<DateTimeRec> times = batch.times;
-    std::vector<std::string> lines = batch.lines;
-    content.AppendEntries(std::move(times), std::move(lines));
-    const std::string written = FormatTranscript(content);
-    TranscriptBatch again;
-    Check(ParseTranscript(written.data(), written.size(), &again));
-    Check(again.lines == batch.lines);
-    for (std::size_t i = 0; i < batch.times.size(); ++i) {
-        Check(SameTime(again.times[i], batch.times[i]));
+    // Kept by the store and written back, the entries read back the same.
+    const std::vector<DateTimeRec> times = content.times;
+    CChatContentStorage store;
+    store.AppendEntries(std::move(content));
+    const std::string written = FormatTranscript(store);
+    ContentBlock again;
+    Check(ParseTranscript(CopyOf(written.data(), written.size()), written.size(), &again,
+                          [](bool, std::string_view) {}));
+    Check(std::vector<std::string>(again.lines.begin(), again.lines.end()) == expected);
+    for (std::size_t i = 0; i < times.size(); ++i) {
+        Check(SameTime(again.times[i], times[i]));
     }
     return 0;
 }

@@ -2,7 +2,10 @@
 
 #include <gtest/gtest.h>
 
+#include <memory>
 #include <string>
+#include <string_view>
+#include <utility>
 #include <vector>
 
 namespace {
@@ -13,6 +16,33 @@ DateTimeRec At(int year, int month, int day, int hour, int minute, int second) {
 }
 
 const std::string kBom = "\xEF\xBB\xBF";
+
+// What parsing a file gives: its entries' lines and the texts shown, each marked T: (title,
+// 2201) or M: (message text, 2200).
+struct Parsed {
+    bool ok;
+    std::vector<std::string> lines;
+    std::vector<std::string> shown;
+    std::size_t times;
+};
+
+// Parses a heap copy of bytes with only the spare byte after it, so reading further is
+// reading past the allocation.
+Parsed Parse(const std::string& bytes) {
+    std::unique_ptr<char[]> copy(new char[bytes.size() + 1]);
+    bytes.copy(copy.get(), bytes.size());
+    Parsed parsed{};
+    ContentBlock content;
+    parsed.ok = ParseTranscript(
+        std::move(copy), bytes.size(), &content, [&parsed](bool bTitle, std::string_view text) {
+            EXPECT_EQ(text.data()[text.size()], '\0');
+            parsed.shown.push_back((bTitle ? "T:" : "M:") + std::string(text));
+        });
+    parsed.lines.assign(content.lines.begin(), content.lines.end());
+    parsed.times = content.times.size();
+    return parsed;
+}
+
 const std::string kFirst = "03/05/2009    09:03:07 AM    ";
 const std::string kSecond = "12/31/2010    14:05:09 PM    ";
 
@@ -33,6 +63,38 @@ TEST(TranscriptFormat, FileIsMarkThenPrefixLineAndLfPerTime) {
               "03/05/2009    12:00:00 PM    from Ann:\r\thi\n"
               "12/31/0987    14:05:09 PM    from Ann:\r\thi\n"
               "01/02/2010    03:04:05 AM    \n");
+}
+
+TEST(TranscriptFormat, WritingComesInBoundedChunksAndStopsWhenRefused) {
+    // A line longer than a chunk between two short ones, and enough short ones to fill
+    // more chunks.
+    CChatContentStorage content;
+    std::string expected = kBom;
+    const std::string big(kTranscriptChunkBytes + 10, 'b');
+    const std::string bigLine = "from Ann:\r\t" + big;
+    for (int i = 0; i < 40000; ++i) {
+        content.InsertTime(At(2009, 3, 5, 9, 3, 7));
+        content.InsertNewLine("from Ann:\r");
+        content.ModifyLatestLineByAdd(i == 3 ? big : std::to_string(i));
+        expected += "03/05/2009    09:03:07 AM    from Ann:\r\t" +
+                    (i == 3 ? big : std::to_string(i)) + "\n";
+    }
+    std::string written;
+    int calls = 0;
+    EXPECT_TRUE(WriteTranscript(content, [&](const char* data, std::size_t size) {
+        EXPECT_TRUE(size <= kTranscriptChunkBytes || std::string_view(data, size) == bigLine);
+        written.append(data, size);
+        ++calls;
+        return true;
+    }));
+    EXPECT_EQ(written, expected);
+
+    // Refused at the second chunk: nothing more is asked for.
+    int refusedAt = 0;
+    EXPECT_FALSE(WriteTranscript(
+        content, [&refusedAt](const char*, std::size_t) { return ++refusedAt < 2; }));
+    EXPECT_EQ(refusedAt, 2);
+    EXPECT_GE(calls, 5);
 }
 
 TEST(TranscriptFormat, PrefixChecksDateMinuteAndSecondButNotTheHour) {
@@ -67,6 +129,10 @@ TEST(TranscriptFormat, ParsingKeepsEntriesWholeCaseByCase) {
          kFirst + "A\tx\n" + month13 + "B\ty\n" + kSecond + "C\tz\n03/05/20",
          {"A\r\tx" + month13 + "B\ty", "C\r\tz03/05/20"},
          {"T:A\r", "M:x", "M:" + month13 + "B\ty", "T:C\r", "M:z", "M:03/05/20"}},
+        {"an empty message, then a continuation",
+         kFirst + "A\r\t\n" + "more\n" + kSecond + "B\tx",
+         {"A\r\tmore", "B\r\tx"},
+         {"T:A\r", "M:", "M:more", "T:B\r", "M:x"}},
         {"nothing after the TAB", kFirst + "A\t", {"A\r\t"}, {"T:A\r"}},
         {"last entry without TAB dropped",
          kFirst + "A\tx\n" + kSecond + "B\n",
@@ -79,18 +145,11 @@ TEST(TranscriptFormat, ParsingKeepsEntriesWholeCaseByCase) {
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
-        // An exact-size heap copy, so reading past the end is reading past the allocation.
-        const std::vector<char> bytes(c.bytes.begin(), c.bytes.end());
-        TranscriptBatch batch;
-        EXPECT_EQ(ParseTranscript(bytes.data(), bytes.size(), &batch), !c.lines.empty());
-        EXPECT_EQ(batch.lines, c.lines);
-        EXPECT_EQ(batch.times.size(), batch.lines.size());
-        std::vector<std::string> shown;
-        for (const TranscriptPiece& p : batch.pieces) {
-            shown.push_back((p.bTitle ? "T:" : "M:") +
-                            batch.lines[p.entry].substr(p.offset, p.size));
-        }
-        EXPECT_EQ(shown, c.shown);
+        const Parsed parsed = Parse(c.bytes);
+        EXPECT_EQ(parsed.ok, !c.lines.empty());
+        EXPECT_EQ(parsed.lines, c.lines);
+        EXPECT_EQ(parsed.times, parsed.lines.size());
+        EXPECT_EQ(parsed.shown, c.shown);
     }
 }
 
@@ -105,11 +164,9 @@ TEST(TranscriptFormat, LongHeadersAreCutToTheBufferAtACharacterBoundary) {
         {euros, euros.substr(0, 8188) + "\r"},
     };
     for (const auto& c : cases) {
-        const std::string bytes = kFirst + c.first + "\tmsg\n";
-        TranscriptBatch batch;
-        ASSERT_TRUE(ParseTranscript(bytes.data(), bytes.size(), &batch));
-        EXPECT_EQ(batch.lines[0], c.second + "\tmsg");
-        EXPECT_EQ(batch.pieces[0].size, c.second.size());
+        const Parsed parsed = Parse(kFirst + c.first + "\tmsg\n");
+        EXPECT_EQ(parsed.lines, std::vector<std::string>{c.second + "\tmsg"});
+        EXPECT_EQ(parsed.shown, (std::vector<std::string>{"T:" + c.second, "M:msg"}));
     }
 }
 
