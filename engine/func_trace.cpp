@@ -5,7 +5,7 @@
 
 #include "platform/trace.h"
 
-CFuncTrace::CFuncTrace(const char* format, ...) : m_szText{}, m_pszFormat(format) {
+CFuncTrace::CFuncTrace(const char* format, ...) : m_szText{} {
     if (format) {
         va_list args;
         va_start(args, format);

@@ -14,7 +14,6 @@ public:
 
 private:
     char m_szText[1024];
-    const char* m_pszFormat;
 };
 
 // The module tag of every log line the component writes.
