@@ -133,11 +133,11 @@ public:
                                 tagCacheAction action, std::uint32_t requestIdx,
                                 std::uint32_t cacheId, short result) override;
     // IArmSharedDataSink
-    int SharedDataReceived(std::uint32_t apeHandle, std::uint32_t entityId,
-                           std::uint32_t memHandle, short result) override;
-    int SharedDataReceivedEx(std::uint32_t apeHandle, std::uint32_t cacheId,
-                             std::uint32_t entityId, std::uint32_t memHandle, short result,
-                             tagCacheAction action, std::uint32_t senderId, std::uint32_t value,
+    int SharedDataReceived(std::uint32_t apeHandle, std::uint32_t entityId, std::uint32_t memHandle,
+                           short result) override;
+    int SharedDataReceivedEx(std::uint32_t apeHandle, std::uint32_t cacheId, std::uint32_t entityId,
+                             std::uint32_t memHandle, short result, tagCacheAction action,
+                             std::uint32_t senderId, std::uint32_t value,
                              std::uint16_t flags) override;
     // IArmAllocHandleSink
     int AllocHandleConfirm(std::uint32_t apeHandle, std::uint32_t handle, short result) override;
@@ -276,11 +276,11 @@ private:
     // Adds one enrolled participant, unless already known or the recorder, with the menu
     // entry the rules give it (roster_changes.cpp).
     void AddEnrolledUser(std::unique_ptr<UserItem> user, bool bOwn);
-    // Under QM rules: titles the role entry the participant holds with the participant's name.
+    // Under QM rules: titles the role entry the participant holds with the participant's name,
+    // first creating the "Host" entry when another participant's host role has none.
     void TitleRoleEntryInQM(std::uint32_t nodeId, const std::string& name);
 
 public:
-
     // ---- Send-to groups (groups.cpp) ----
     // Adds the host's group (a null info does nothing), with a menu entry at its index when
     // bAddToMenu is set, and has the window rebuild its menu.
@@ -335,16 +335,19 @@ public:
     // InsertChatUserName with the participant's internal/external mark on the title.
     void InsertExternalInternalChatUserName(const char* name, std::uint32_t nodeId,
                                             std::uint32_t tag);
-    // Gives the participant a private-chat entry in its section, in title order; the local
-    // participant, and attendees seen by an attendee in practice, get none.
+    // Gives the participant a private-chat entry in its section, in title order. None for the
+    // local participant, for anyone while an unprivileged local participant is in practice, or
+    // under QM rules for panelists, presenter and host.
     void InsertChatUserName(const char* name, std::uint32_t nodeId, int bSelect);
     // Puts the participant at the top of the recent entries.
     void InsertRecentUserName(const char* name, std::uint32_t nodeId);
     // Take the participant's entry (or its recent entry) out with the separators it leaves
     // doubled; a selected entry's audience is replaced by a fallback one.
     void RemoveChatUserName(const char* name, std::uint32_t nodeId, int bNotify);
-    void RemoveChatUserNameInQM(const char* name, std::uint32_t nodeId);
     void RemoveRecentUserName(const char* name, std::uint32_t nodeId);
+    // Under QM rules: an attendee's entry goes; a host's or presenter's role entry goes only
+    // when selected. A selected entry is announced as a departed audience and input stops.
+    void RemoveChatUserNameInQM(const char* name, std::uint32_t nodeId);
     // Changes nothing: an entry keeps the title it got on arrival.
     void ModifyChatUserName(const char* name, std::uint32_t nodeId);
     // True when chat to the participant is possible; selects its entry unless test-only.
@@ -402,7 +405,6 @@ private:
     void RememberRecentUser(std::uint32_t nodeId, const char* name);
 
 public:
-
     // ---- Privilege and role policy (privilege.cpp) ----
     // Takes a privilege word (or re-applies the current one; bForce redoes the attendee menu
     // even when the word is unchanged); under QM rules hands over to OnPrivilegeChangedInQM.
@@ -431,7 +433,6 @@ private:
     void StorePrivilege(std::uint32_t privilege, bool bWithEveryone);
 
 public:
-
     // ---- State read by tests and the component's functions ----
     const CUserListManager& UserList() const { return m_UserList; }
     const CUsersGroupList& GroupList() const { return m_GroupList; }
@@ -474,19 +475,19 @@ private:
     CUsersGroup* FindCacheGroup(std::uint32_t groupId);
 
     // Engine fields, in the order the component has always kept them.
-    std::uint32_t m_dwMyRosters = 0;     // own role bits (ChSetRosters)
-    int m_nPrivilegeCountdown = 0;       // 0 idle; else counts ticks up to 10
-    int m_bPrivilegePending = 0;         // from Initialize until the countdown fires
-    int m_nStartupTicks = 0;             // 1..20 after Initialize, then 0
-    int m_bEnrolled = 0;                 // an enroll confirmation arrived
-    int m_bRostersPending = 0;           // roles changed before enrolment
-    int m_bInitCaches = 0;               // this participant initialises the caches
+    std::uint32_t m_dwMyRosters = 0;  // own role bits (ChSetRosters)
+    int m_nPrivilegeCountdown = 0;    // 0 idle; else counts ticks up to 10
+    int m_bPrivilegePending = 0;      // from Initialize until the countdown fires
+    int m_nStartupTicks = 0;          // 1..20 after Initialize, then 0
+    int m_bEnrolled = 0;              // an enroll confirmation arrived
+    int m_bRostersPending = 0;        // roles changed before enrolment
+    int m_bInitCaches = 0;            // this participant initialises the caches
     NameHandle m_ChatStatusCacheHandle{};
     NameHandle m_UserInfoCacheHandle{};
     NameHandle m_CustomerCacheHandle{};
     int m_bSaveForReport = 0;
-    std::uint32_t m_dwMyRole = 0;        // bit 0 presenter, bit 1 host, after the last change
-    std::uint32_t m_dwPrevMyRole = 0;    // the same before it
+    std::uint32_t m_dwMyRole = 0;      // bit 0 presenter, bit 1 host, after the last change
+    std::uint32_t m_dwPrevMyRole = 0;  // the same before it
     std::int32_t m_dwMeetingType = 0;
     std::unique_ptr<ChatRecoveryMgr> m_pRecoveryMgr;
     std::unique_ptr<CFAQMacroInfoPDU> m_pFAQMacroInfo;
@@ -524,17 +525,17 @@ private:
     CChatContentStorage m_ChatContent;
     CUserListManager m_UserList;
     CUsersGroupList m_GroupList;
-    std::string m_strFilePath;           // transcript file; empty = never saved or opened
-    int m_bFileNeedSave = 0;             // transcript modified flag
+    std::string m_strFilePath;  // transcript file; empty = never saved or opened
+    int m_bFileNeedSave = 0;    // transcript modified flag
     PlaySoundMode m_nSoundMode = 0;
     FSRef m_SoundFile{};
-    bool m_bFirstMessage = true;         // sound mode 2 plays for the first line only
+    bool m_bFirstMessage = true;  // sound mode 2 plays for the first line only
     std::uint32_t m_dwPrivilege = 0x10047;
     std::uint32_t m_dwFeatures = 0;
     std::uint32_t m_dwNBRStatus = 1;
     std::uint32_t m_dwNBROption = 1;
     MenuStatusList m_MenuStatus;
-    RunLoop* m_pTimerLoop = nullptr;     // the loop the tick timer runs on
+    RunLoop* m_pTimerLoop = nullptr;  // the loop the tick timer runs on
     RunLoop::TimerId m_pTimer = 0;
     ChatUIHandle m_hChatUI = nullptr;
     void* m_hParentView = nullptr;
