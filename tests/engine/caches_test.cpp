@@ -1,0 +1,347 @@
+// Group caches on the in-process conference: which caches each role subscribes to, how a role
+// change moves the subscriptions, when a request is refused, what the cache-action
+// confirmations set in motion, and the lookups between cache names, handles and group ids.
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <set>
+#include <string>
+#include <vector>
+
+#include "engine/chat_client.h"
+#include "engine/chat_recovery_mgr.h"
+#include "platform/inproc_conference.h"
+#include "platform/virtual_run_loop.h"
+#include "tests/support/recording_window.h"
+#include "tests/support/spy_arm_client.h"
+#include "tests/support/trace_capture.h"
+
+namespace {
+
+constexpr std::uint32_t kSessionId = 42;
+constexpr std::uint32_t kMyNode = 7;
+constexpr std::uint32_t kOtherNode = 9;
+// A host-added group at the top of the id range that still names a group cache.
+constexpr std::uint32_t kHighGroupId = 4096;
+
+using IdSet = std::set<std::uint32_t>;
+
+// One participant on its own conference, started in meeting type 3 with the groups 7 and 4096
+// added, and answered until it is enrolled with its caches initialised.
+struct Participant {
+    // refuseUserInfoSet: the service refuses the first cache set, the user-info cache's.
+    explicit Participant(bool refuseUserInfoSet = false) {
+        client = conference.CreateClient(loop, kMyNode);
+        if (refuseUserInfoSet) client->ConfirmNextWith(ArmConfirmation::ApeCacheActionConfirmEx, 7);
+        spy = std::make_unique<SpyArmClient>(client);
+        _tagChatData data{};
+        data.pArmClient = spy.get();
+        data.wConferenceID = conference.ConferenceId();
+        data.dwSessionID = kSessionId;
+        data.lpszUserName = "Alice";
+        data.dwNodeID = kMyNode;
+        data.lMeetingType = 3;
+        engine.Initialize(data);
+        for (std::uint32_t id : {GROUP_HOST_PRESENTER_PANELISTS, kHighGroupId}) {
+            _tagChatGroupInfo info{};
+            info.dwIndex = 100;
+            info.dwGroupType = 1;
+            info.dwGroupId = id;
+            info.cszGroupName = "Added";
+            engine.AddGroup(&info, 0);
+        }
+        loop.RunUntilIdle();
+    }
+
+    // The ids of the groups 1, 2, 3, 4, 7, 8 and 15 that are subscribed now.
+    IdSet Subscribed() {
+        IdSet ids;
+        for (std::uint32_t id : {1u, 2u, 3u, 4u, 7u, 8u, 15u}) {
+            int subscribed = 0, requestType = 0, cacheSet = 0;
+            EXPECT_TRUE(engine.GetGroupCacheStatus(id, subscribed, requestType, cacheSet)) << id;
+            if (subscribed) ids.insert(id);
+        }
+        return ids;
+    }
+
+    VirtualRunLoop loop;
+    ScopedCurrentRunLoop current{&loop};
+    InProcessConference conference;
+    InProcessArmClient* client = nullptr;
+    std::unique_ptr<SpyArmClient> spy;
+    CChatClient engine;
+};
+
+class CachesTest : public ::testing::Test {
+protected:
+    void SetUp() override { RecordingWindow::Install(); }
+    void TearDown() override { RecordingWindow::Uninstall(); }
+};
+
+TEST_F(CachesTest, EachRoleSubscribesTheCachesItMayRead) {
+    Participant p;
+    ASSERT_EQ(p.engine.State(), kStateEnrolled);
+    // The first participant, an attendee, initialised the caches and reads everyone's and
+    // the attendees' caches.
+    EXPECT_EQ(p.Subscribed(), (IdSet{15, 8}));
+
+    struct RoleCase {
+        const char* role;
+        std::uint32_t hostId;
+        std::uint32_t presenterId;
+        std::uint32_t rosters;
+        IdSet subscribed;
+    };
+    // One engine walks through the roles, so each row also checks that what the previous
+    // role read is given up.
+    const RoleCase cases[] = {
+        {"host", kMyNode, kOtherNode, ROLE_HOST | ROLE_PANELIST, {15, 1, 4, 3, 7}},
+        {"presenter", kOtherNode, kMyNode, ROLE_PRESENTER | ROLE_PANELIST, {15, 2, 4, 3, 7}},
+        {"host and presenter",
+         kMyNode,
+         kMyNode,
+         ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST,
+         {15, 1, 2, 3, 4, 7}},
+        {"panelist", kOtherNode, kOtherNode, ROLE_PANELIST, {15, 4, 7}},
+        {"attendee", kOtherNode, kOtherNode, 0, {15, 8}},
+        {"attendee while nobody holds a role", 0, 0, 0, {15, 8}},
+    };
+    for (const RoleCase& c : cases) {
+        SCOPED_TRACE(c.role);
+        p.engine.OnHostChanged(c.hostId);
+        p.engine.OnPresenterChanged(c.presenterId);
+        p.engine.SetRosters(c.rosters, 1);
+        p.engine.SubscribeAllGroupCaches();
+        EXPECT_EQ(p.Subscribed(), c.subscribed);
+    }
+}
+
+TEST_F(CachesTest, ARoleChangeMovesTheSubscriptionsFromTheOldRoleToTheNew) {
+    Participant p;
+    ASSERT_EQ(p.Subscribed(), (IdSet{15, 8}));
+    struct ChangeCase {
+        const char* change;
+        bool hostChange;  // else the presenter changes
+        std::uint32_t newHolder;
+        IdSet subscribed;
+    };
+    const ChangeCase cases[] = {
+        // Becoming host: the attendees' cache goes, host's and host-and-presenter's come.
+        {"attendee becomes host", true, kMyNode, {15, 1, 3}},
+        // Host-and-presenter was taken on becoming host, so only the presenter's is added.
+        {"host also becomes presenter", false, kMyNode, {15, 1, 2, 3}},
+        // Still presenter: host-and-presenter stays.
+        {"host role moves away", true, kOtherNode, {15, 2, 3}},
+        // Host-and-presenter goes only when both roles are lost at once.
+        {"presenter role moves away", false, kOtherNode, {15, 3, 8}},
+        {"presenter again", false, kMyNode, {15, 2, 3}},
+        {"host again", true, kMyNode, {15, 1, 2, 3}},
+    };
+    for (const ChangeCase& c : cases) {
+        SCOPED_TRACE(c.change);
+        if (c.hostChange) {
+            p.engine.OnHostChanged(c.newHolder);
+        } else {
+            p.engine.OnPresenterChanged(c.newHolder);
+        }
+        p.engine.ReSubscribeGroupCaches();
+        EXPECT_EQ(p.Subscribed(), c.subscribed);
+    }
+}
+
+TEST_F(CachesTest, ARequestIsSentOnlyWhenItWouldChangeTheSubscription) {
+    Participant p;
+    struct RequestCase {
+        const char* request;
+        std::uint32_t groupId;
+        bool subscribe;  // else unsubscribe
+        tagCacheRequestType type;
+        int result;
+        int subscribedAfter;
+        int requestTypeAfter;
+    };
+    const RequestCase cases[] = {
+        {"subscribed with the same type", GROUP_EVERYONE, true, CACHE_REQUEST_SUBSCRIBE, 0, 1,
+         CACHE_REQUEST_SUBSCRIBE},
+        {"subscribed, another type", GROUP_EVERYONE, true, CACHE_REQUEST_RETRIEVE, 1, 1,
+         CACHE_REQUEST_RETRIEVE},
+        {"unsubscribe", GROUP_EVERYONE, false, CACHE_REQUEST_UNSUBSCRIBE, 1, 0,
+         CACHE_REQUEST_UNSUBSCRIBE},
+        {"unsubscribe again", GROUP_EVERYONE, false, CACHE_REQUEST_UNSUBSCRIBE, 0, 0,
+         CACHE_REQUEST_UNSUBSCRIBE},
+        {"subscribe after unsubscribing", GROUP_EVERYONE, true, CACHE_REQUEST_SUBSCRIBE, 1, 1,
+         CACHE_REQUEST_SUBSCRIBE},
+        {"never subscribed, unsubscribe", GROUP_HOST, false, CACHE_REQUEST_UNSUBSCRIBE, 0, 0, 0},
+    };
+    for (const RequestCase& c : cases) {
+        SCOPED_TRACE(c.request);
+        const std::size_t before = p.spy->Count("ApeRequestSharedDataEx");
+        const int result = c.subscribe ? p.engine.SubscribeGroupCache(c.groupId, c.type)
+                                       : p.engine.UnSubscribeGroupCache(c.groupId);
+        EXPECT_EQ(result, c.result);
+        EXPECT_EQ(p.spy->Count("ApeRequestSharedDataEx") - before,
+                  static_cast<std::size_t>(c.result));
+        int subscribed = 0, requestType = 0, cacheSet = 0;
+        ASSERT_TRUE(p.engine.GetGroupCacheStatus(c.groupId, subscribed, requestType, cacheSet));
+        EXPECT_EQ(subscribed, c.subscribedAfter);
+        EXPECT_EQ(requestType, c.requestTypeAfter);
+    }
+    // A group without a cache (a separator, an unknown id) is never asked for.
+    const std::size_t before = p.spy->Count("ApeRequestSharedDataEx");
+    EXPECT_EQ(p.engine.SubscribeGroupCache(0, CACHE_REQUEST_SUBSCRIBE), 0);
+    EXPECT_EQ(p.engine.SubscribeGroupCache(99, CACHE_REQUEST_SUBSCRIBE), 0);
+    EXPECT_EQ(p.spy->Count("ApeRequestSharedDataEx"), before);
+}
+
+TEST_F(CachesTest, ARefusedRequestLeavesTheGroupAsItWasForALaterRetry) {
+    Participant p;
+    p.client->FailNext(ArmOperation::ApeRequestSharedDataEx, 5);
+    TraceCapture capture;
+    EXPECT_EQ(p.engine.UnSubscribeGroupCache(GROUP_EVERYONE), 1);
+    EXPECT_TRUE(capture.Has(TraceLevel::Warn,
+                            "CChatClient::UnSubscribeGroupCache ApeRequestSharedDataEx return !0"));
+    EXPECT_EQ(p.Subscribed(), (IdSet{15, 8}));
+    EXPECT_EQ(p.engine.UnSubscribeGroupCache(GROUP_EVERYONE), 1);
+    EXPECT_EQ(p.Subscribed(), (IdSet{8}));
+}
+
+TEST_F(CachesTest, CachesNeverMarkedSetAreNeverSubscribed) {
+    // The user-info cache's initialisation is refused, so the status cache is never marked
+    // and no group cache is known to be set.
+    Participant p(true);
+    ASSERT_EQ(p.engine.State(), kStateEnrolled);
+    TraceCapture capture;
+    p.spy->ClearCalls();
+    p.engine.OnHostChanged(kMyNode);
+    EXPECT_EQ(p.engine.SubscribeGroupCache(GROUP_EVERYONE, CACHE_REQUEST_SUBSCRIBE), 0);
+    p.engine.SubscribeAllGroupCaches();
+    p.engine.ReSubscribeGroupCaches();
+    EXPECT_EQ(p.spy->Count("ApeRequestSharedDataEx"), 0u);
+    EXPECT_TRUE(capture.Has(
+        TraceLevel::Warn, "CChatClient::SubscribeGroupCache , dwGroupID=15, dwGroupCacheHandle = " +
+                              std::to_string(p.engine.GetCacheHandleFormGroupId(15)) +
+                              ", bSubscribed = 0, bCacheSet = 0"));
+    EXPECT_EQ(p.Subscribed(), IdSet{});
+}
+
+TEST_F(CachesTest, CacheActionConfirmationsDriveTheNextStep) {
+    enum Entity { kUserInfo, kStatus, kGroupCache, kNoEntity };
+    struct ConfirmCase {
+        const char* confirmation;
+        Entity entity;
+        tagCacheAction action;
+        short result;
+        bool zeroApe;
+        bool recovering;
+        std::size_t writes;  // cache actions sent in answer
+        IdSet subscribed;    // the local participant became host just before
+        bool resubscribed;
+    };
+    const ConfirmCase cases[] = {
+        {"user info set: mark status, own info, subscribe by role",
+         kUserInfo,
+         CACHE_SET,
+         0,
+         false,
+         false,
+         2,
+         {15, 1, 3, 4, 7},
+         true},
+        {"user info set while recovering: everyone's cache only",
+         kUserInfo,
+         CACHE_SET,
+         0,
+         false,
+         true,
+         2,
+         {15, 8},
+         false},
+        {"status set: subscribe by role",
+         kStatus,
+         CACHE_SET,
+         0,
+         false,
+         false,
+         0,
+         {15, 1, 3, 4, 7},
+         false},
+        {"status set while recovering: everyone's cache only",
+         kStatus,
+         CACHE_SET,
+         0,
+         false,
+         true,
+         0,
+         {15, 8},
+         false},
+        {"an append", kUserInfo, CACHE_APPEND, 0, false, false, 0, {15, 8}, false},
+        {"a refused set", kUserInfo, CACHE_SET, 3, false, false, 0, {15, 8}, false},
+        {"no ape handle", kUserInfo, CACHE_SET, 0, true, false, 0, {15, 8}, false},
+        {"no entity", kNoEntity, CACHE_SET, 0, false, false, 0, {15, 8}, false},
+        {"a group cache's set", kGroupCache, CACHE_SET, 0, false, false, 0, {15, 8}, false},
+    };
+    for (const ConfirmCase& c : cases) {
+        SCOPED_TRACE(c.confirmation);
+        Participant p;
+        if (c.recovering) p.engine.RecoveryMgr()->InitParameters(&p.engine, 0x400 | 0x200000);
+        // Host now, but not yet subscribed as one.
+        p.engine.OnHostChanged(kMyNode);
+        p.engine.SetRosters(ROLE_HOST | ROLE_PANELIST, 1);
+        ASSERT_EQ(p.Subscribed(), (IdSet{15, 8}));
+
+        std::uint32_t entity = p.engine.GetCacheHandleFormGroupId(GROUP_HOST);
+        if (c.entity == kUserInfo) entity = p.engine.UserInfoCacheHandle().handle_value;
+        if (c.entity == kStatus) entity = p.engine.ChatStatusCacheHandle().handle_value;
+        if (c.entity == kNoEntity) entity = 0;
+        TraceCapture capture;
+        p.spy->ClearCalls();
+        p.engine.ApeCacheActionConfirmEx(c.zeroApe ? 0 : p.client->ApeHandle(), entity, c.action, 1,
+                                         1, c.result);
+        EXPECT_EQ(p.spy->Count("ApeSharedDataActionEx"), c.writes);
+        EXPECT_EQ(p.Subscribed(), c.subscribed);
+        EXPECT_EQ(capture.Has("Enter CChatClient::ReSubscribeGroupCaches"), c.resubscribed);
+    }
+}
+
+TEST_F(CachesTest, HandlesAndGroupIdsMapBothWays) {
+    Participant p;
+    const std::string prefix = std::to_string(p.engine.SessionValue());
+    for (std::uint32_t id : {1u, 15u, 7u, kHighGroupId}) {
+        SCOPED_TRACE(id);
+        const std::uint32_t handle = p.engine.GetCacheHandleFormGroupId(id);
+        ASSERT_NE(handle, 0u);
+        EXPECT_EQ(p.engine.GetGroupIdFormCacheHandle(handle), id);
+        const std::string name = prefix + "_chat_cache_" + std::to_string(id);
+        EXPECT_EQ(p.engine.GetGroupIdFormCacheName(name.c_str()), id);
+    }
+    // This lookup never answers for 4096, even though that group has a cache.
+    EXPECT_EQ(p.engine.GetCacheHandleFromGroupId(kHighGroupId), 0u);
+    EXPECT_EQ(p.engine.GetCacheHandleFromGroupId(15), p.engine.GetCacheHandleFormGroupId(15));
+    EXPECT_EQ(p.engine.GetGroupIdFormCacheHandle(0), 0u);
+    EXPECT_EQ(p.engine.GetGroupNameFromGroupCacheHandle(0), nullptr);
+}
+
+TEST(CacheNames, GroupIdIsTheNumberAfterTheLastUnderscore) {
+    CChatClient engine;
+    const struct {
+        const char* name;
+        std::uint32_t groupId;
+    } cases[] = {
+        {"123_chat_cache_15", 15},
+        {"123_Chat_User_Info", 0},
+        {"123_chat_status", 0},
+        {"123_chat_cache_4096", 4096},
+        {"123_chat_cache_4097", 0},
+        {"switch_cache_5000", 0},
+        {"switch_cache_12", 12},
+        {"x_00000015", 15},
+        {"x_000000159", 15},  // only eight characters count
+        {"123_chat_cache_", 0},
+        {"nounderscore15", 0},
+        {nullptr, 0},
+    };
+    for (const auto& c : cases)
+        EXPECT_EQ(engine.GetGroupIdFormCacheName(c.name), c.groupId) << (c.name ? c.name : "null");
+}
+
+}  // namespace
