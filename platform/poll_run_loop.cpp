@@ -1,14 +1,21 @@
 #include "platform/poll_run_loop.h"
 
 #include <algorithm>
+#include <chrono>
 #include <thread>
 
+PollRunLoop::Ticks PollRunLoop::Now() {
+    return std::chrono::duration_cast<std::chrono::nanoseconds>(
+               std::chrono::steady_clock::now().time_since_epoch())
+        .count();
+}
+
 void PollRunLoop::Run() {
-    RunUntil(Clock::time_point::max());
+    RunUntil(LoopQueue::kEndOfTime);
 }
 
 bool PollRunLoop::RunFor(double seconds) {
-    return RunUntil(Clock::now() + std::chrono::nanoseconds(DelayToNanoseconds(seconds)));
+    return RunUntil(LoopQueue::Later(Now(), DelayToNanoseconds(seconds)));
 }
 
 void PollRunLoop::Quit() {
@@ -16,53 +23,46 @@ void PollRunLoop::Quit() {
 }
 
 void PollRunLoop::Post(Task task) {
-    m_posted.push_back(std::move(task));
+    m_queue.Post(std::move(task));
 }
 
 RunLoop::TimerId PollRunLoop::AddTimer(double firstDelay, double interval, Task task) {
-    const TimerId id = m_nextId++;
-    const Clock::time_point due =
-        Clock::now() + std::chrono::nanoseconds(DelayToNanoseconds(firstDelay));
-    const Clock::duration every = std::chrono::nanoseconds(DelayToNanoseconds(interval));
-    m_timers.emplace(id, Timer{due, every, std::move(task)});
-    m_schedule.emplace(due, id);
-    return id;
+    return m_queue.AddTimer(LoopQueue::Later(Now(), DelayToNanoseconds(firstDelay)),
+                            DelayToNanoseconds(interval), std::move(task));
 }
 
 void PollRunLoop::CancelTimer(TimerId id) {
-    const auto it = m_timers.find(id);
-    if (it == m_timers.end()) return;
-    m_schedule.erase({it->second.due, id});  // absent while the timer's own firing runs
-    m_timers.erase(it);
+    m_queue.CancelTimer(id);
 }
 
 std::size_t PollRunLoop::RunUntilIdle() {
     ScopedCurrentRunLoop current(this);
-    const Clock::time_point now = Clock::now();
+    const Ticks now = Now();
     std::size_t ran = 0;
-    while (RunOnePosted() || FireOneDueTimer(now))
+    while (m_queue.RunOnePosted() || FireOneDueTimer(now))
         ++ran;
     return ran;
 }
 
-bool PollRunLoop::RunUntil(Clock::time_point deadline) {
+bool PollRunLoop::RunUntil(Ticks deadline) {
     ScopedCurrentRunLoop current(this);
     const bool outerQuit = m_quit;
     m_quit = false;
     ++m_runDepth;
     for (;;) {
-        const Clock::time_point now = Clock::now();
+        const Ticks now = Now();
         // Only the work queued before this pass: a task that keeps posting itself must not
         // starve the timers or Quit.
-        for (std::size_t queued = m_posted.size(); queued > 0 && !m_quit; --queued) {
-            RunOnePosted();
+        for (std::size_t queued = m_queue.PostedCount(); queued > 0 && !m_quit; --queued) {
+            m_queue.RunOnePosted();
         }
         while (!m_quit && FireOneDueTimer(now)) {
         }
         if (m_quit || now >= deadline) break;
-        if (!m_posted.empty()) continue;
-        if (m_schedule.empty()) break;  // nothing left that could run, or call Quit
-        std::this_thread::sleep_until(std::min(m_schedule.begin()->first, deadline));
+        if (m_queue.PostedCount() > 0) continue;
+        if (!m_queue.HasTimers()) break;  // nothing left that could run, or call Quit
+        const Ticks wake = std::min(m_queue.EarliestDue(), deadline);
+        std::this_thread::sleep_for(std::chrono::nanoseconds(wake - Now()));
     }
     const bool quit = m_quit;
     --m_runDepth;
@@ -70,39 +70,12 @@ bool PollRunLoop::RunUntil(Clock::time_point deadline) {
     return quit;
 }
 
-bool PollRunLoop::RunOnePosted() {
-    if (m_posted.empty()) return false;
-    const Task task = std::move(m_posted.front());
-    m_posted.pop_front();
-    task();
-    return true;
-}
-
-bool PollRunLoop::FireOneDueTimer(Clock::time_point now) {
-    if (m_schedule.empty() || m_schedule.begin()->first > now) return false;
-    const auto [due, id] = *m_schedule.begin();
-    m_schedule.erase(m_schedule.begin());
-    Timer& timer = m_timers.at(id);
-
-    if (timer.interval == Clock::duration::zero()) {
-        // Gone before its task runs, so cancelling itself inside is a harmless no-op.
-        const Task task = std::move(timer.task);
-        m_timers.erase(id);
-        task();
-        return true;
-    }
-    // The task stays out of the table while it runs: it may cancel its own timer.
-    Task task = std::move(timer.task);
-    task();
-    const auto it = m_timers.find(id);
-    if (it == m_timers.end()) return true;  // cancelled inside
-    Timer& kept = it->second;
+bool PollRunLoop::FireOneDueTimer(Ticks now) {
     // A loop that was held up fires a late timer once and drops the firings it missed,
     // keeping the timer's phase.
-    Clock::time_point next = due + kept.interval;
-    if (next <= now) next += ((now - next) / kept.interval + 1) * kept.interval;
-    kept.task = std::move(task);
-    kept.due = next;
-    m_schedule.emplace(next, id);
-    return true;
+    return m_queue.FireOneDueTimer(now, [now](TimerId, Ticks due, Ticks interval, std::size_t) {
+        Ticks next = LoopQueue::Later(due, interval);
+        if (next <= now) next = LoopQueue::Later(next, ((now - next) / interval + 1) * interval);
+        return next;
+    });
 }

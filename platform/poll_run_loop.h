@@ -2,13 +2,9 @@
 // A window host runs its toolkit's existing event loop behind the same operations instead.
 #pragma once
 
-#include <chrono>
 #include <cstddef>
-#include <deque>
-#include <map>
-#include <set>
-#include <utility>
 
+#include "platform/loop_queue.h"
 #include "platform/run_loop.h"
 
 class PollRunLoop final : public RunLoop {
@@ -38,27 +34,15 @@ public:
     void CancelTimer(TimerId id) override;
 
 private:
-    using Clock = std::chrono::steady_clock;
+    using Ticks = LoopQueue::Ticks;  // nanoseconds of the monotonic clock
 
-    struct Timer {
-        Clock::time_point due;
-        Clock::duration interval;  // zero: fires once
-        Task task;                 // empty while its own firing runs
-    };
-
+    static Ticks Now();
     // Runs until Quit() or the deadline; true when Quit() ended it.
-    bool RunUntil(Clock::time_point deadline);
-    // Runs the oldest posted task; false when none is queued.
-    bool RunOnePosted();
+    bool RunUntil(Ticks deadline);
     // Fires the earliest timer due at now; false when none is due.
-    bool FireOneDueTimer(Clock::time_point now);
+    bool FireOneDueTimer(Ticks now);
 
-    // Posted tasks in order; timers by id (ids grow, so id order is the order added) and the
-    // timers waiting to fire ordered by (due, id).
-    std::deque<Task> m_posted;
-    std::map<TimerId, Timer> m_timers;
-    std::set<std::pair<Clock::time_point, TimerId>> m_schedule;
-    TimerId m_nextId = 1;
+    LoopQueue m_queue;
 
     // Nesting of Run and RunFor (a modal dialog runs one inside a task), and whether the
     // innermost was asked to return.

@@ -3,12 +3,8 @@
 #pragma once
 
 #include <cstddef>
-#include <cstdint>
-#include <deque>
-#include <map>
-#include <set>
-#include <utility>
 
+#include "platform/loop_queue.h"
 #include "platform/run_loop.h"
 
 // Most firings of one repeating timer within one AdvanceBy. A timer that would fire more
@@ -35,38 +31,21 @@ public:
     void AdvanceBy(double seconds);
 
     // Posted tasks not yet run.
-    std::size_t PendingTasks() const { return m_posted.size(); }
+    std::size_t PendingTasks() const { return m_queue.PostedCount(); }
 
     void Post(Task task) override;
     TimerId AddTimer(double firstDelay, double interval, Task task) override;
     void CancelTimer(TimerId id) override;
 
 private:
-    using Ticks = std::int64_t;  // virtual nanoseconds
+    using Ticks = LoopQueue::Ticks;  // virtual nanoseconds
 
-    struct Timer {
-        Ticks due;
-        Ticks interval;              // 0: fires once
-        Task task;                   // empty while its own firing runs
-        std::size_t firedInAdvance;  // firings within the current AdvanceBy
-    };
-
-    // Runs the oldest posted task; false when none is queued.
-    bool RunOnePosted();
-    // Fires the earliest timer due at m_now; false when none is due.
-    bool FireOneDueTimer();
-    // The instant of the next firing after one at due, or -1 when the timer is done.
-    Ticks NextDue(TimerId id, Timer& timer, Ticks due) const;
+    // The instant of a repeating timer's next firing after one at due, or -1 when the
+    // timer is done.
+    Ticks NextDue(TimerId id, Ticks due, Ticks interval, std::size_t fired) const;
 
     // The clock, and the instant the running AdvanceBy moves it to.
     Ticks m_now = 0;
     Ticks m_advanceTarget = 0;
-
-    // Posted tasks in order; timers by id (ids grow, so id order is the order added) and
-    // the timers waiting to fire ordered by (due, id). A timer whose firing runs is in
-    // m_timers only.
-    std::deque<Task> m_posted;
-    std::map<TimerId, Timer> m_timers;
-    std::set<std::pair<Ticks, TimerId>> m_schedule;
-    TimerId m_nextId = 1;
+    LoopQueue m_queue;
 };
