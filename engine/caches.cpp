@@ -73,14 +73,16 @@ int CChatClient::AllocAllNeededCacheHandle() {
     std::size_t n = 0;
     for (const CUsersGroup* group : cacheGroups)
         SetHandleName(entries[n++], prefix + "_chat_cache_" + std::to_string(group->GetGroupId()));
-    SetHandleName(m_UserInfoCacheHandle, prefix + "_Chat_User_Info");
-    entries[n++] = m_UserInfoCacheHandle;
-    if (customerId != 0) {
-        SetHandleName(m_CustomerCacheHandle, "switch_cache_" + std::to_string(customerId));
-        entries[n++] = m_CustomerCacheHandle;
-    }
-    SetHandleName(m_ChatStatusCacheHandle, prefix + "_chat_status");
-    entries[n++] = m_ChatStatusCacheHandle;
+    // The engine keeps the bookkeeping names to recognise their handles in the answer; the
+    // request carries the names only, never a handle known from an earlier answer.
+    const auto addBookkeeping = [&entries, &n](NameHandle& field, const std::string& name) {
+        SetHandleName(field, name);
+        SetHandleName(entries[n++], name);
+    };
+    addBookkeeping(m_UserInfoCacheHandle, prefix + "_Chat_User_Info");
+    if (customerId != 0)
+        addBookkeeping(m_CustomerCacheHandle, "switch_cache_" + std::to_string(customerId));
+    addBookkeeping(m_ChatStatusCacheHandle, prefix + "_chat_status");
 
     m_pArmClient->AllocNameHandle(m_dwApeHandle, static_cast<std::uint32_t>(entries.size()),
                                   entries.data(), this);
@@ -155,15 +157,25 @@ void CChatClient::OnChatStatusCacheAnswer(std::uint32_t memHandle, short result,
 
 void CChatClient::SetAllCaches() {
     CFuncTrace trace("CChatClient::SetAllCaches");
-    if (!m_pArmClient) return;
-    WriteToCache(m_UserInfoCacheHandle.handle_value, CACHE_SET, kEmptyCacheBytes, kCacheFlags);
-    for (std::int32_t i = 0; i < m_GroupList.GetGroupsCount(); ++i) {
-        const CUsersGroup* group = m_GroupList.GetGroupByIndex(i);
-        if (IsCacheGroup(group) && group->GetCacheHandle() != 0)
-            WriteToCache(group->GetCacheHandle(), CACHE_SET, kEmptyCacheBytes, kCacheFlags);
+    // One block of two zero bytes serves every cache, and is freed only after the customer
+    // cache (which takes a block of its own) is set too.
+    std::uint32_t size = static_cast<std::uint32_t>(kEmptyCacheBytes.size());
+    const std::uint32_t mem = GetATMemHandle(size, kEmptyCacheBytes.data());
+    if (mem != 0) {
+        const auto set = [this, mem](std::uint32_t cacheHandle) {
+            if (cacheHandle == 0) return;
+            m_pArmClient->ApeSharedDataActionEx(m_dwApeHandle, cacheHandle, 0, 0, CACHE_SET,
+                                                kCacheFlags, mem, 0, 1);
+        };
+        set(m_UserInfoCacheHandle.handle_value);
+        for (std::int32_t i = 0; i < m_GroupList.GetGroupsCount(); ++i) {
+            const CUsersGroup* group = m_GroupList.GetGroupByIndex(i);
+            if (IsCacheGroup(group)) set(group->GetCacheHandle());
+        }
     }
     if (m_pRecoveryMgr && m_pRecoveryMgr->GetCustomerId() != 0) SetCustomerCache();
     m_bInitCaches = 0;
+    if (mem != 0) m_pArmClient->FreeMemHandle(mem);
 }
 
 void CChatClient::SetChatStatusCache() {

@@ -3,7 +3,9 @@
 // confirmations set in motion, and the lookups between cache names, handles and group ids.
 #include <gtest/gtest.h>
 
+#include <cstring>
 #include <memory>
+#include <optional>
 #include <set>
 #include <string>
 #include <vector>
@@ -26,6 +28,91 @@ constexpr std::uint32_t kHighGroupId = 4096;
 
 using IdSet = std::set<std::uint32_t>;
 
+// Passes every request on to a service object, noting in order the calls that write a cache
+// (memory handles and cache actions) and copying each AllocNameHandle's entries as they were
+// handed over.
+class ServiceLog final : public IArmClient {
+public:
+    explicit ServiceLog(IArmClient* inner) : m_pInner(inner) {}
+    std::vector<std::string> writes;
+    std::vector<std::vector<NameHandle>> requests;
+
+    int Release() override { return m_pInner->Release(); }
+    int Connect(IArmNodeControllerSink* sink, const char* name, std::uint32_t a, std::uint32_t b,
+                std::uint32_t c) override {
+        return m_pInner->Connect(sink, name, a, b, c);
+    }
+    int Destroy(IArmNodeControllerSink* sink, int flag) override {
+        return m_pInner->Destroy(sink, flag);
+    }
+    int SetSendOption(int option, const ARMSendOption* value) override {
+        return m_pInner->SetSendOption(option, value);
+    }
+    int ConferenceJoin(std::uint32_t r, std::uint16_t id, IArmConferenceSink* sink,
+                       int mode) override {
+        return m_pInner->ConferenceJoin(r, id, sink, mode);
+    }
+    int ConferenceLeave(std::uint32_t r, std::uint16_t id, IArmConferenceSink* sink) override {
+        return m_pInner->ConferenceLeave(r, id, sink);
+    }
+    int ApeAttach(IArmApeSink* sink, std::uint32_t r, std::uint16_t id,
+                  std::uint32_t* ape) override {
+        return m_pInner->ApeAttach(sink, r, id, ape);
+    }
+    int ApeEnroll(std::uint32_t ape, int enroll, std::uint32_t session, std::uint32_t r, int count,
+                  ARMSessionResource* resources, const void* info, std::uint32_t length,
+                  int mode) override {
+        return m_pInner->ApeEnroll(ape, enroll, session, r, count, resources, info, length, mode);
+    }
+    int ApeSendData(std::uint32_t ape, std::uint32_t dest, int priority, const void* data,
+                    std::uint32_t length, int reliable, int segment) override {
+        return m_pInner->ApeSendData(ape, dest, priority, data, length, reliable, segment);
+    }
+    int ApeDetach(std::uint32_t ape) override { return m_pInner->ApeDetach(ape); }
+    int RegisterSharedDataSink(std::uint32_t ape, IArmSharedDataSink* sink) override {
+        return m_pInner->RegisterSharedDataSink(ape, sink);
+    }
+    int AllocNameHandle(std::uint32_t ape, std::uint32_t count, NameHandle* entries,
+                        IArmAllocHandleSink* sink) override {
+        requests.emplace_back(entries, entries + count);
+        return m_pInner->AllocNameHandle(ape, count, entries, sink);
+    }
+    int ApeSharedDataActionEx(std::uint32_t ape, std::uint32_t cache, std::uint32_t r1,
+                              std::uint32_t r2, tagCacheAction action, std::uint32_t flags,
+                              std::uint32_t mem, std::uint32_t r3, int confirm) override {
+        writes.push_back("ApeSharedDataActionEx");
+        return m_pInner->ApeSharedDataActionEx(ape, cache, r1, r2, action, flags, mem, r3, confirm);
+    }
+    int ApeRequestSharedDataEx(std::uint32_t ape, std::uint32_t cache, std::uint32_t r,
+                               tagCacheRequestType type, std::uint32_t items,
+                               IArmSharedDataSink* sink) override {
+        return m_pInner->ApeRequestSharedDataEx(ape, cache, r, type, items, sink);
+    }
+    int AllocMemHandle(std::uint32_t size, std::uint32_t* handle) override {
+        writes.push_back("AllocMemHandle");
+        return m_pInner->AllocMemHandle(size, handle);
+    }
+    int FreeMemHandle(std::uint32_t handle) override {
+        writes.push_back("FreeMemHandle");
+        return m_pInner->FreeMemHandle(handle);
+    }
+    int GetMemHandleSize(std::uint32_t handle, std::uint32_t* size) override {
+        return m_pInner->GetMemHandleSize(handle, size);
+    }
+    int WriteMemHandle(std::uint32_t handle, std::uint32_t offset, const void* data,
+                       std::uint32_t* size) override {
+        writes.push_back("WriteMemHandle");
+        return m_pInner->WriteMemHandle(handle, offset, data, size);
+    }
+    int ReadMemHandle(std::uint32_t handle, std::uint32_t offset, void* buffer,
+                      std::uint32_t* size) override {
+        return m_pInner->ReadMemHandle(handle, offset, buffer, size);
+    }
+
+private:
+    IArmClient* m_pInner;
+};
+
 // One participant on its own conference, started in meeting type 3 with the groups 7 and 4096
 // added, and answered until it is enrolled with its caches initialised.
 struct Participant {
@@ -34,8 +121,9 @@ struct Participant {
         client = conference.CreateClient(loop, kMyNode);
         if (refuseUserInfoSet) client->ConfirmNextWith(ArmConfirmation::ApeCacheActionConfirmEx, 7);
         spy = std::make_unique<SpyArmClient>(client);
+        log = std::make_unique<ServiceLog>(spy.get());
         _tagChatData data{};
-        data.pArmClient = spy.get();
+        data.pArmClient = log.get();
         data.wConferenceID = conference.ConferenceId();
         data.dwSessionID = kSessionId;
         data.lpszUserName = "Alice";
@@ -69,6 +157,7 @@ struct Participant {
     InProcessConference conference;
     InProcessArmClient* client = nullptr;
     std::unique_ptr<SpyArmClient> spy;
+    std::unique_ptr<ServiceLog> log;
     CChatClient engine;
 };
 
@@ -300,6 +389,108 @@ TEST_F(CachesTest, CacheActionConfirmationsDriveTheNextStep) {
         EXPECT_EQ(p.spy->Count("ApeSharedDataActionEx"), c.writes);
         EXPECT_EQ(p.Subscribed(), c.subscribed);
         EXPECT_EQ(capture.Has("Enter CChatClient::ReSubscribeGroupCaches"), c.resubscribed);
+    }
+}
+
+TEST_F(CachesTest, InitialisingSetsEveryCacheFromOneSharedBlock) {
+    for (const std::uint32_t customerId : {0u, 5000u}) {
+        SCOPED_TRACE(customerId);
+        Participant p;
+        if (customerId != 0) {
+            // The customer cache's handle comes with a second request for the handles.
+            p.engine.RecoveryMgr()->SetCustomerId(customerId);
+            ASSERT_EQ(p.engine.AllocAllNeededCacheHandle(), 1);
+            p.loop.RunUntilIdle();
+            ASSERT_NE(p.engine.CustomerCacheHandle().handle_value, 0u);
+        }
+        std::size_t caches = 1;  // the user-info cache
+        for (std::uint32_t id : {1u, 2u, 3u, 4u, 7u, 8u, 15u, 16u, kHighGroupId})
+            if (p.engine.GetCacheHandleFormGroupId(id) != 0) ++caches;
+        const std::size_t blocks = p.client->MemHandleCount();
+        p.log->writes.clear();
+        p.engine.SetAllCaches();
+
+        std::vector<std::string> expected = {"AllocMemHandle", "WriteMemHandle"};
+        expected.insert(expected.end(), caches, "ApeSharedDataActionEx");
+        if (customerId != 0) {
+            // The customer cache is set from a block of its own, inside the shared one's life.
+            expected.insert(expected.end(), {"AllocMemHandle", "WriteMemHandle",
+                                             "ApeSharedDataActionEx", "FreeMemHandle"});
+        }
+        expected.push_back("FreeMemHandle");
+        EXPECT_EQ(p.log->writes, expected);
+        EXPECT_EQ(p.client->MemHandleCount(), blocks);
+    }
+}
+
+TEST_F(CachesTest, AHandleRequestCarriesNamesOnly) {
+    Participant p;
+    ASSERT_NE(p.engine.UserInfoCacheHandle().handle_value, 0u);
+    // Asked again, with the handles of the first answer known, the entries still go out
+    // zero-filled apart from their names.
+    ASSERT_EQ(p.engine.AllocAllNeededCacheHandle(), 1);
+    ASSERT_EQ(p.log->requests.size(), 2u);
+    const std::string prefix = std::to_string(p.engine.SessionValue());
+    const std::vector<NameHandle>& again = p.log->requests.back();
+    ASSERT_GE(again.size(), 2u);
+    EXPECT_STREQ(again[again.size() - 2].name, (prefix + "_Chat_User_Info").c_str());
+    EXPECT_STREQ(again.back().name, (prefix + "_chat_status").c_str());
+    for (const NameHandle& entry : again) {
+        SCOPED_TRACE(entry.name);
+        EXPECT_EQ(entry.handle_value, 0u);
+        const std::size_t length = strnlen(entry.name, sizeof entry.name);
+        for (std::size_t i = length; i < sizeof entry.name; ++i)
+            EXPECT_EQ(entry.name[i], '\0');
+    }
+}
+
+TEST_F(CachesTest, TheStatusCacheAnswerDecidesWhetherToInitialiseOrJoin) {
+    const std::vector<std::uint8_t> mark = {'1', '\0'};
+    struct AnswerCase {
+        const char* answer;
+        tagCacheAction action;
+        short result;
+        std::optional<std::vector<std::uint8_t>> data;
+        bool initialises;
+        bool joins;  // own user info written, subscriptions by role
+        bool warns;
+    };
+    const AnswerCase cases[] = {
+        {"the mark", CACHE_REPLY_LAST, 0, mark, false, true, false},
+        {"nothing stored", CACHE_REPLY_LAST, 0, std::nullopt, true, false, false},
+        {"an empty item", CACHE_REPLY_LAST, 0, std::vector<std::uint8_t>{}, true, false, false},
+        {"never set", CACHE_REPLY_LAST, kArmRetry, std::nullopt, true, false, true},
+        {"another error", CACHE_REPLY_LAST, 5, std::nullopt, false, false, false},
+        {"not the last answer", CACHE_REPLY_ITEM, 0, mark, false, false, false},
+        {"an append", CACHE_APPEND, kArmRetry, std::nullopt, false, false, false},
+    };
+    for (const AnswerCase& c : cases) {
+        SCOPED_TRACE(c.answer);
+        Participant p;
+        ArmCacheDelivery delivery;
+        delivery.entityId = p.engine.ChatStatusCacheHandle().handle_value;
+        delivery.action = c.action;
+        delivery.result = c.result;
+        TraceCapture capture;
+        p.spy->ClearCalls();
+        ASSERT_TRUE(p.client->InjectCacheDelivery(delivery, c.data));
+        p.loop.RunUntilIdle();
+        EXPECT_TRUE(capture.Has("CChatClient::SharedDataReceivedEx chat status cache ----/"));
+        EXPECT_EQ(capture.Has("Enter CChatClient::SetAllCaches"), c.initialises);
+        EXPECT_EQ(capture.Has("Enter CChatClient::SubscribeAllGroupCaches"),
+                  c.joins || c.initialises);
+        EXPECT_EQ(capture.Has("CChatClient::SetAllGroupCacheSetFlag()"), c.joins || c.initialises);
+        EXPECT_EQ(capture.Has(TraceLevel::Warn,
+                              "CChatClient::SharedDataReceivedEx:entity_id == "
+                              "m_ChatStatusCacheHandle.handle_value,result =19"),
+                  c.warns);
+        // Joining writes the own user info only; initialising sets every cache and more.
+        const std::size_t writes = p.spy->Count("ApeSharedDataActionEx");
+        if (c.joins) {
+            EXPECT_EQ(writes, 1u);
+        } else if (!c.initialises) {
+            EXPECT_EQ(writes, 0u);
+        }
     }
 }
 
