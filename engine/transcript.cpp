@@ -1,6 +1,7 @@
 // Transcript files: saving the transcript as a time-stamped text file (save, save as, save
 // into a folder), opening such files back into the transcript and the window, the modified
 // flag and the tick's watch over the saved file.
+#include <algorithm>
 #include <cstdint>
 #include <memory>
 #include <new>
@@ -75,6 +76,20 @@ bool ReadWholeFile(FileServices& files, const std::string& path, std::unique_ptr
     *bytes = std::move(buffer);
     *size = static_cast<std::size_t>(fileSize);
     return true;
+}
+
+// The name of the file a save writes before renaming it over name: hidden, marked as an
+// unfinished save, and no longer than the longest name a folder takes, which is also as long
+// as name may be. A long name lends only its beginning, cut at a character boundary.
+std::string SavingNameFor(const std::string& name) {
+    constexpr std::size_t kMaxNameBytes = 255;
+    const std::string prefix = ".";
+    const std::string suffix = ".saving";
+    std::size_t keep = std::min(name.size(), kMaxNameBytes - prefix.size() - suffix.size());
+    while (keep > 0 && keep < name.size() &&
+           (static_cast<unsigned char>(name[keep]) & 0xC0) == 0x80)
+        --keep;
+    return prefix + name.substr(0, keep) + suffix;
 }
 
 // Creates name in folder afresh and writes the whole transcript into it. kFileOk only when
@@ -184,7 +199,7 @@ bool CChatClient::WriteChatFileToFolder(const std::string& path) {
     const std::size_t slash = path.rfind('/');
     const std::size_t nameAt = slash == std::string::npos ? 0 : slash + 1;
     const std::string folder = path.substr(0, nameAt);
-    const std::string tempName = "." + path.substr(nameAt) + ".saving";
+    const std::string tempName = SavingNameFor(path.substr(nameAt));
     const std::string tempPath = folder + tempName;
 
     FileServices& files = CurrentFileServices();

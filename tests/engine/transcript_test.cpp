@@ -165,6 +165,27 @@ TEST_F(TranscriptTest, AFileThatCannotBeOpenedChangesNeitherTranscriptNorWindow)
     }
 }
 
+TEST_F(TranscriptTest, AnyNameAFolderTakesCanBeSavedTo) {
+    std::string accents;  // 2-byte characters, so the cut must not split one
+    while (accents.size() < 250)
+        accents += "\xC3\xA9";
+    const std::string names[] = {
+        "s.txt", std::string(247, 'n'),  // the longest that lends all of itself
+        std::string(251, 'n') + ".txt",  // the longest a folder takes
+        accents + ".txt",                // 254 bytes; a cut at 247 would split a character
+    };
+    LoadThree();
+    for (const std::string& name : names) {
+        SCOPED_TRACE(name.size());
+        warnings.clear();
+        engine.SetFileNeedSave(1);
+        SaveAs(dir.File(name));
+        EXPECT_EQ(FileBytes(dir.File(name)), kTwoEntries + kThird);
+        EXPECT_EQ(engine.FileNeedSave(), 0);
+        EXPECT_TRUE(warnings.empty());
+    }
+}
+
 TEST_F(TranscriptTest, AFailedSaveKeepsTheOldFileAndTheFlagAndWarns) {
     const std::pair<FileOp, const char*> cases[] = {
         {FileOp::Delete, ".saving"},  // a stale half-written file stays
