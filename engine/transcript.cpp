@@ -124,6 +124,7 @@ void CChatClient::SetFileNeedSave(int bNeedSave) {
 }
 
 bool CChatClient::IsChatHaveContent() {
+    CFuncTrace trace("CChatClient::IsChatHaveContent");
     return m_ChatContent.GetTimeCount() > 0;
 }
 

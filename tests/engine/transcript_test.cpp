@@ -94,7 +94,13 @@ protected:
 };
 
 TEST_F(TranscriptTest, OpeningShowsEveryEntryAndMarksOnlyATranscriptThatHadEntries) {
+    {
+        TraceCapture trace;
+        EXPECT_FALSE(engine.IsChatHaveContent());
+        EXPECT_TRUE(trace.Has("Enter CChatClient::IsChatHaveContent"));
+    }
     Load("a.txt", kTwoEntries);
+    EXPECT_TRUE(engine.IsChatHaveContent());
     EXPECT_EQ(Shown(),
               (std::vector<std::string>{"from Ann to All Participants:\r", "hello",
                                         "from Bo to Host (privately):\r", "see \xC3\xA9 you"}));
