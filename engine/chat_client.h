@@ -274,8 +274,9 @@ public:
 
 private:
     // Adds one enrolled participant, unless already known or the recorder, with the menu
-    // entry the rules give it (roster_changes.cpp).
-    void AddEnrolledUser(std::unique_ptr<UserItem> user, bool bOwn);
+    // entry the rules give it (roster_changes.cpp). bOwn: this is the local participant's
+    // record; bOwnArrived: that record came in this report, at this entry or before it.
+    void AddEnrolledUser(std::unique_ptr<UserItem> user, bool bOwn, bool bOwnArrived);
     // Under QM rules: titles the role entry the participant holds with the participant's name,
     // first creating the "Host" entry when another participant's host role has none.
     void TitleRoleEntryInQM(std::uint32_t nodeId, const std::string& name);

@@ -115,7 +115,7 @@ int CChatClient::ProcessAddEnrollInfo(std::uint32_t count, const ARMApeRoster* f
             CopyEnrollFields(extracted, *user, (m_dwFeatures & FEATURE_GROUP_SCHEME2) != 0);
             const bool own = user->dwUserID == m_dwMyUserID;
             if (own) ownArrived = true;
-            AddEnrolledUser(std::move(user), own);
+            AddEnrolledUser(std::move(user), own, ownArrived);
         });
 
     const bool beforeHost = IsBeforeHost();
@@ -129,7 +129,7 @@ int CChatClient::ProcessAddEnrollInfo(std::uint32_t count, const ARMApeRoster* f
     return 1;
 }
 
-void CChatClient::AddEnrolledUser(std::unique_ptr<UserItem> user, bool bOwn) {
+void CChatClient::AddEnrolledUser(std::unique_ptr<UserItem> user, bool bOwn, bool bOwnArrived) {
     if (IsUserExist(user.get())) return;
     const char* name = user->strName.GetData();
     if (name && strcasecmp(name, kRecorderName) == 0) return;
@@ -152,7 +152,9 @@ void CChatClient::AddEnrolledUser(std::unique_ptr<UserItem> user, bool bOwn) {
         }
     }
     if (!m_bQMMode) return;
-    if (bOwn && m_dwMyNodeID == m_dwHostID) {
+    // Once the host's own record is in, every participant added after it in the same report
+    // brings the host back to "Everyone".
+    if (bOwnArrived && m_dwMyNodeID == m_dwHostID) {
         const int everyone = GetIndexOfMenuByGroup(GROUP_EVERYONE);
         if (everyone != -1 && m_MenuStatus[everyone].bEnabled) SelectMenuItemByIndexInQM(everyone);
     }

@@ -148,6 +148,34 @@ TEST(ProcessAddEnrollInfo, QMHostEntryCarriesTheHostsName) {
     EXPECT_EQ(me.Titles(), Strings({"*Everyone"}));
 }
 
+TEST(ProcessAddEnrollInfo, QMHostReturnsToEveryoneForEachArrivalAfterItsOwnRecord) {
+    const ReportEntry own{kMyNode, kMyUser, EnrollBytes({kMyNode, "me", ROLE_HOST}), true};
+    const ReportEntry bob = EntryFor({201, "bob"});
+    struct Case {
+        const char* scenario;
+        std::vector<ReportEntry> report;
+        Strings commands;
+    };
+    const Case cases[] = {
+        {"own record alone", {own}, {"select+input 0"}},
+        {"an arrival after the own record",
+         {own, bob},
+         {"select+input 0", "insert -1 ---", "insert -1 bob", "select+input 0"}},
+        {"an arrival before the own record",
+         {bob, own},
+         {"insert -1 ---", "insert -1 bob", "select+input 0"}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.scenario);
+        MenuHarness h({1, false, 0, FEATURE_QM_MODE});
+        h.engine.OnHostChanged(kMyNode);
+        h.Commands();
+        Add(h, c.report);
+        EXPECT_EQ(h.Commands(), c.commands);
+        EXPECT_EQ(h.Titles()[0], "*Everyone");
+    }
+}
+
 namespace {
 
 // A German catalogue for the component in the binary layout gettext reads: a header of seven
