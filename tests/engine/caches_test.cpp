@@ -28,90 +28,16 @@ constexpr std::uint32_t kHighGroupId = 4096;
 
 using IdSet = std::set<std::uint32_t>;
 
-// Passes every request on to a service object, noting in order the calls that write a cache
-// (memory handles and cache actions) and copying each AllocNameHandle's entries as they were
-// handed over.
-class ServiceLog final : public IArmClient {
-public:
-    explicit ServiceLog(IArmClient* inner) : m_pInner(inner) {}
+// The calls among calls that write a cache: memory handles and cache actions.
+std::vector<std::string> Writes(const std::vector<std::string>& calls) {
     std::vector<std::string> writes;
-    std::vector<std::vector<NameHandle>> requests;
-
-    int Release() override { return m_pInner->Release(); }
-    int Connect(IArmNodeControllerSink* sink, const char* name, std::uint32_t a, std::uint32_t b,
-                std::uint32_t c) override {
-        return m_pInner->Connect(sink, name, a, b, c);
+    for (const std::string& call : calls) {
+        if (call == "AllocMemHandle" || call == "WriteMemHandle" || call == "FreeMemHandle" ||
+            call == "ApeSharedDataActionEx")
+            writes.push_back(call);
     }
-    int Destroy(IArmNodeControllerSink* sink, int flag) override {
-        return m_pInner->Destroy(sink, flag);
-    }
-    int SetSendOption(int option, const ARMSendOption* value) override {
-        return m_pInner->SetSendOption(option, value);
-    }
-    int ConferenceJoin(std::uint32_t r, std::uint16_t id, IArmConferenceSink* sink,
-                       int mode) override {
-        return m_pInner->ConferenceJoin(r, id, sink, mode);
-    }
-    int ConferenceLeave(std::uint32_t r, std::uint16_t id, IArmConferenceSink* sink) override {
-        return m_pInner->ConferenceLeave(r, id, sink);
-    }
-    int ApeAttach(IArmApeSink* sink, std::uint32_t r, std::uint16_t id,
-                  std::uint32_t* ape) override {
-        return m_pInner->ApeAttach(sink, r, id, ape);
-    }
-    int ApeEnroll(std::uint32_t ape, int enroll, std::uint32_t session, std::uint32_t r, int count,
-                  ARMSessionResource* resources, const void* info, std::uint32_t length,
-                  int mode) override {
-        return m_pInner->ApeEnroll(ape, enroll, session, r, count, resources, info, length, mode);
-    }
-    int ApeSendData(std::uint32_t ape, std::uint32_t dest, int priority, const void* data,
-                    std::uint32_t length, int reliable, int segment) override {
-        return m_pInner->ApeSendData(ape, dest, priority, data, length, reliable, segment);
-    }
-    int ApeDetach(std::uint32_t ape) override { return m_pInner->ApeDetach(ape); }
-    int RegisterSharedDataSink(std::uint32_t ape, IArmSharedDataSink* sink) override {
-        return m_pInner->RegisterSharedDataSink(ape, sink);
-    }
-    int AllocNameHandle(std::uint32_t ape, std::uint32_t count, NameHandle* entries,
-                        IArmAllocHandleSink* sink) override {
-        requests.emplace_back(entries, entries + count);
-        return m_pInner->AllocNameHandle(ape, count, entries, sink);
-    }
-    int ApeSharedDataActionEx(std::uint32_t ape, std::uint32_t cache, std::uint32_t r1,
-                              std::uint32_t r2, tagCacheAction action, std::uint32_t flags,
-                              std::uint32_t mem, std::uint32_t r3, int confirm) override {
-        writes.push_back("ApeSharedDataActionEx");
-        return m_pInner->ApeSharedDataActionEx(ape, cache, r1, r2, action, flags, mem, r3, confirm);
-    }
-    int ApeRequestSharedDataEx(std::uint32_t ape, std::uint32_t cache, std::uint32_t r,
-                               tagCacheRequestType type, std::uint32_t items,
-                               IArmSharedDataSink* sink) override {
-        return m_pInner->ApeRequestSharedDataEx(ape, cache, r, type, items, sink);
-    }
-    int AllocMemHandle(std::uint32_t size, std::uint32_t* handle) override {
-        writes.push_back("AllocMemHandle");
-        return m_pInner->AllocMemHandle(size, handle);
-    }
-    int FreeMemHandle(std::uint32_t handle) override {
-        writes.push_back("FreeMemHandle");
-        return m_pInner->FreeMemHandle(handle);
-    }
-    int GetMemHandleSize(std::uint32_t handle, std::uint32_t* size) override {
-        return m_pInner->GetMemHandleSize(handle, size);
-    }
-    int WriteMemHandle(std::uint32_t handle, std::uint32_t offset, const void* data,
-                       std::uint32_t* size) override {
-        writes.push_back("WriteMemHandle");
-        return m_pInner->WriteMemHandle(handle, offset, data, size);
-    }
-    int ReadMemHandle(std::uint32_t handle, std::uint32_t offset, void* buffer,
-                      std::uint32_t* size) override {
-        return m_pInner->ReadMemHandle(handle, offset, buffer, size);
-    }
-
-private:
-    IArmClient* m_pInner;
-};
+    return writes;
+}
 
 // One participant on its own conference, started in meeting type 3 with the groups 7 and 4096
 // added, and answered until it is enrolled with its caches initialised.
@@ -121,9 +47,8 @@ struct Participant {
         client = conference.CreateClient(loop, kMyNode);
         if (refuseUserInfoSet) client->ConfirmNextWith(ArmConfirmation::ApeCacheActionConfirmEx, 7);
         spy = std::make_unique<SpyArmClient>(client);
-        log = std::make_unique<ServiceLog>(spy.get());
         _tagChatData data{};
-        data.pArmClient = log.get();
+        data.pArmClient = spy.get();
         data.wConferenceID = conference.ConferenceId();
         data.dwSessionID = kSessionId;
         data.lpszUserName = "Alice";
@@ -157,7 +82,6 @@ struct Participant {
     InProcessConference conference;
     InProcessArmClient* client = nullptr;
     std::unique_ptr<SpyArmClient> spy;
-    std::unique_ptr<ServiceLog> log;
     CChatClient engine;
 };
 
@@ -407,7 +331,7 @@ TEST_F(CachesTest, InitialisingSetsEveryCacheFromOneSharedBlock) {
         for (std::uint32_t id : {1u, 2u, 3u, 4u, 7u, 8u, 15u, 16u, kHighGroupId})
             if (p.engine.GetCacheHandleFormGroupId(id) != 0) ++caches;
         const std::size_t blocks = p.client->MemHandleCount();
-        p.log->writes.clear();
+        p.spy->ClearCalls();
         p.engine.SetAllCaches();
 
         std::vector<std::string> expected = {"AllocMemHandle", "WriteMemHandle"};
@@ -418,7 +342,7 @@ TEST_F(CachesTest, InitialisingSetsEveryCacheFromOneSharedBlock) {
                                              "ApeSharedDataActionEx", "FreeMemHandle"});
         }
         expected.push_back("FreeMemHandle");
-        EXPECT_EQ(p.log->writes, expected);
+        EXPECT_EQ(Writes(p.spy->Calls()), expected);
         EXPECT_EQ(p.client->MemHandleCount(), blocks);
     }
 }
@@ -429,9 +353,9 @@ TEST_F(CachesTest, AHandleRequestCarriesNamesOnly) {
     // Asked again, with the handles of the first answer known, the entries still go out
     // zero-filled apart from their names.
     ASSERT_EQ(p.engine.AllocAllNeededCacheHandle(), 1);
-    ASSERT_EQ(p.log->requests.size(), 2u);
+    ASSERT_EQ(p.spy->HandleRequests().size(), 2u);
     const std::string prefix = std::to_string(p.engine.SessionValue());
-    const std::vector<NameHandle>& again = p.log->requests.back();
+    const std::vector<NameHandle>& again = p.spy->HandleRequests().back();
     ASSERT_GE(again.size(), 2u);
     EXPECT_STREQ(again[again.size() - 2].name, (prefix + "_Chat_User_Info").c_str());
     EXPECT_STREQ(again.back().name, (prefix + "_chat_status").c_str());

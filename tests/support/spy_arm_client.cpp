@@ -77,6 +77,7 @@ int SpyArmClient::RegisterSharedDataSink(std::uint32_t apeHandle, IArmSharedData
 int SpyArmClient::AllocNameHandle(std::uint32_t apeHandle, std::uint32_t count, NameHandle* entries,
                                   IArmAllocHandleSink* sink) {
     m_calls.push_back("AllocNameHandle");
+    m_handleRequests.emplace_back(entries, entries + count);
     m_handleNames.clear();
     for (std::uint32_t i = 0; i < count; ++i)
         m_handleNames.emplace_back(entries[i].name,
@@ -102,23 +103,28 @@ int SpyArmClient::ApeRequestSharedDataEx(std::uint32_t apeHandle, std::uint32_t 
 }
 
 int SpyArmClient::AllocMemHandle(std::uint32_t size, std::uint32_t* handle) {
+    m_calls.push_back("AllocMemHandle");
     return m_pInner->AllocMemHandle(size, handle);
 }
 
 int SpyArmClient::FreeMemHandle(std::uint32_t handle) {
+    m_calls.push_back("FreeMemHandle");
     return m_pInner->FreeMemHandle(handle);
 }
 
 int SpyArmClient::GetMemHandleSize(std::uint32_t handle, std::uint32_t* size) {
+    m_calls.push_back("GetMemHandleSize");
     return m_pInner->GetMemHandleSize(handle, size);
 }
 
 int SpyArmClient::WriteMemHandle(std::uint32_t handle, std::uint32_t offset, const void* data,
                                  std::uint32_t* size) {
+    m_calls.push_back("WriteMemHandle");
     return m_pInner->WriteMemHandle(handle, offset, data, size);
 }
 
 int SpyArmClient::ReadMemHandle(std::uint32_t handle, std::uint32_t offset, void* buffer,
                                 std::uint32_t* size) {
+    m_calls.push_back("ReadMemHandle");
     return m_pInner->ReadMemHandle(handle, offset, buffer, size);
 }

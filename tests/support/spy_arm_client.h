@@ -1,5 +1,6 @@
-// Wraps a service object and records every request the component makes, then forwards it.
-// Tests read the request names in order, the enroll payloads and the registered sinks.
+// Wraps a service object and records the name of every request the component makes, then
+// forwards it. Tests read the request names in order, the enroll payloads, the handle
+// requests and the registered sinks.
 #pragma once
 
 #include <cstdint>
@@ -21,6 +22,8 @@ public:
     const std::vector<std::string>& EnrollPayloads() const { return m_enrollPayloads; }
     // The names asked for in the last AllocNameHandle.
     const std::vector<std::string>& HandleNames() const { return m_handleNames; }
+    // The entries of every AllocNameHandle, in order, as they were handed over.
+    const std::vector<std::vector<NameHandle>>& HandleRequests() const { return m_handleRequests; }
     IArmSharedDataSink* RegisteredSink() const { return m_pRegisteredSink; }
     bool Released() const { return m_bReleased; }
     void ClearCalls() { m_calls.clear(); }
@@ -65,6 +68,7 @@ private:
     std::vector<std::string> m_calls;
     std::vector<std::string> m_enrollPayloads;
     std::vector<std::string> m_handleNames;
+    std::vector<std::vector<NameHandle>> m_handleRequests;
     IArmSharedDataSink* m_pRegisteredSink = nullptr;
     bool m_bReleased = false;
 };
