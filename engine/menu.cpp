@@ -124,6 +124,8 @@ void CChatClient::InsertChatUserName(const char* name, std::uint32_t nodeId, int
         if (privileged) OnPrivilegeChanged(m_dwPrivilege, 0);
         return;
     }
+    // Node 0 is no participant: no lookup would find its entry again to take it out.
+    if (nodeId == 0) return;
     if (!privileged && m_bPractice) return;
 
     const int existing = GetIndexOfMenuByNodeID(nodeId);
@@ -220,7 +222,7 @@ void CChatClient::InsertRecentUserName(const char* name, std::uint32_t nodeId) {
         if (IsPrivileged()) OnPrivilegeChanged(m_dwPrivilege, 0);
         return;
     }
-    if (m_bPractice) return;
+    if (nodeId == 0 || m_bPractice) return;
     const bool host = IsNodeHost(nodeId);
     const bool presenter = IsNodePresenter(nodeId);
     if (m_dwMeetingType == 3 &&

@@ -321,6 +321,43 @@ TEST(ProcessDeleteEnrollInfo, RemovesEntryAndItemOnlyForKnownNodes) {
     EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
 }
 
+TEST(ProcessDeleteEnrollInfo, ParticipantWithoutANodeIdLeavesTheMenuAsItWas) {
+    // A report entry for node 0 comes and goes; entry lookups never match node 0 (separators
+    // carry it), so it must not get an entry that could not be taken out again.
+    struct Case {
+        const char* scenario;
+        Options options;
+        std::uint32_t host;
+        bool picked;  // the host picks the participant in the attendee picker
+        Strings menu;
+    };
+    const Case cases[] = {
+        {"normal rules", {1}, 300, false, {"All Attendees", "---", "Host"}},
+        {"QM rules",
+         {1, false, 0, FEATURE_QM_MODE},
+         300,
+         false,
+         {"Everyone", "All Attendees", "---", "Host"}},
+        {"picked by the host", {1, true}, kMyNode, true, {"All Attendees", "---", "Host"}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.scenario);
+        MenuHarness h(c.options);
+        h.engine.OnHostChanged(c.host);
+        h.engine.OnPresenterChanged(301);
+        h.Seed({{"All Attendees", 8}, {"---", 0}, {"Host", 1}});
+        h.Commands();
+        h.Enroll({{0, "ghost"}});
+        if (c.picked) EXPECT_FALSE(h.engine.SelectUserByNodeID(0, false, true));
+        EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
+        EXPECT_EQ(h.Titles(), c.menu);
+        EXPECT_EQ(h.Commands(), Strings());
+        h.Leave({0, "ghost"});
+        EXPECT_EQ(h.engine.UserList().GetCount(), 0u);
+        EXPECT_EQ(h.Titles(), c.menu);
+    }
+}
+
 TEST(ProcessModifyEnrollInfo, UpdatesTheItemButNotTheTitle) {
     MenuHarness h({1});
     h.Seed({{"All Attendees", 8}});
