@@ -3,13 +3,18 @@
 #include <cstdint>
 #include <utility>
 
-#include "platform/trace.h"
+#include "engine/func_trace.h"
 
 namespace {
 
 ChatWindowFactory& Factory() {
     static ChatWindowFactory factory;
     return factory;
+}
+
+// An address as the traces print it.
+unsigned Hex(const void* address) {
+    return static_cast<unsigned>(reinterpret_cast<std::uintptr_t>(address));
 }
 
 }  // namespace
@@ -19,10 +24,8 @@ void SetChatWindowFactory(ChatWindowFactory factory) {
 }
 
 int CreateUI(ChatUIHandle* retData, void* data, IChatCommSinkForChatUI* pSink) {
-    MacInfoTrace2("Chat", "CreateUI, retData = 0x%x, data = 0x%x, pSink = 0x%x",
-                  static_cast<unsigned>(reinterpret_cast<std::uintptr_t>(retData)),
-                  static_cast<unsigned>(reinterpret_cast<std::uintptr_t>(data)),
-                  static_cast<unsigned>(reinterpret_cast<std::uintptr_t>(pSink)));
+    CFuncTrace trace("CreateUI, retData = 0x%x, data = 0x%x, pSink = 0x%x", Hex(retData), Hex(data),
+                     Hex(pSink));
     IChatWindow* window = Factory() ? Factory()() : nullptr;
     if (window) {
         window->SetSuperView(data);
@@ -33,8 +36,7 @@ int CreateUI(ChatUIHandle* retData, void* data, IChatCommSinkForChatUI* pSink) {
 }
 
 int DestoryUI(ChatUIHandle control) {
-    MacInfoTrace2("Chat", "DestoryUI, control = 0x%x",
-                  static_cast<unsigned>(reinterpret_cast<std::uintptr_t>(control)));
+    CFuncTrace trace("DestoryUI, control = 0x%x", Hex(control));
     if (!control) return 3;
     control->SetSink(nullptr);
     delete control;
@@ -47,5 +49,5 @@ int NotifyCocoaUI(ChatUIHandle control, int command, void* inParam, void* outPar
 }
 
 void InstallCallback() {
-    MacInfoTrace2("Chat", "InstallCallback");
+    CFuncTrace trace("InstallCallback");
 }
