@@ -31,13 +31,13 @@ enum ChatUICommand : int {
     msg_CloseAllDialogs = 2402,              // -, -
     msg_GetInputText = 2500,                 // std::string* receives the text, -
     msg_ClearInput = 2501,                   // -, -
-    msg_SaveChatPanel = 2600,         // int32_t* in: save-as, out: confirmed; std::string* path
-    msg_OpenChatPanel = 2601,         // int32_t* out: confirmed; std::string* path
-    msg_WriteTextFile = 2602,         // const char* path, const char* content
-    msg_ReadTextFile = 2603,          // const char* path, std::string* content
-    msg_AddAttendee = 2604,           // AttendeeRecord*, -
-    msg_CloseAttendeeDialog = 2605,   // -, -
-    msg_CloseAttendeeWarning = 2606,  // -, int32_t* out: warning still showing
+    msg_SaveChatPanel = 2600,                // int32_t* out: confirmed; std::string* path
+    msg_OpenChatPanel = 2601,                // int32_t* out: confirmed; std::string* path
+    msg_WriteTextFile = 2602,                // const char* path, const char* content
+    msg_ReadTextFile = 2603,                 // const char* path, std::string* content
+    msg_AddAttendee = 2604,                  // AttendeeRecord*, -
+    msg_CloseAttendeeDialog = 2605,          // -, -
+    msg_CloseAttendeeWarning = 2606,         // -, int32_t* out: warning still showing
 };
 
 // Window to engine: IChatCommSinkForChatUI::HandleUIMessage (message, iParam, oParam).
