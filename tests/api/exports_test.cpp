@@ -116,7 +116,10 @@ TEST(Exports, WholeLifeThroughTheExportedFunctions) {
     window->Clear();
     EXPECT_EQ(ChSwitchTarget(handle), 0);
     EXPECT_EQ(ChCloseAllDlg(handle), 0);
-    EXPECT_EQ(window->Ids(), (std::vector<int>{msg_FocusInput, msg_CloseAllDialogs}));
+    // The picker closes before the selection and the input takes the focus after it.
+    EXPECT_EQ(ChSelectUserByNodeId(handle, 99), 0);
+    EXPECT_EQ(window->Ids(), (std::vector<int>{msg_FocusInput, msg_CloseAllDialogs,
+                                               msg_CloseAttendeeDialog, msg_FocusInput}));
 
     EXPECT_EQ(ChDeleteInstance(handle), 0);
     EXPECT_EQ(RecordingWindow::Latest(), nullptr);
