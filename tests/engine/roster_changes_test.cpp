@@ -348,7 +348,9 @@ TEST(ProcessDeleteEnrollInfo, ParticipantWithoutANodeIdLeavesTheMenuAsItWas) {
         h.Seed({{"All Attendees", 8}, {"---", 0}, {"Host", 1}});
         h.Commands();
         h.Enroll({{0, "ghost"}});
-        if (c.picked) EXPECT_FALSE(h.engine.SelectUserByNodeID(0, false, true));
+        if (c.picked) {
+            EXPECT_FALSE(h.engine.SelectUserByNodeID(0, false, true));
+        }
         EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
         EXPECT_EQ(h.Titles(), c.menu);
         EXPECT_EQ(h.Commands(), Strings());
