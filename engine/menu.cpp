@@ -273,12 +273,12 @@ int CChatClient::PanelRecentInsertPosition() {
         MacInfoTrace2(kChatTag, "CChatClient::InsertRecentUserName indexStart== -1");
         return -1;
     }
-    const int end = GetIndexOfMenuByGroup(GROUP_SELECT_ATTENDEE);
     const int lastTwo = static_cast<int>(m_MenuStatus.size()) - 2;
     if (start < lastTwo && !m_MenuStatus[start + 2].IsPlainParticipantEntry()) {
         InsertMenuEntry(SeparatorEntry(), lastTwo);
         MacInfoTrace2(kChatTag, "CChatClient::InsertRecentUserName : add sep");
-        if (start + 2 != end)
+        // The new separator should sit right between the section's start and the picker.
+        if (start + 2 != GetIndexOfMenuByGroup(GROUP_SELECT_ATTENDEE))
             MacWarnTrace2(kChatTag,
                           "CChatClient::InsertRecentUserName : add sep indexStart+2 != indexEnd");
     }

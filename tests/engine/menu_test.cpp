@@ -234,18 +234,52 @@ TEST(RecentEntries, PanelMeetingSectionAndDepartures) {
     h.Seed(kPanelTail);
     h.Enroll({{201, "a1"}, {202, "a2"}});
     h.Commands();
-    TraceCapture trace;
     EXPECT_TRUE(h.engine.SelectUserByNodeID(201, false, true));
     EXPECT_TRUE(h.engine.SelectUserByNodeID(202, false, true));
     EXPECT_EQ(h.Commands(),
               Strings({"insert 7 ---", "insert 8 a1", "select 8", "insert 8 a2", "select 8"}));
-    EXPECT_FALSE(trace.Has("CChatClient::InsertRecentUserName : add sep indexStart+2 != indexEnd"));
     h.Leave({201, "a1"});
     EXPECT_EQ(h.Commands(), Strings({"remove 9"}));
     h.Leave({202, "a2"});
     EXPECT_EQ(h.Commands(), Strings({"remove 8", "remove 8", "select 6"}));
     EXPECT_EQ(h.Titles(), Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists",
                                    "---", "*All Participants", "---", "Select an Attendee..."}));
+}
+
+TEST(RecentEntries, PanelMeetingWarnsWhenTheNewSeparatorDoesNotMeetThePicker) {
+    struct Case {
+        const char* scenario;
+        Seed tail;
+        Strings menu;
+        bool warned;
+    };
+    const Strings head = {"Host", "Presenter", "Host & Presenter", "---", "All Panelists", "---"};
+    const Case cases[] = {
+        {"a separator already stands above the picker: the new one doubles it",
+         kPanelTail,
+         {"All Participants", "---", "*a1", "---", "Select an Attendee..."},
+         true},
+        {"the picker follows the everyone entry: the new separator goes between them",
+         {{"---", 0}, {"All Participants", 15}, {"Select an Attendee...", 16}, {"---", 0}},
+         {"All Participants", "---", "*a1", "Select an Attendee...", "---"},
+         false},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.scenario);
+        MenuHarness h({3});
+        h.engine.SetRosters(ROLE_PANELIST, 1);
+        h.Seed(c.tail);
+        h.Enroll({{201, "a1"}});
+        TraceCapture trace;
+        EXPECT_TRUE(h.engine.SelectUserByNodeID(201, false, true));
+        Strings menu = head;
+        menu.insert(menu.end(), c.menu.begin(), c.menu.end());
+        EXPECT_EQ(h.Titles(), menu);
+        EXPECT_TRUE(trace.Has("CChatClient::InsertRecentUserName : add sep"));
+        EXPECT_EQ(trace.Has(TraceLevel::Warn,
+                            "CChatClient::InsertRecentUserName : add sep indexStart+2 != indexEnd"),
+                  c.warned);
+    }
 }
 
 TEST(SelectUserByNodeID, FollowsRolesEntriesAndTestOnly) {
