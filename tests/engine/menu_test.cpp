@@ -59,6 +59,12 @@ TEST(InsertChatUserName, PlacesAttendeesByMeetingTypeAndRules) {
          {"Host", "Presenter", "Host & Presenter", "---", "All Panelists", "---",
           "All Participants", "---", "Alice", "bob", "---", "Select an Attendee..."},
          {"insert 7 ---", "insert 8 bob", "insert 8 Alice"}},
+        {"type 3 without everyone or attendees entry: appended, no separator",
+         {3},
+         {},
+         {"bob"},
+         {"Host", "Presenter", "Host & Presenter", "---", "All Panelists", "bob"},
+         {"insert -1 bob"}},
     };
     for (const InsertCase& c : cases) {
         SCOPED_TRACE(c.scenario);
