@@ -2,6 +2,7 @@
 
 #include <cstdlib>
 #include <cstring>
+#include <string>
 
 #include "kyutil/bstream.h"
 #include "kyutil/safe_mem.h"
@@ -91,19 +92,11 @@ void CUsersGroup::SetGroupNameLabel(const char* name, const char* label) {
 }
 
 const char* CUsersGroup::SetFactName(const char* text) {
-    static const char kOpen[] = "(|(";
-    static const char kClose[] = ")|)";
-    const std::size_t textLength = text ? std::strlen(text) : 0;
-    const std::size_t nameLength = m_pszName ? std::strlen(m_pszName.get()) : 0;
-    m_pszFactName.reset(new char[textLength + nameLength + 7]);
-    char* out = m_pszFactName.get();
-    std::memcpy(out, text, textLength);
-    out += textLength;
-    std::memcpy(out, kOpen, 3);
-    out += 3;
-    std::memcpy(out, m_pszName.get(), nameLength);
-    out += nameLength;
-    std::memcpy(out, kClose, sizeof(kClose));
+    // A missing text or name counts as empty.
+    const std::string fact =
+        std::string(text ? text : "") + "(|(" + (m_pszName ? m_pszName.get() : "") + ")|)";
+    m_pszFactName.reset(new char[fact.size() + 1]);
+    std::memcpy(m_pszFactName.get(), fact.c_str(), fact.size() + 1);
     return m_pszFactName.get();
 }
 

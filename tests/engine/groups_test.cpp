@@ -54,9 +54,13 @@ std::vector<std::uint32_t> Ids(const CUsersGroupList& list) {
 
 }  // namespace
 
-TEST(CUsersGroup, FactNameWrapsTheGroupName) {
+TEST(CUsersGroup, FactNameWrapsTheGroupNameAndTakesMissingPartsAsEmpty) {
+    CUsersGroup unnamed;
+    EXPECT_STREQ(unnamed.SetFactName(nullptr), "(|()|)");
+    EXPECT_STREQ(unnamed.SetFactName("chat"), "chat(|()|)");
     CUsersGroup group;
     group.SetGrpName("Panel");
+    EXPECT_STREQ(group.SetFactName(nullptr), "(|(Panel)|)");
     EXPECT_STREQ(group.SetFactName("chat"), "chat(|(Panel)|)");
 }
 
