@@ -4,7 +4,7 @@
 
 #include "api/quintarachat.h"
 #include "engine/chat_client.h"
-#include "engine/func_trace.h"
+#include "platform/func_trace.h"
 
 namespace {
 

@@ -3,7 +3,7 @@
 #include <cstdint>
 #include <utility>
 
-#include "engine/func_trace.h"
+#include "platform/func_trace.h"
 
 namespace {
 

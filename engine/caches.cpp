@@ -10,9 +10,9 @@
 
 #include "engine/chat_client.h"
 #include "engine/chat_recovery_mgr.h"
-#include "engine/func_trace.h"
 #include "pdu/chat_user_info_pdu.h"
 #include "pdu/group_info_pdu.h"
+#include "platform/func_trace.h"
 #include "platform/trace.h"
 
 namespace {

@@ -5,7 +5,7 @@
 
 #include "api/ui_protocol.h"
 #include "engine/chat_client.h"
-#include "engine/func_trace.h"
+#include "platform/func_trace.h"
 #include "platform/string_table.h"
 #include "platform/trace.h"
 

@@ -8,7 +8,7 @@
 #include <string>
 
 #include "engine/chat_client.h"
-#include "engine/func_trace.h"
+#include "platform/func_trace.h"
 #include "platform/trace.h"
 
 namespace {

@@ -3,7 +3,7 @@
 #include <cstdint>
 
 #include "engine/chat_client.h"
-#include "engine/func_trace.h"
+#include "platform/func_trace.h"
 
 namespace {
 

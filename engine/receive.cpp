@@ -1,7 +1,7 @@
 // What arrives from the conference service: private data and cache deliveries.
 // So far the engine acts on the status-cache answer; chat lines are not shown yet.
 #include "engine/chat_client.h"
-#include "engine/func_trace.h"
+#include "platform/func_trace.h"
 #include "platform/trace.h"
 
 int CChatClient::ApeDataIndication(std::uint32_t, std::uint32_t, std::uint32_t, std::uint16_t,

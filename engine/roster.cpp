@@ -3,7 +3,7 @@
 #include <algorithm>
 
 #include "engine/chat_client.h"
-#include "engine/func_trace.h"
+#include "platform/func_trace.h"
 
 bool CChatClient::IsUserExist(const UserItem* item) const {
     CFuncTrace trace("CChatClient::IsuserExist");

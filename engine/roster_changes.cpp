@@ -9,8 +9,8 @@
 #include <string>
 
 #include "engine/chat_client.h"
-#include "engine/func_trace.h"
 #include "pdu/roster_info_pdu.h"
+#include "platform/func_trace.h"
 #include "platform/string_table.h"
 #include "platform/trace.h"
 

@@ -5,9 +5,9 @@
 
 #include "engine/chat_client.h"
 #include "engine/chat_recovery_mgr.h"
-#include "engine/func_trace.h"
 #include "pdu/faq_macro_info_pdu.h"
 #include "pdu/roster_info_pdu.h"
+#include "platform/func_trace.h"
 #include "platform/trace.h"
 
 namespace {

@@ -10,9 +10,9 @@
 #include <utility>
 
 #include "engine/chat_client.h"
-#include "engine/func_trace.h"
 #include "engine/transcript_format.h"
 #include "platform/file_services.h"
+#include "platform/func_trace.h"
 #include "platform/string_table.h"
 #include "platform/trace.h"
 #include "platform/warning_window.h"

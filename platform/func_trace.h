@@ -1,7 +1,6 @@
 // A scoped trace: logs "Enter <text>" when made and "Leave <text>" when it goes out of
-// scope, through the info channel with the component tag. Every entry point opens one.
-// Defined here in full so that the window bridge, which sits below the engine, can open
-// one too.
+// scope, through the info channel with the component tag. Every entry point of the
+// component opens one, in the engine and in the window bridge alike.
 #pragma once
 
 #include <cstdarg>
