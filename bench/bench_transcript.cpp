@@ -4,12 +4,14 @@
 // (targets: save at most 1.5 times the floor, open at most 3 times), then the in-memory
 // stages (formatting; parsing with showing) and the page faults of each fastest round.
 //
-// On the 2-core development VM (13.4 MB file) save takes 4.3-6 ms against a 2.8-3.3 ms
-// floor, about 1.5 times; the rest of save is formatting (1.0 ms) and the write beside the
-// old file and rename, which varies with the disk's flushing. Open takes 2.7-3.0 ms against
-// a 0.65-0.8 ms floor, about 4 times, and does not reach 3: finding the TAB and LF of every
-// entry alone, one pass over the bytes, costs 1.0 ms here, and reading the times, showing
-// 200,000 texts and keeping the index of times and lines another 1.1 ms.
+// On the 2-core development VM (13.4 MB file) save takes 4.3-12 ms against a 2.8-6.4 ms
+// floor, 1.2 to 3.3 times from run to run: formatting is 1.0 ms, and the rest is the write
+// beside the old file and the rename over it, after which the filesystem starts writing the
+// new file out at once, so the time follows how busy the disk is. Open takes 2.7-4.6 ms
+// against a 0.56-1.5 ms floor, 2.4 to 5 times, and does not reach 3 when the read is at its
+// fastest: finding the TAB and LF of every entry alone, one pass over the bytes, costs 1.0 ms
+// here, and reading the times, showing 200,000 texts and keeping the index of times and
+// lines another 1.1 ms.
 #include <fcntl.h>
 #include <stdlib.h>
 #include <sys/resource.h>
