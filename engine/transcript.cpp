@@ -1,7 +1,6 @@
 // Transcript files: saving the transcript as a time-stamped text file (save, save as, save
 // into a folder), opening such files back into the transcript and the window, the modified
 // flag and the tick's watch over the saved file.
-#include <algorithm>
 #include <cstdint>
 #include <memory>
 #include <new>
@@ -85,10 +84,8 @@ std::string SavingNameFor(const std::string& name) {
     constexpr std::size_t kMaxNameBytes = 255;
     const std::string prefix = ".";
     const std::string suffix = ".saving";
-    std::size_t keep = std::min(name.size(), kMaxNameBytes - prefix.size() - suffix.size());
-    while (keep > 0 && keep < name.size() &&
-           (static_cast<unsigned char>(name[keep]) & 0xC0) == 0x80)
-        --keep;
+    const std::size_t keep =
+        Utf8FittingSize(name.data(), name.size(), kMaxNameBytes - prefix.size() - suffix.size());
     return prefix + name.substr(0, keep) + suffix;
 }
 

@@ -64,10 +64,7 @@ std::size_t KeptHeaderSize(const char* header, std::size_t size) {
     if (size < kMaxHeaderSize || (size == kMaxHeaderSize && header[size - 1] == '\r')) {
         return size;
     }
-    std::size_t kept = kMaxHeaderSize - 1;
-    while (kept > 0 && (static_cast<unsigned char>(header[kept]) & 0xC0) == 0x80)
-        --kept;
-    return kept;
+    return Utf8FittingSize(header, size, kMaxHeaderSize - 1);
 }
 
 // Reads the time prefix at data, which holds at least kTimePrefixSize bytes, into *time;
@@ -126,6 +123,13 @@ void Show(char* data, std::size_t at, std::size_t size, bool bTitle,
 }
 
 }  // namespace
+
+std::size_t Utf8FittingSize(const char* text, std::size_t size, std::size_t limit) {
+    std::size_t kept = std::min(size, limit);
+    while (kept > 0 && kept < size && (static_cast<unsigned char>(text[kept]) & 0xC0) == 0x80)
+        --kept;
+    return kept;
+}
 
 void FormatTimePrefix(const DateTimeRec& time, char* out) {
     std::memcpy(out, "00/00/0000    00:00:00 AM    ", kTimePrefixSize);

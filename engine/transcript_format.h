@@ -18,6 +18,10 @@ constexpr std::size_t kTimePrefixSize = 29;
 // Longest header (the text before an entry's TAB) kept when reading, its CR included.
 constexpr std::size_t kMaxHeaderSize = 8191;
 
+// How many of the size bytes at text fit within limit bytes without splitting a UTF-8
+// character: all of them when they fit, else limit or fewer.
+std::size_t Utf8FittingSize(const char* text, std::size_t size, std::size_t limit);
+
 // Writes the time prefix of time into out (no terminator). The hour stays 00 to 23 and is
 // followed by AM below 12 and PM from 12.
 void FormatTimePrefix(const DateTimeRec& time, char* out);
