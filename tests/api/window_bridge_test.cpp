@@ -1,5 +1,5 @@
-// The window bridge: what it traces, how it treats a missing window, and the protocol ids
-// and names engine and window agree on.
+// The window bridge: what it traces, how it treats a missing window, and which protocol
+// ids have names.
 #include <gtest/gtest.h>
 
 #include <cstdint>
@@ -93,51 +93,10 @@ TEST(WindowBridge, TheWindowGetsViewAndSinkAndLosesTheSinkBeforeItEnds) {
     EXPECT_EQ(capture.Texts(), Scoped("DestoryUI, control = " + Hex(handle)));
 }
 
-TEST(UiProtocol, IdsAndNamesBothSidesAgreeOn) {
-    const struct {
-        int id;
-        const char* name;
-    } table[] = {
-        {1000, "msg_ClearChat"},
-        {2000, "msg_FocusInput"},
-        {2100, "msg_ShowChat"},
-        {2101, "msg_SendDone"},
-        {2103, "msg_AllowUserInput"},
-        {2104, "msg_HideUserList"},
-        {2200, "msg_ShowText"},
-        {2201, "msg_ShowTitle"},
-        {2301, "msg_InsertMenuItem"},
-        {2302, "msg_RemoveMenuItem"},
-        {2303, "msg_SelectedUserLeft"},
-        {2304, "msg_RenameMenuItem"},
-        {2305, "msg_SelectMenuItem"},
-        {2306, "msg_SelectMenuItemAndAllowInput"},
-        {2307, "msg_UpdateMenuItem"},
-        {2308, "msg_EnableUserList"},
-        {2309, "msg_DisableUserList"},
-        {2310, "msg_NoSendToItems"},
-        {2400, "msg_RebuildMenu"},
-        {2401, "msg_PanelStatusChanged"},
-        {2402, "msg_CloseAllDialogs"},
-        {2500, "msg_GetInputText"},
-        {2501, "msg_ClearInput"},
-        {2600, "msg_SaveChatPanel"},
-        {2601, "msg_OpenChatPanel"},
-        {2602, "msg_WriteTextFile"},
-        {2603, "msg_ReadTextFile"},
-        {2604, "msg_AddAttendee"},
-        {2605, "msg_CloseAttendeeDialog"},
-        {2606, "msg_CloseAttendeeWarning"},
-        {5000, "msg_SendChat"},
-        {5001, "msg_SelectionChanged"},
-        {5002, "msg_ShowAttendeeList"},
-        {5003, "msg_AttendeeSelected"},
-    };
-    for (const auto& entry : table) {
-        const char* name = ChatUIMessageName(entry.id);
-        ASSERT_NE(name, nullptr) << entry.id;
-        EXPECT_STREQ(name, entry.name) << entry.id;
-    }
+TEST(UiProtocol, OnlyKnownIdsHaveNames) {
+    EXPECT_STREQ(ChatUIMessageName(msg_SelectMenuItemAndAllowInput),
+                 "msg_SelectMenuItemAndAllowInput");
+    EXPECT_STREQ(ChatUIMessageName(5003), "msg_AttendeeSelected");
     for (const int unknown : {0, 999, 1001, 2102, 2300, 2311, 2502, 2607, 4999, 5004})
         EXPECT_EQ(ChatUIMessageName(unknown), nullptr) << unknown;
 }
