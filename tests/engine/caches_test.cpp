@@ -110,14 +110,10 @@ TEST_F(CachesTest, EachRoleSubscribesTheCachesItMayRead) {
     const RoleCase cases[] = {
         {"host", kMyNode, kOtherNode, ROLE_HOST | ROLE_PANELIST, {15, 1, 4, 3, 7}},
         {"presenter", kOtherNode, kMyNode, ROLE_PRESENTER | ROLE_PANELIST, {15, 2, 4, 3, 7}},
-        {"host and presenter",
-         kMyNode,
-         kMyNode,
-         ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST,
-         {15, 1, 2, 3, 4, 7}},
+        {"both", kMyNode, kMyNode, ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST, {15, 1, 2, 3, 4, 7}},
         {"panelist", kOtherNode, kOtherNode, ROLE_PANELIST, {15, 4, 7}},
         {"attendee", kOtherNode, kOtherNode, 0, {15, 8}},
-        {"attendee while nobody holds a role", 0, 0, 0, {15, 8}},
+        {"attendee, no role held", 0, 0, 0, {15, 8}},
     };
     for (const RoleCase& c : cases) {
         SCOPED_TRACE(c.role);
@@ -173,18 +169,15 @@ TEST_F(CachesTest, ARequestIsSentOnlyWhenItWouldChangeTheSubscription) {
         int subscribedAfter;
         int requestTypeAfter;
     };
+    const tagCacheRequestType kSub = CACHE_REQUEST_SUBSCRIBE, kUnsub = CACHE_REQUEST_UNSUBSCRIBE;
     const RequestCase cases[] = {
-        {"subscribed with the same type", GROUP_EVERYONE, true, CACHE_REQUEST_SUBSCRIBE, 0, 1,
-         CACHE_REQUEST_SUBSCRIBE},
+        {"subscribed with the same type", GROUP_EVERYONE, true, kSub, 0, 1, kSub},
         {"subscribed, another type", GROUP_EVERYONE, true, CACHE_REQUEST_RETRIEVE, 1, 1,
          CACHE_REQUEST_RETRIEVE},
-        {"unsubscribe", GROUP_EVERYONE, false, CACHE_REQUEST_UNSUBSCRIBE, 1, 0,
-         CACHE_REQUEST_UNSUBSCRIBE},
-        {"unsubscribe again", GROUP_EVERYONE, false, CACHE_REQUEST_UNSUBSCRIBE, 0, 0,
-         CACHE_REQUEST_UNSUBSCRIBE},
-        {"subscribe after unsubscribing", GROUP_EVERYONE, true, CACHE_REQUEST_SUBSCRIBE, 1, 1,
-         CACHE_REQUEST_SUBSCRIBE},
-        {"never subscribed, unsubscribe", GROUP_HOST, false, CACHE_REQUEST_UNSUBSCRIBE, 0, 0, 0},
+        {"unsubscribe", GROUP_EVERYONE, false, kUnsub, 1, 0, kUnsub},
+        {"unsubscribe again", GROUP_EVERYONE, false, kUnsub, 0, 0, kUnsub},
+        {"subscribe after unsubscribing", GROUP_EVERYONE, true, kSub, 1, 1, kSub},
+        {"never subscribed, unsubscribe", GROUP_HOST, false, kUnsub, 0, 0, 0},
     };
     for (const RequestCase& c : cases) {
         SCOPED_TRACE(c.request);
@@ -250,43 +243,13 @@ TEST_F(CachesTest, CacheActionConfirmationsDriveTheNextStep) {
         IdSet subscribed;    // the local participant became host just before
         bool resubscribed;
     };
+    // The user info's set marks the status cache and writes the own info; either set then
+    // subscribes by role, or only to everyone's cache while recovering.
     const ConfirmCase cases[] = {
-        {"user info set: mark status, own info, subscribe by role",
-         kUserInfo,
-         CACHE_SET,
-         0,
-         false,
-         false,
-         2,
-         {15, 1, 3, 4, 7},
-         true},
-        {"user info set while recovering: everyone's cache only",
-         kUserInfo,
-         CACHE_SET,
-         0,
-         false,
-         true,
-         2,
-         {15, 8},
-         false},
-        {"status set: subscribe by role",
-         kStatus,
-         CACHE_SET,
-         0,
-         false,
-         false,
-         0,
-         {15, 1, 3, 4, 7},
-         false},
-        {"status set while recovering: everyone's cache only",
-         kStatus,
-         CACHE_SET,
-         0,
-         false,
-         true,
-         0,
-         {15, 8},
-         false},
+        {"user info set", kUserInfo, CACHE_SET, 0, false, false, 2, {15, 1, 3, 4, 7}, true},
+        {"user info set, recovering", kUserInfo, CACHE_SET, 0, false, true, 2, {15, 8}, false},
+        {"status set", kStatus, CACHE_SET, 0, false, false, 0, {15, 1, 3, 4, 7}, false},
+        {"status set, recovering", kStatus, CACHE_SET, 0, false, true, 0, {15, 8}, false},
         {"an append", kUserInfo, CACHE_APPEND, 0, false, false, 0, {15, 8}, false},
         {"a refused set", kUserInfo, CACHE_SET, 3, false, false, 0, {15, 8}, false},
         {"no ape handle", kUserInfo, CACHE_SET, 0, true, false, 0, {15, 8}, false},

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -10,7 +11,6 @@
 #include "engine/chat_recovery_mgr.h"
 #include "platform/inproc_conference.h"
 #include "platform/virtual_run_loop.h"
-#include "tests/support/arm_recorder.h"
 #include "tests/support/recording_window.h"
 #include "tests/support/spy_arm_client.h"
 #include "tests/support/trace_capture.h"
@@ -21,16 +21,11 @@ constexpr std::uint32_t kSessionId = 42;
 
 class HostSinkRecorder final : public IHostChatSink {
 public:
-    void OnIncomingChat(const char* sender, const char* message, uint32_t nodeId) override {
-        events.push_back("incoming " + std::string(sender) + ": " + message + " @" +
-                         std::to_string(nodeId));
-    }
+    void OnIncomingChat(const char*, const char*, uint32_t) override { events.push_back("chat"); }
     void OnChatShown() override { events.push_back("shown"); }
-    void OnChatModified(bool modified) override {
-        events.push_back(std::string("modified ") + (modified ? "1" : "0"));
-    }
-    void OnChatContentChanged(bool changed) override {
-        events.push_back(std::string("content ") + (changed ? "1" : "0"));
+    void OnChatModified(bool on) override { events.push_back(on ? "modified 1" : "modified 0"); }
+    void OnChatContentChanged(bool on) override {
+        events.push_back(on ? "content 1" : "content 0");
     }
     std::vector<std::string> events;
 };
@@ -104,15 +99,7 @@ TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
         // The first participant found the status cache empty and initialised every cache.
         EXPECT_EQ(group->IsCacheSet(), 1) << group->GetGroupId();
     }
-    int subscribed = 0, requestType = 0, cacheSet = 0;
-    ASSERT_TRUE(engine.GetGroupCacheStatus(GROUP_EVERYONE, subscribed, requestType, cacheSet));
-    EXPECT_EQ(subscribed, 1);
-    EXPECT_EQ(requestType, CACHE_REQUEST_SUBSCRIBE);
-    // An attendee reads "All Attendees" but not the host's cache.
-    ASSERT_TRUE(engine.GetGroupCacheStatus(GROUP_ATTENDEES, subscribed, requestType, cacheSet));
-    EXPECT_EQ(subscribed, 1);
-    ASSERT_TRUE(engine.GetGroupCacheStatus(GROUP_HOST, subscribed, requestType, cacheSet));
-    EXPECT_EQ(subscribed, 0);
+    // Which caches each role subscribes is the caches test's concern.
 
     RecordingWindow* window = RecordingWindow::Latest();
     ASSERT_NE(window, nullptr);
@@ -143,44 +130,20 @@ TEST_F(SessionTest, LaterJoinerFindsTheCachesInitialisedAndOnlySubscribes) {
     EXPECT_EQ(cacheSet, 1);
 }
 
-TEST_F(SessionTest, RosterInfoOthersReceiveIsPinned) {
-    ArmRecorder other;
-    InProcessArmClient* otherClient = conference.CreateClient(loop, 9);
-    other.SetClient(otherClient);
-    std::uint32_t otherApe = 0;
-    ARMSessionResource resource{1, "c_session_id", 1, 0, 0};
-    otherClient->Connect(&other, "Bob", 0, 0, 0);
-    otherClient->ConferenceJoin(0, conference.ConferenceId(), &other, 3);
-    otherClient->ApeAttach(&other, 0, conference.ConferenceId(), &otherApe);
-    loop.RunUntilIdle();
-    otherClient->ApeEnroll(otherApe, 1, kSessionId, 0, 1, &resource, "x", 1, 3);
-    loop.RunUntilIdle();
-    other.Clear();
-
+TEST_F(SessionTest, RosterInfoIsPinned) {
     InProcessArmClient* client = conference.CreateClient(loop, 7);
+    SpyArmClient spy(client);
     CChatClient engine;
     engine.SetRosters(ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST, 1);
-    engine.Initialize(Data(client, 7, "Alice <&> ]]>", 1));
+    engine.Initialize(Data(&spy, 7, "Alice <&> ]]>", 1));
     loop.RunUntilIdle();
-
     // Meeting type 1 clears the panelist bit; the customer id is written even when 0;
     // no FAQ fields without FAQ settings; no external tag when it is 0.
-    const std::string expected =
-        "<chat ver=\"1.0\"><mtype>5</mtype><NodeID>7</NodeID>"
-        "<UserName><![CDATA[Alice <&> ]] >]]></UserName><RoleSet>3</RoleSet>"
-        "<Visible>1</Visible><UserType>1</UserType><GuestID>0</GuestID></chat>";
-    bool seen = false;
-    for (const ArmEvent& event : other.Named("ApeRosterChanged")) {
-        for (const RosterRecord& record : event.roster.added) {
-            for (const RosterUserEntry& user : record.users) {
-                if (user.nodeId != 7) continue;
-                EXPECT_EQ(std::string(user.enrollInfo.begin(), user.enrollInfo.end()), expected);
-                EXPECT_EQ(user.userId, engine.MyUserID());
-                seen = true;
-            }
-        }
-    }
-    EXPECT_TRUE(seen);
+    ASSERT_FALSE(spy.EnrollPayloads().empty());
+    EXPECT_EQ(spy.EnrollPayloads().front(),
+              "<chat ver=\"1.0\"><mtype>5</mtype><NodeID>7</NodeID>"
+              "<UserName><![CDATA[Alice <&> ]] >]]></UserName><RoleSet>3</RoleSet>"
+              "<Visible>1</Visible><UserType>1</UserType><GuestID>0</GuestID></chat>");
 }
 
 TEST_F(SessionTest, RosterInfoCarriesFaqFieldsTagAndCustomerId) {
@@ -206,26 +169,23 @@ TEST_F(SessionTest, RosterInfoCarriesFaqFieldsTagAndCustomerId) {
               "<GuestID>555</GuestID><UIT>2</UIT></chat>");
 }
 
-struct ConnectCase {
-    int connectResult;
-    bool joins;
-};
-
-class ConnectResultTest : public SessionTest, public ::testing::WithParamInterface<ConnectCase> {};
-
-TEST_P(ConnectResultTest, ConnectResultDecidesWhetherTheChainGoesOn) {
-    InProcessArmClient* client = conference.CreateClient(loop, 7);
-    SpyArmClient spy(client);
-    client->FailNext(ArmOperation::Connect, GetParam().connectResult);
-    CChatClient engine;
-    engine.Initialize(Data(&spy, 7, "Alice"));
-    loop.RunUntilIdle();
-    if (GetParam().joins) {
-        EXPECT_EQ(spy.Count("ConferenceJoin"), 1u);
-        EXPECT_EQ(engine.State(), kStateEnrolled);
-    } else {
+TEST_F(SessionTest, ConnectResultDecidesWhetherTheChainGoesOn) {
+    std::uint32_t node = 7;
+    for (const int result : {1202, 1, 19}) {
+        SCOPED_TRACE(result);
+        InProcessArmClient* client = conference.CreateClient(loop, node);
+        SpyArmClient spy(client);
+        client->FailNext(ArmOperation::Connect, result);
+        CChatClient engine;
+        engine.Initialize(Data(&spy, node++, "Alice"));
+        loop.RunUntilIdle();
+        const bool joins = result == 1202;
+        EXPECT_EQ(spy.Count("ConferenceJoin"), joins ? 1u : 0u);
+        if (joins) {
+            EXPECT_EQ(engine.State(), kStateEnrolled);
+            continue;
+        }
         // The session ends at once, but the window is made and the tick still runs.
-        EXPECT_EQ(spy.Count("ConferenceJoin"), 0u);
         EXPECT_TRUE(spy.Released());
         EXPECT_EQ(engine.ArmClient(), nullptr);
         EXPECT_NE(engine.ChatUI(), nullptr);
@@ -233,37 +193,28 @@ TEST_P(ConnectResultTest, ConnectResultDecidesWhetherTheChainGoesOn) {
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(Results, ConnectResultTest,
-                         ::testing::Values(ConnectCase{1202, true}, ConnectCase{1, false},
-                                           ConnectCase{19, false}),
-                         [](const ::testing::TestParamInfo<ConnectCase>& info) {
-                             return "Connect" + std::to_string(info.param.connectResult);
-                         });
-
-TEST_F(SessionTest, AlreadyConnectedGoesStraightIntoConferenceJoin) {
-    InProcessArmClient* client = conference.CreateClient(loop, 7);
-    SpyArmClient spy(client);
-    client->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
-    TraceCapture capture;
-    CChatClient engine;
-    engine.Initialize(Data(&spy, 7, "Alice"));
-    // Joined within Initialize, without waiting for a confirmation.
-    EXPECT_EQ(Prefix(spy.Calls(), 2), (std::vector<std::string>{"Connect", "ConferenceJoin"}));
-    EXPECT_TRUE(capture.Has("CChatClient::already connected, now call ConnectConfirm() myself"));
-    loop.RunUntilIdle();
-    EXPECT_EQ(engine.State(), kStateEnrolled);
-}
-
-TEST_F(SessionTest, AlreadyJoinedAttachesWithinTheSameCall) {
-    InProcessArmClient* client = conference.CreateClient(loop, 7);
-    SpyArmClient spy(client);
-    client->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
-    client->FailNext(ArmOperation::ConferenceJoin, kArmAlreadyJoined);
-    CChatClient engine;
-    engine.Initialize(Data(&spy, 7, "Alice"));
-    EXPECT_EQ(Prefix(spy.Calls(), 3),
-              (std::vector<std::string>{"Connect", "ConferenceJoin", "ApeAttach"}));
-    EXPECT_EQ(engine.State(), kStateAttaching);
+TEST_F(SessionTest, AlreadyConnectedOrJoinedGoesOnWithinTheSameCall) {
+    for (const std::uint32_t node : {7u, 8u}) {
+        const bool joined = node == 8;
+        InProcessArmClient* client = conference.CreateClient(loop, node);
+        SpyArmClient spy(client);
+        client->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
+        if (joined) client->FailNext(ArmOperation::ConferenceJoin, kArmAlreadyJoined);
+        TraceCapture capture;
+        CChatClient engine;
+        engine.Initialize(Data(&spy, node, "Alice"));
+        // Without waiting for a confirmation.
+        std::vector<std::string> chain = {"Connect", "ConferenceJoin"};
+        if (joined) chain.push_back("ApeAttach");
+        EXPECT_EQ(Prefix(spy.Calls(), chain.size()), chain);
+        EXPECT_TRUE(
+            capture.Has("CChatClient::already connected, now call ConnectConfirm() myself"));
+        if (joined) {
+            EXPECT_EQ(engine.State(), kStateAttaching);
+        }
+        loop.RunUntilIdle();
+        EXPECT_EQ(engine.State(), kStateEnrolled);
+    }
 }
 
 TEST_F(SessionTest, ConnectConfirmRetryConnectsAgainBoundedByTheService) {
@@ -277,63 +228,47 @@ TEST_F(SessionTest, ConnectConfirmRetryConnectsAgainBoundedByTheService) {
     EXPECT_EQ(engine.State(), kStateEnrolled);
 }
 
-TEST_F(SessionTest, AttachFailuresEndInIdle) {
-    {
-        InProcessArmClient* client = conference.CreateClient(loop, 7);
+TEST_F(SessionTest, AttachAndEnrollFailuresEndInIdle) {
+    struct Case {
+        const char* step;
+        std::optional<ArmOperation> call;
+        std::optional<ArmConfirmation> refusal;
+        int code;
+        std::size_t enrolls;
+        const char* error;
+    };
+    const auto none = std::nullopt;
+    const Case cases[] = {
+        {"attach call", ArmOperation::ApeAttach, none, 5, 0,
+         "CChatClient::m_pArmClient->Attach user failed, nRetCode=5, nRetCode"},
+        {"attach confirmation", none, ArmConfirmation::ApeAttachConfirm, 3, 0, nullptr},
+        {"enroll call", ArmOperation::ApeEnroll, none, 9, 1,
+         "CChatClient::ApeEnroll failed. nRetCode = 9. "},
+        {"enroll confirmation", none, ArmConfirmation::ApeEnrollConfirm, 4, 1, nullptr},
+        {"resource status", none, ArmConfirmation::EnrollResourceStatus, 4, 1, nullptr},
+    };
+    std::uint32_t node = 7;
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.step);
+        InProcessArmClient* client = conference.CreateClient(loop, node);
         SpyArmClient spy(client);
-        client->FailNext(ArmOperation::ApeAttach, 5);
+        if (c.call) client->FailNext(*c.call, c.code);
+        if (c.refusal) client->ConfirmNextWith(*c.refusal, c.code);
         TraceCapture capture;
         CChatClient engine;
-        engine.Initialize(Data(&spy, 7, "Alice"));
-        loop.RunUntilIdle();
-        EXPECT_EQ(engine.State(), kStateIdle);
-        EXPECT_EQ(spy.Count("ApeEnroll"), 0u);
-        EXPECT_TRUE(capture.Has(TraceLevel::Error,
-                                "CChatClient::m_pArmClient->Attach user failed, nRetCode=5, "
-                                "nRetCode"));
-    }
-    {
-        InProcessArmClient* client = conference.CreateClient(loop, 8);
-        SpyArmClient spy(client);
-        client->ConfirmNextWith(ArmConfirmation::ApeAttachConfirm, 3);
-        CChatClient engine;
-        engine.Initialize(Data(&spy, 8, "Bob"));
-        loop.RunUntilIdle();
-        EXPECT_EQ(engine.State(), kStateIdle);
-        EXPECT_TRUE(spy.Released());
-        EXPECT_EQ(spy.Count("ApeEnroll"), 0u);
-    }
-}
-
-TEST_F(SessionTest, EnrollFailureAndRefusalReleaseTheServiceAndClearEnrolled) {
-    {
-        InProcessArmClient* client = conference.CreateClient(loop, 7);
-        SpyArmClient spy(client);
-        client->FailNext(ArmOperation::ApeEnroll, 9);
-        TraceCapture capture;
-        CChatClient engine;
-        engine.Initialize(Data(&spy, 7, "Alice"));
-        loop.RunUntilIdle();
-        EXPECT_EQ(engine.State(), kStateIdle);
-        EXPECT_TRUE(
-            capture.Has(TraceLevel::Error, "CChatClient::ApeEnroll failed. nRetCode = 9. "));
-    }
-    for (ArmConfirmation refusal :
-         {ArmConfirmation::ApeEnrollConfirm, ArmConfirmation::EnrollResourceStatus}) {
-        InProcessArmClient* client = conference.CreateClient(loop, 8);
-        SpyArmClient spy(client);
-        client->ConfirmNextWith(refusal, 4);
-        CChatClient engine;
-        engine.Initialize(Data(&spy, 8, "Bob"));
+        engine.Initialize(Data(&spy, node++, "Bob"));
         loop.RunUntilIdle();
         EXPECT_EQ(engine.State(), kStateIdle);
         EXPECT_EQ(engine.Enrolled(), 0);
-        EXPECT_TRUE(spy.Released());
+        EXPECT_EQ(spy.Count("ApeEnroll"), c.enrolls);
         EXPECT_EQ(spy.Count("AllocNameHandle"), 0u);
+        EXPECT_TRUE(!c.error || capture.Has(TraceLevel::Error, c.error));
+        if (!c.refusal) continue;
+        EXPECT_TRUE(spy.Released());
         // Roles change after the refusal: the tick must not reach for the released service.
         engine.SetRosters(ROLE_HOST, 0);
         loop.AdvanceBy(5.0);
-        EXPECT_EQ(spy.Count("ApeEnroll"), 1u);
+        EXPECT_EQ(spy.Count("ApeEnroll"), c.enrolls);
     }
 }
 
@@ -443,7 +378,7 @@ TEST_F(SessionTest, CleanupIsSafeTwiceAndReleasesOnce) {
     EXPECT_EQ(engine.ChatUI(), nullptr);
     EXPECT_EQ(engine.RecoveryMgr(), nullptr);
     EXPECT_EQ(engine.ArmClient(), nullptr);
-    EXPECT_EQ(Prefix(std::vector<std::string>(spy.Calls().end() - 4, spy.Calls().end()), 4),
+    EXPECT_EQ(std::vector<std::string>(spy.Calls().end() - 4, spy.Calls().end()),
               (std::vector<std::string>{"ApeDetach", "ConferenceLeave", "Destroy", "Release"}));
 }
 
