@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <cstdint>
+#include <map>
 #include <memory>
 #include <string>
 #include <vector>
@@ -100,37 +101,40 @@ struct Options {
     std::uint32_t features = 0;
 };
 
+// Commands that name one menu position, by verb; others not described here keep their names.
 inline std::string Describe(const RecordedCommand& c) {
+    static const std::map<int, std::string> kAtIndex = {
+        {msg_RemoveMenuItem, "remove"},
+        {msg_SelectedUserLeft, "left"},
+        {msg_SelectMenuItem, "select"},
+        {msg_SelectMenuItemAndAllowInput, "select+input"},
+        {msg_AllowUserInput, "input"}};
     const std::string index = std::to_string(c.index);
-    const std::string title = c.entry.bSeparator ? "---" : c.entry.strTitle;
-    switch (c.id) {
-        case msg_InsertMenuItem:
-            return "insert " + index + " " + title;
-        case msg_RemoveMenuItem:
-            return "remove " + index;
-        case msg_SelectedUserLeft:
-            return "left " + index;
-        case msg_RenameMenuItem:
-            return "rename " + index + " " + c.text;
-        case msg_SelectMenuItem:
-            return "select " + index;
-        case msg_SelectMenuItemAndAllowInput:
-            return "select+input " + index;
-        case msg_UpdateMenuItem:
-            return "update " + index + (c.entry.bEnabled ? " on" : " off");
-        case msg_RebuildMenu:
-            return "rebuild";
-        case msg_AllowUserInput:
-            return "input " + index;
-        case msg_EnableUserList:
-            return "enable list";
-        case msg_DisableUserList:
-            return "disable list";
-        case msg_ClearInput:
-            return "clear input";
-        default:
-            return c.name;
-    }
+    if (kAtIndex.count(c.id)) return kAtIndex.at(c.id) + " " + index;
+    if (c.id == msg_InsertMenuItem)
+        return "insert " + index + " " + (c.entry.bSeparator ? "---" : c.entry.strTitle);
+    if (c.id == msg_RenameMenuItem) return "rename " + index + " " + c.text;
+    if (c.id == msg_UpdateMenuItem) return "update " + index + (c.entry.bEnabled ? " on" : " off");
+    return c.name;
+}
+
+// Has the engine add one group, or a separator (type 2).
+inline void AddGroup(CChatClient& engine, std::uint32_t index, std::uint32_t type, std::uint32_t id,
+                     const char* name, int intoMenu = 1) {
+    _tagChatGroupInfo info{};
+    info.dwIndex = index;
+    info.dwGroupType = type;
+    info.dwGroupId = id;
+    info.cszGroupName = name;
+    engine.AddGroup(&info, intoMenu);
+}
+
+// The menu as titles; separators as "---", the selected entry marked with "*".
+inline std::vector<std::string> Titles(const CChatClient& engine) {
+    std::vector<std::string> titles;
+    for (const MenuStatus& e : engine.Menu())
+        titles.push_back((e.bSelected ? "*" : "") + (e.bSeparator ? "---" : e.strTitle));
+    return titles;
 }
 
 class MenuHarness {
@@ -153,43 +157,30 @@ public:
 
     // Appends group entries (and "---" separators) to the menu.
     void Seed(const std::vector<std::pair<std::string, std::uint32_t>>& groups) {
-        for (const auto& group : groups) {
-            const bool separator = group.first == "---";
-            _tagChatGroupInfo info{};
-            info.dwIndex = 1000;
-            info.dwGroupType = separator ? 2 : 1;
-            info.dwGroupId = separator ? 0 : group.second;
-            info.cszGroupName = separator ? nullptr : group.first.c_str();
-            engine.AddGroup(&info, 1);
+        for (const auto& g : groups) {
+            const bool separator = g.first == "---";
+            AddGroup(engine, 1000, separator ? 2 : 1, g.second,
+                     separator ? nullptr : g.first.c_str());
         }
     }
 
+    // One record of this session holding the entries, reported as added, deleted or modified.
+    void Report(std::vector<ReportEntry> entries, std::uint32_t added, std::uint32_t deleted,
+                std::uint32_t modified) {
+        RosterReport report;
+        report.Record(kSession, std::move(entries));
+        engine.ApeRosterChanged(1, 0, added, deleted, modified, report.Records());
+    }
     void Enroll(const std::vector<Person>& people) {
         std::vector<ReportEntry> entries;
         for (const Person& p : people)
             entries.push_back(EntryFor(p));
-        RosterReport report;
-        report.Record(kSession, entries);
-        engine.ApeRosterChanged(1, 0, 1, 0, 0, report.Records());
+        Report(entries, 1, 0, 0);
     }
-    void Leave(const Person& person) {
-        RosterReport report;
-        report.Record(kSession, {EntryFor(person)});
-        engine.ApeRosterChanged(1, 0, 0, 1, 0, report.Records());
-    }
-    void Modify(const Person& person) {
-        RosterReport report;
-        report.Record(kSession, {EntryFor(person)});
-        engine.ApeRosterChanged(1, 0, 0, 0, 1, report.Records());
-    }
+    void Leave(const Person& person) { Report({EntryFor(person)}, 0, 1, 0); }
+    void Modify(const Person& person) { Report({EntryFor(person)}, 0, 0, 1); }
 
-    // The menu as titles; separators as "---", the selected entry marked with "*".
-    std::vector<std::string> Titles() const {
-        std::vector<std::string> titles;
-        for (const MenuStatus& e : engine.Menu())
-            titles.push_back((e.bSelected ? "*" : "") + (e.bSeparator ? "---" : e.strTitle));
-        return titles;
-    }
+    std::vector<std::string> Titles() const { return menutest::Titles(engine); }
     // The commands the window saw since the last call, described.
     std::vector<std::string> Commands() {
         std::vector<std::string> out;

