@@ -50,10 +50,15 @@ protected:
         std::uint32_t ape = 0;
     };
 
-    Member& Connected(std::uint32_t nodeId) {
+    // A service object that has not connected yet.
+    Member& Fresh(std::uint32_t nodeId) {
         Member& m = m_members.emplace_back();
         m.client = m_conference.CreateClient(m_loop, nodeId);
         m.sink = std::make_unique<ArmRecorder>(m.client);
+        return m;
+    }
+    Member& Connected(std::uint32_t nodeId) {
+        Member& m = Fresh(nodeId);
         EXPECT_EQ(0, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
         m_loop.RunUntilIdle();
         return m;
@@ -119,9 +124,7 @@ TEST_F(InProcessConferenceTest, FailedCallsReturnTheChosenResultAndDoNothing) {
     EXPECT_EQ(0, a.client->ApeSendData(a.ape, a.client->UserId(), 1, "x", 1, 1, 1));
 
     // A result of 0 claims success, but no answer ever comes.
-    Member& b = m_members.emplace_back();
-    b.client = m_conference.CreateClient(m_loop, 12);
-    b.sink = std::make_unique<ArmRecorder>(b.client);
+    Member& b = Fresh(12);
     b.client->FailNext(ArmOperation::Connect, 0);
     EXPECT_EQ(0, b.client->Connect(b.sink.get(), "b", 0, 0, 0));
     m_loop.RunUntilIdle();
@@ -129,18 +132,14 @@ TEST_F(InProcessConferenceTest, FailedCallsReturnTheChosenResultAndDoNothing) {
 }
 
 TEST_F(InProcessConferenceTest, InjectedResultsThatTellTheStateMakeItSo) {
-    Member& pending = m_members.emplace_back();
-    pending.client = m_conference.CreateClient(m_loop, 11);
-    pending.sink = std::make_unique<ArmRecorder>(pending.client);
+    Member& pending = Fresh(11);
     pending.client->FailNext(ArmOperation::Connect, kArmConnectPending);
     EXPECT_EQ(kArmConnectPending, pending.client->Connect(pending.sink.get(), "p", 0, 0, 0));
     m_loop.RunUntilIdle();
     EXPECT_EQ(std::vector<std::string>({"ConnectConfirm"}), pending.sink->Names());
 
     // Told "already connected" and "already joined", a caller goes on to attach at once.
-    Member& m = m_members.emplace_back();
-    m.client = m_conference.CreateClient(m_loop, 12);
-    m.sink = std::make_unique<ArmRecorder>(m.client);
+    Member& m = Fresh(12);
     m.client->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
     m.client->FailNext(ArmOperation::ConferenceJoin, kArmAlreadyJoined);
     EXPECT_EQ(kArmAlreadyConnected, m.client->Connect(m.sink.get(), "m", 0, 0, 0));
@@ -152,9 +151,7 @@ TEST_F(InProcessConferenceTest, InjectedResultsThatTellTheStateMakeItSo) {
 }
 
 TEST_F(InProcessConferenceTest, ConnectRetriesEndWhenTheInjectedResultsRunOut) {
-    Member& m = m_members.emplace_back();
-    m.client = m_conference.CreateClient(m_loop, 11);
-    m.sink = std::make_unique<ArmRecorder>(m.client);
+    Member& m = Fresh(11);
     // Like the component: connect again whenever the confirmation says 19.
     m.sink->SetHook([&m](const ArmEvent& event) {
         if (event.name == "ConnectConfirm" && event.result == kArmRetry) {
@@ -302,9 +299,7 @@ TEST_F(InProcessConferenceTest, InjectedDeliveriesArriveExactlyAsCrafted) {
 }
 
 TEST_F(InProcessConferenceTest, RequestsOutsideTheirStateAreRefused) {
-    Member& fresh = m_members.emplace_back();
-    fresh.client = m_conference.CreateClient(m_loop, 10);
-    fresh.sink = std::make_unique<ArmRecorder>();
+    Member& fresh = Fresh(10);
     EXPECT_EQ(kArmNotConnected, fresh.client->ConferenceJoin(0, kConference, fresh.sink.get(), 3));
     Member& a = Connected(11);
     EXPECT_EQ(kArmNoSuchConference, a.client->ConferenceJoin(0, 99, a.sink.get(), 3));
