@@ -120,26 +120,20 @@ TEST(InsertChatUserName, PrivateOnlyAttendeeInputFollowsParticipantEntries) {
     EXPECT_EQ(h.Commands(), Strings({"remove 1", "input 0", "msg_ClearInput"}));
 }
 
-TEST(InsertChatUserName, ReplacesADisabledSelection) {
+TEST(SetGroupMenuEnable, TellsOnlyOfChangesAndAnInsertReplacesADisabledSelection) {
     MenuHarness h({1});
     h.Seed({{"All Attendees", 8}, {"Host", 1}});
     h.engine.SelectMenuItemByIndex(0);
-    h.engine.SetGroupMenuEnable(8, false);
     h.Commands();
+    h.engine.SetGroupMenuEnable(8, false);
+    h.engine.SetGroupMenuEnable(8, false);
+    h.engine.SetGroupMenuEnable(4, false);  // no such entry
+    EXPECT_EQ(h.Commands(), Strings({"update 0 off"}));
     h.engine.InsertChatUserName("bob", 201, 0);
     EXPECT_EQ(h.Titles(), Strings({"All Attendees", "*bob", "Host"}));
     EXPECT_EQ(h.Commands(), Strings({"insert 1 bob", "select 1"}));
-}
-
-TEST(SetGroupMenuEnable, TellsTheWindowOnlyOfChanges) {
-    MenuHarness h({1});
-    h.Seed({{"Host", 1}, {"All Attendees", 8}});
-    h.Commands();
-    h.engine.SetGroupMenuEnable(8, false);
-    h.engine.SetGroupMenuEnable(8, false);
-    h.engine.SetGroupMenuEnable(4, false);
     h.engine.SetGroupMenuEnable(8, true);
-    EXPECT_EQ(h.Commands(), Strings({"update 1 off", "update 1 on"}));
+    EXPECT_EQ(h.Commands(), Strings({"update 0 on"}));
 }
 
 TEST(RemoveChatUserName, TidiesSeparatorsAndFallsBack) {
