@@ -120,11 +120,7 @@ TEST_F(TranscriptTest, OpeningShowsEveryEntryAndMarksOnlyATranscriptThatHadEntri
 TEST_F(TranscriptTest, SavedFileHoldsExactlyTheTranscriptAndOpensBackTheSame) {
     LoadThree();
     SaveAs(dir.File("saved.txt"));
-    const std::string expected =
-        "\xEF\xBB\xBF"
-        "03/05/2009    09:03:07 AM    from Ann to All Participants:\r\thello\n"
-        "03/05/2009    14:05:09 PM    from Bo to Host (privately):\r\tsee \xC3\xA9 you\n"
-        "12/31/2010    00:15:00 AM    from Cy to All Attendees:\r\tbye\n";
+    const std::string expected = kTwoEntries + kThird;  // one mark, then the entries as read
     EXPECT_EQ(FileBytes(dir.File("saved.txt")), expected);
     EXPECT_EQ(host.events, std::vector<std::string>{"modified 0"});
     EXPECT_EQ(engine.ChatFilePath(), dir.File("saved.txt"));
