@@ -47,13 +47,16 @@ struct ContractParticipant {
     std::uint32_t userId = 0;
 };
 
-class ConferenceContract : public testing::TestWithParam<ConferenceHarnessFactory> {
+// Drives the participants of one harness's conference: the contract suite and an
+// implementation's own tests share it.
+class ConferenceDriver {
 protected:
     static constexpr std::uint32_t kSession = 7;
 
-    void SetUp() override { m_harness = GetParam().make(); }
     void Run() { m_harness->RunUntilIdle(); }
 
+    // A participant's service object that has not connected yet.
+    ContractParticipant& Fresh(std::uint32_t nodeId);
     // A participant that connected, joined and attached.
     ContractParticipant& Attached(std::uint32_t nodeId);
     // Enrolls p in session with payload; returns the ApeEnroll result.
@@ -73,4 +76,13 @@ protected:
     std::deque<ContractParticipant> m_participants;
 };
 
+class ConferenceContract : public testing::TestWithParam<ConferenceHarnessFactory>,
+                           protected ConferenceDriver {
+protected:
+    using ConferenceDriver::Run;  // not the test's own Run
+    void SetUp() override { m_harness = GetParam().make(); }
+};
+
 std::vector<std::uint8_t> ContractBytes(const std::string& text);
+// "+7[11:1001:alpha] -7[...] ~7[...]": a roster change in one line.
+std::string DescribeRoster(const RosterChange& change);

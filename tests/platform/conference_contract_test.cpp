@@ -8,8 +8,29 @@ namespace {
 
 constexpr const char* kSessionResource = "c_session_id";
 
-// "+7[11:1001:alpha] -7[...] ~7[...]": a roster change in one line.
-std::string Describe(const RosterChange& change) {
+std::string Entry(const ContractParticipant& p, const std::string& payload) {
+    return "[" + std::to_string(p.nodeId) + ":" + std::to_string(p.userId) + ":" + payload + "]";
+}
+
+std::vector<std::string> Rosters(const ContractParticipant& p) {
+    std::vector<std::string> changes;
+    for (const ArmEvent& event : p.sink->Named("ApeRosterChanged")) {
+        changes.push_back(DescribeRoster(event.roster));
+    }
+    return changes;
+}
+
+std::string Text(const std::vector<std::uint8_t>& bytes) {
+    return std::string(bytes.begin(), bytes.end());
+}
+
+}  // namespace
+
+std::vector<std::uint8_t> ContractBytes(const std::string& text) {
+    return std::vector<std::uint8_t>(text.begin(), text.end());
+}
+
+std::string DescribeRoster(const RosterChange& change) {
     std::string text;
     const auto add = [&text](char sign, const std::vector<RosterRecord>& records) {
         for (const RosterRecord& record : records) {
@@ -27,33 +48,16 @@ std::string Describe(const RosterChange& change) {
     return text;
 }
 
-std::string Entry(const ContractParticipant& p, const std::string& payload) {
-    return "[" + std::to_string(p.nodeId) + ":" + std::to_string(p.userId) + ":" + payload + "]";
-}
-
-std::vector<std::string> Rosters(const ContractParticipant& p) {
-    std::vector<std::string> changes;
-    for (const ArmEvent& event : p.sink->Named("ApeRosterChanged")) {
-        changes.push_back(Describe(event.roster));
-    }
-    return changes;
-}
-
-std::string Text(const std::vector<std::uint8_t>& bytes) {
-    return std::string(bytes.begin(), bytes.end());
-}
-
-}  // namespace
-
-std::vector<std::uint8_t> ContractBytes(const std::string& text) {
-    return std::vector<std::uint8_t>(text.begin(), text.end());
-}
-
-ContractParticipant& ConferenceContract::Attached(std::uint32_t nodeId) {
+ContractParticipant& ConferenceDriver::Fresh(std::uint32_t nodeId) {
     ContractParticipant& p = m_participants.emplace_back();
     p.nodeId = nodeId;
     p.client = m_harness->NewClient(nodeId);
     p.sink = std::make_unique<ArmRecorder>(p.client);
+    return p;
+}
+
+ContractParticipant& ConferenceDriver::Attached(std::uint32_t nodeId) {
+    ContractParticipant& p = Fresh(nodeId);
     EXPECT_EQ(0, p.client->Connect(p.sink.get(), "user", 0, 0, 0));
     Run();
     EXPECT_EQ(0, p.client->ConferenceJoin(0, m_harness->ConferenceId(), p.sink.get(), 3));
@@ -66,14 +70,14 @@ ContractParticipant& ConferenceContract::Attached(std::uint32_t nodeId) {
     return p;
 }
 
-int ConferenceContract::Enroll(ContractParticipant& p, const std::string& payload,
-                               std::uint32_t session) {
+int ConferenceDriver::Enroll(ContractParticipant& p, const std::string& payload,
+                             std::uint32_t session) {
     ARMSessionResource resource{1, kSessionResource, 1, 0, 0};
     return p.client->ApeEnroll(p.ape, 1, session, 0, 1, &resource, payload.data(),
                                static_cast<std::uint32_t>(payload.size()), 3);
 }
 
-std::uint32_t ConferenceContract::Handle(ContractParticipant& p, const std::string& name) {
+std::uint32_t ConferenceDriver::Handle(ContractParticipant& p, const std::string& name) {
     NameHandle entry{};
     std::memcpy(entry.name, name.data(), std::min(name.size(), sizeof entry.name));
     EXPECT_EQ(0, p.client->AllocNameHandle(p.ape, 1, &entry, p.sink.get()));
@@ -84,8 +88,8 @@ std::uint32_t ConferenceContract::Handle(ContractParticipant& p, const std::stri
     return confirms.back().handles[0].handle_value;
 }
 
-int ConferenceContract::Write(ContractParticipant& p, std::uint32_t cache, tagCacheAction action,
-                              const std::vector<std::uint8_t>* bytes) {
+int ConferenceDriver::Write(ContractParticipant& p, std::uint32_t cache, tagCacheAction action,
+                            const std::vector<std::uint8_t>* bytes) {
     std::uint32_t mem = 0;
     if (bytes != nullptr) {
         std::uint32_t size = static_cast<std::uint32_t>(bytes->size());
@@ -100,20 +104,18 @@ int ConferenceContract::Write(ContractParticipant& p, std::uint32_t cache, tagCa
     return result;
 }
 
-int ConferenceContract::Request(ContractParticipant& p, std::uint32_t cache,
-                                tagCacheRequestType type) {
+int ConferenceDriver::Request(ContractParticipant& p, std::uint32_t cache,
+                              tagCacheRequestType type) {
     return p.client->ApeRequestSharedDataEx(p.ape, cache, 0, type, 255, p.sink.get());
 }
 
-void ConferenceContract::Release(ContractParticipant& p) {
+void ConferenceDriver::Release(ContractParticipant& p) {
     EXPECT_EQ(0, p.client->Release());
     p.client = nullptr;
 }
 
 TEST_P(ConferenceContract, ConnectJoinAndAttachAnswerLaterAndRepeatsAnswerTheSame) {
-    ContractParticipant& p = m_participants.emplace_back();
-    p.client = m_harness->NewClient(11);
-    p.sink = std::make_unique<ArmRecorder>(p.client);
+    ContractParticipant& p = Fresh(11);
     const std::uint16_t conference = m_harness->ConferenceId();
 
     ASSERT_EQ(0, p.client->Connect(p.sink.get(), "Ann", 0, 0, 0));

@@ -10,6 +10,8 @@
 
 namespace {
 
+constexpr std::uint16_t kConference = 5;
+
 // Every participant on a virtual loop of its own.
 class InProcessHarness final : public ConferenceHarness {
 public:
@@ -26,9 +28,10 @@ public:
                 ran += loop->RunUntilIdle();
         } while (ran > 0);
     }
+    InProcessConference& Conference() { return m_conference; }
 
 private:
-    InProcessConference m_conference{5};
+    InProcessConference m_conference{kConference};
     std::vector<std::unique_ptr<VirtualRunLoop>> m_loops;
 };
 
@@ -38,129 +41,86 @@ INSTANTIATE_TEST_SUITE_P(
                                              [] { return std::make_unique<InProcessHarness>(); }}),
     [](const testing::TestParamInfo<ConferenceHarnessFactory>& info) { return info.param.name; });
 
-constexpr std::uint32_t kSession = 3;
-constexpr std::uint16_t kConference = 1;
-
-// Participants sharing one virtual loop, with the in-process object's own controls at hand.
-class InProcessConferenceTest : public testing::Test {
+// The contract's participants, with the in-process object's own controls at hand.
+class InProcessConferenceTest : public testing::Test, protected ConferenceDriver {
 protected:
-    struct Member {
-        InProcessArmClient* client;
-        std::unique_ptr<ArmRecorder> sink;
-        std::uint32_t ape = 0;
-    };
-
-    // A service object that has not connected yet.
-    Member& Fresh(std::uint32_t nodeId) {
-        Member& m = m_members.emplace_back();
-        m.client = m_conference.CreateClient(m_loop, nodeId);
-        m.sink = std::make_unique<ArmRecorder>(m.client);
-        return m;
+    using ConferenceDriver::Run;  // not the test's own Run
+    void SetUp() override { m_harness = std::make_unique<InProcessHarness>(); }
+    InProcessConference& Conference() {
+        return static_cast<InProcessHarness&>(*m_harness).Conference();
     }
-    Member& Connected(std::uint32_t nodeId) {
-        Member& m = Fresh(nodeId);
-        EXPECT_EQ(0, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
-        m_loop.RunUntilIdle();
-        return m;
+    static InProcessArmClient* Ctl(const ContractParticipant& p) {
+        return static_cast<InProcessArmClient*>(p.client);
     }
-    Member& Attached(std::uint32_t nodeId) {
-        Member& m = Connected(nodeId);
-        EXPECT_EQ(0, m.client->ConferenceJoin(0, kConference, m.sink.get(), 3));
-        EXPECT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &m.ape));
-        m_loop.RunUntilIdle();
-        m.sink->Clear();
-        return m;
+    ContractParticipant& Connected(std::uint32_t nodeId) {
+        ContractParticipant& p = Fresh(nodeId);
+        EXPECT_EQ(0, p.client->Connect(p.sink.get(), "user", 0, 0, 0));
+        Run();
+        return p;
     }
-    int Enroll(Member& m, const char* payload) {
-        ARMSessionResource resource{1, "c_session_id", 1, 0, 0};
-        return m.client->ApeEnroll(m.ape, 1, kSession, 0, 1, &resource, payload,
-                                   static_cast<std::uint32_t>(std::strlen(payload)), 3);
-    }
-    std::uint32_t Handle(Member& m, const char* name) {
-        NameHandle entry{};
-        std::memcpy(entry.name, name, std::min(std::strlen(name), sizeof entry.name));
-        EXPECT_EQ(0, m.client->AllocNameHandle(m.ape, 1, &entry, m.sink.get()));
-        m_loop.RunUntilIdle();
-        const std::vector<ArmEvent> confirms = m.sink->Named("AllocNameHandleConfirm");
-        m.sink->Clear();
-        return confirms.empty() ? 0 : confirms.back().handles.at(0).handle_value;
-    }
-    int Append(Member& m, std::uint32_t cache, const char* text) {
-        std::uint32_t mem = 0, size = static_cast<std::uint32_t>(std::strlen(text));
-        EXPECT_EQ(0, m.client->AllocMemHandle(size, &mem));
-        EXPECT_EQ(0, m.client->WriteMemHandle(mem, 0, text, &size));
-        const int result =
-            m.client->ApeSharedDataActionEx(m.ape, cache, 0, 0, CACHE_APPEND, 0x2000000, mem, 0, 1);
-        m.client->FreeMemHandle(mem);
-        return result;
-    }
-
-    VirtualRunLoop m_loop;
-    InProcessConference m_conference{kConference};
-    std::deque<Member> m_members;
 };
 
 }  // namespace
 
 TEST_F(InProcessConferenceTest, FailedCallsReturnTheChosenResultAndDoNothing) {
-    Member& a = Attached(11);
-    a.client->FailNext(ArmOperation::ApeEnroll, 1);
+    ContractParticipant& a = Attached(11);
+    Ctl(a)->FailNext(ArmOperation::ApeEnroll, 1);
     EXPECT_EQ(1, Enroll(a, "x"));
-    m_loop.RunUntilIdle();
+    Run();
     EXPECT_TRUE(a.sink->Events().empty());
     EXPECT_EQ(0, Enroll(a, "x"));
 
     std::uint32_t mem = 0;
-    a.client->FailNext(ArmOperation::AllocMemHandle, 7, 2);
+    Ctl(a)->FailNext(ArmOperation::AllocMemHandle, 7, 2);
     EXPECT_EQ(7, a.client->AllocMemHandle(4, &mem));
     EXPECT_EQ(7, a.client->AllocMemHandle(4, &mem));
-    EXPECT_EQ(0u, a.client->MemHandleCount());
+    EXPECT_EQ(0u, Ctl(a)->MemHandleCount());
     EXPECT_EQ(0, a.client->AllocMemHandle(4, &mem));
 
-    a.client->FailAlways(ArmOperation::ApeSendData, 9);
+    Ctl(a)->FailAlways(ArmOperation::ApeSendData, 9);
     for (int i = 0; i < 3; ++i)
         EXPECT_EQ(9, a.client->ApeSendData(a.ape, 1001, 1, "x", 1, 1, 1));
-    a.client->ClearFaults();
-    EXPECT_EQ(0, a.client->ApeSendData(a.ape, a.client->UserId(), 1, "x", 1, 1, 1));
+    Ctl(a)->ClearFaults();
+    EXPECT_EQ(0, a.client->ApeSendData(a.ape, a.userId, 1, "x", 1, 1, 1));
 
     // A result of 0 claims success, but no answer ever comes.
-    Member& b = Fresh(12);
-    b.client->FailNext(ArmOperation::Connect, 0);
+    ContractParticipant& b = Fresh(12);
+    Ctl(b)->FailNext(ArmOperation::Connect, 0);
     EXPECT_EQ(0, b.client->Connect(b.sink.get(), "b", 0, 0, 0));
-    m_loop.RunUntilIdle();
+    Run();
     EXPECT_EQ(0u, b.sink->Count("ConnectConfirm"));
 }
 
 TEST_F(InProcessConferenceTest, InjectedResultsThatTellTheStateMakeItSo) {
-    Member& pending = Fresh(11);
-    pending.client->FailNext(ArmOperation::Connect, kArmConnectPending);
+    ContractParticipant& pending = Fresh(11);
+    Ctl(pending)->FailNext(ArmOperation::Connect, kArmConnectPending);
     EXPECT_EQ(kArmConnectPending, pending.client->Connect(pending.sink.get(), "p", 0, 0, 0));
-    m_loop.RunUntilIdle();
+    Run();
     EXPECT_EQ(std::vector<std::string>({"ConnectConfirm"}), pending.sink->Names());
 
     // Told "already connected" and "already joined", a caller goes on to attach at once.
-    Member& m = Fresh(12);
-    m.client->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
-    m.client->FailNext(ArmOperation::ConferenceJoin, kArmAlreadyJoined);
+    ContractParticipant& m = Fresh(12);
+    Ctl(m)->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
+    Ctl(m)->FailNext(ArmOperation::ConferenceJoin, kArmAlreadyJoined);
     EXPECT_EQ(kArmAlreadyConnected, m.client->Connect(m.sink.get(), "m", 0, 0, 0));
     EXPECT_EQ(kArmAlreadyJoined, m.client->ConferenceJoin(0, kConference, m.sink.get(), 3));
     ASSERT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &m.ape));
-    m_loop.RunUntilIdle();
+    Run();
     EXPECT_EQ(std::vector<std::string>({"ApeAttachConfirm"}), m.sink->Names());
     EXPECT_EQ(kArmAlreadyConnected, m.client->Connect(m.sink.get(), "m", 0, 0, 0));
 }
 
 TEST_F(InProcessConferenceTest, ConnectRetriesEndWhenTheInjectedResultsRunOut) {
-    Member& m = Fresh(11);
+    ContractParticipant& m = Fresh(11);
     // Like the component: connect again whenever the confirmation says 19.
     m.sink->SetHook([&m](const ArmEvent& event) {
         if (event.name == "ConnectConfirm" && event.result == kArmRetry) {
             EXPECT_EQ(0, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
         }
     });
-    m.client->ConfirmNextWith(ArmConfirmation::ConnectConfirm, kArmRetry, 2);
+    Ctl(m)->ConfirmNextWith(ArmConfirmation::ConnectConfirm, kArmRetry, 2);
     ASSERT_EQ(0, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
-    m_loop.RunUntilIdle();
+    Run();
     std::vector<short> results;
     for (const ArmEvent& event : m.sink->Named("ConnectConfirm"))
         results.push_back(event.result);
@@ -169,17 +129,17 @@ TEST_F(InProcessConferenceTest, ConnectRetriesEndWhenTheInjectedResultsRunOut) {
 }
 
 TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect) {
-    Member& a = Attached(11);
-    Member& b = Attached(12);
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
     ASSERT_EQ(0, Enroll(b, "b"));
-    m_loop.RunUntilIdle();
+    Run();
     b.sink->Clear();
 
-    a.client->ConfirmNextWith(ArmConfirmation::ApeEnrollConfirm, 5);
+    Ctl(a)->ConfirmNextWith(ArmConfirmation::ApeEnrollConfirm, 5);
     ASSERT_EQ(0, Enroll(a, "a"));
-    a.client->ConfirmNextWith(ArmConfirmation::EnrollResourceStatus, 3);
+    Ctl(a)->ConfirmNextWith(ArmConfirmation::EnrollResourceStatus, 3);
     ASSERT_EQ(0, Enroll(a, "a"));
-    m_loop.RunUntilIdle();
+    Run();
     const std::vector<ArmEvent> enrolls = a.sink->Named("ApeEnrollConfirm");
     ASSERT_EQ(2u, enrolls.size());
     EXPECT_EQ(5, enrolls[0].result);
@@ -193,15 +153,16 @@ TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect
     const std::uint32_t cache = Handle(a, "70001_chat_status");
     ASSERT_EQ(0, b.client->ApeRequestSharedDataEx(b.ape, cache, 0, CACHE_REQUEST_SUBSCRIBE, 255,
                                                   b.sink.get()));
-    a.client->ConfirmNextWith(ArmConfirmation::ApeCacheActionConfirmEx, 7);
-    ASSERT_EQ(0, Append(a, cache, "1"));
-    a.client->ConfirmNextWith(ArmConfirmation::AllocNameHandleConfirm, 6);
+    Ctl(a)->ConfirmNextWith(ArmConfirmation::ApeCacheActionConfirmEx, 7);
+    const std::vector<std::uint8_t> one = ContractBytes("1");
+    ASSERT_EQ(0, Write(a, cache, CACHE_APPEND, &one));
+    Ctl(a)->ConfirmNextWith(ArmConfirmation::AllocNameHandleConfirm, 6);
     NameHandle entry{};
     std::strcpy(entry.name, "70001_chat_cache_1");
     ASSERT_EQ(0, a.client->AllocNameHandle(a.ape, 1, &entry, a.sink.get()));
     ASSERT_EQ(0, b.client->ApeRequestSharedDataEx(b.ape, cache, 0, CACHE_REQUEST_RETRIEVE, 255,
                                                   b.sink.get()));
-    m_loop.RunUntilIdle();
+    Run();
     const std::vector<ArmEvent> action = a.sink->Named("ApeCacheActionConfirmEx");
     ASSERT_EQ(1u, action.size());
     EXPECT_EQ(7, action[0].result);
@@ -216,16 +177,16 @@ TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect
 }
 
 TEST_F(InProcessConferenceTest, RefusedJoinAndAttachLeaveTheStateUnchanged) {
-    Member& m = Connected(11);
-    m.client->ConfirmNextWith(ArmConfirmation::ConferenceJoinConfirm, 2);
+    ContractParticipant& m = Connected(11);
+    Ctl(m)->ConfirmNextWith(ArmConfirmation::ConferenceJoinConfirm, 2);
     ASSERT_EQ(0, m.client->ConferenceJoin(0, kConference, m.sink.get(), 3));
     std::uint32_t ape = 77;
     EXPECT_EQ(kArmNotJoined, m.client->ApeAttach(m.sink.get(), 0, kConference, &ape));
     ASSERT_EQ(0, m.client->ConferenceJoin(0, kConference, m.sink.get(), 3));
-    m.client->ConfirmNextWith(ArmConfirmation::ApeAttachConfirm, 4);
+    Ctl(m)->ConfirmNextWith(ArmConfirmation::ApeAttachConfirm, 4);
     ASSERT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &ape));
     EXPECT_EQ(0u, ape);
-    m_loop.RunUntilIdle();
+    Run();
     const std::vector<ArmEvent> joins = m.sink->Named("ConferenceJoinConfirm");
     ASSERT_EQ(2u, joins.size());
     EXPECT_EQ(2, joins[0].result);
@@ -233,16 +194,16 @@ TEST_F(InProcessConferenceTest, RefusedJoinAndAttachLeaveTheStateUnchanged) {
     const std::vector<ArmEvent> attach = m.sink->Named("ApeAttachConfirm");
     ASSERT_EQ(1u, attach.size());
     EXPECT_EQ(4, attach[0].result);
-    EXPECT_EQ(0u, m.client->ApeHandle());
+    EXPECT_EQ(0u, Ctl(m)->ApeHandle());
     ASSERT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &ape));
     EXPECT_NE(0u, ape);
 }
 
 TEST_F(InProcessConferenceTest, InjectedDeliveriesArriveExactlyAsCrafted) {
-    Member& m = Attached(11);
-    ASSERT_EQ(0, m.client->RegisterSharedDataSink(m.ape, m.sink.get()));
+    ContractParticipant& m = Attached(11);
+    ASSERT_EQ(0, Ctl(m)->RegisterSharedDataSink(m.ape, m.sink.get()));
     const std::vector<std::uint8_t> notAPdu = {0xde, 0xad, 0x00, 0xbe};
-    EXPECT_TRUE(m.client->InjectPrivateData(4242, notAPdu));
+    EXPECT_TRUE(Ctl(m)->InjectPrivateData(4242, notAPdu));
 
     ArmCacheDelivery delivery;
     delivery.cacheId = 9;
@@ -252,16 +213,16 @@ TEST_F(InProcessConferenceTest, InjectedDeliveriesArriveExactlyAsCrafted) {
     delivery.senderId = 4242;
     delivery.value = 0x90;
     delivery.flags = 3;
-    EXPECT_TRUE(m.client->InjectCacheDelivery(delivery, notAPdu));
-    EXPECT_TRUE(m.client->InjectCacheDelivery(delivery, std::nullopt));
+    EXPECT_TRUE(Ctl(m)->InjectCacheDelivery(delivery, notAPdu));
+    EXPECT_TRUE(Ctl(m)->InjectCacheDelivery(delivery, std::nullopt));
 
     RosterChange change;
     change.added.push_back({kSession, {{21, 2001, {'a'}}, {22, 2002, {}}}});
     change.added.push_back({kSession + 9, {{23, 2003, {'c'}}}});
     change.modified.push_back({kSession, {{21, 2001, {'m'}}}});
-    EXPECT_TRUE(m.client->InjectRosterChange(change));
+    EXPECT_TRUE(Ctl(m)->InjectRosterChange(change));
     EXPECT_TRUE(m.sink->Events().empty());
-    m_loop.RunUntilIdle();
+    Run();
 
     ASSERT_EQ(std::vector<std::string>({"ApeDataIndication", "SharedDataReceivedEx",
                                         "SharedDataReceivedEx", "ApeRosterChanged"}),
@@ -281,30 +242,23 @@ TEST_F(InProcessConferenceTest, InjectedDeliveriesArriveExactlyAsCrafted) {
     }
     EXPECT_EQ(notAPdu, events[1].data);
     EXPECT_EQ(0u, events[2].memHandle);
-    const RosterChange& roster = events[3].roster;
-    ASSERT_EQ(2u, roster.added.size());
-    EXPECT_EQ(kSession + 9, roster.added[1].sessionId);
-    ASSERT_EQ(2u, roster.added[0].users.size());
-    EXPECT_EQ(2002u, roster.added[0].users[1].userId);
-    EXPECT_TRUE(roster.added[0].users[1].enrollInfo.empty());
-    EXPECT_TRUE(roster.deleted.empty());
-    ASSERT_EQ(1u, roster.modified.size());
-    EXPECT_EQ(std::vector<std::uint8_t>({'m'}), roster.modified[0].users[0].enrollInfo);
-    EXPECT_EQ(0u, m.client->MemHandleCount());
+    EXPECT_EQ("+7[21:2001:a][22:2002:] +16[23:2003:c] ~7[21:2001:m]",
+              DescribeRoster(events[3].roster));
+    EXPECT_EQ(0u, Ctl(m)->MemHandleCount());
 
-    InProcessArmClient* detached = Connected(12).client;
+    InProcessArmClient* detached = Ctl(Connected(12));
     EXPECT_FALSE(detached->InjectPrivateData(1, notAPdu));
     EXPECT_FALSE(detached->InjectCacheDelivery(delivery, notAPdu));
     EXPECT_FALSE(detached->InjectRosterChange(change));
 }
 
 TEST_F(InProcessConferenceTest, RequestsOutsideTheirStateAreRefused) {
-    Member& fresh = Fresh(10);
+    ContractParticipant& fresh = Fresh(10);
     EXPECT_EQ(kArmNotConnected, fresh.client->ConferenceJoin(0, kConference, fresh.sink.get(), 3));
-    Member& a = Connected(11);
+    ContractParticipant& a = Connected(11);
     EXPECT_EQ(kArmNoSuchConference, a.client->ConferenceJoin(0, 99, a.sink.get(), 3));
     EXPECT_EQ(kArmNotJoined, a.client->ConferenceLeave(0, kConference, a.sink.get()));
-    Member& b = Attached(12);
+    ContractParticipant& b = Attached(12);
     const std::uint32_t cache = Handle(b, "70001_chat_cache_15");
     std::uint32_t mem = 0;
     ASSERT_EQ(0, a.client->AllocMemHandle(2, &mem));
@@ -353,7 +307,7 @@ TEST_F(InProcessConferenceTest, RequestsOutsideTheirStateAreRefused) {
 }
 
 TEST_F(InProcessConferenceTest, MemoryReadsAndWritesAreClippedAtTheBlock) {
-    Member& m = Connected(11);
+    ContractParticipant& m = Connected(11);
     std::uint32_t mem = 0, size = 4;
     ASSERT_EQ(0, m.client->AllocMemHandle(4, &mem));
     ASSERT_EQ(0, m.client->WriteMemHandle(mem, 0, "abcd", &size));
@@ -375,13 +329,13 @@ TEST_F(InProcessConferenceTest, MemoryReadsAndWritesAreClippedAtTheBlock) {
 }
 
 TEST_F(InProcessConferenceTest, SendOptionMarksTheNextSendOnly) {
-    Member& a = Attached(11);
-    Member& b = Attached(12);
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
     const ARMSendOption option{a.ape, 0x92};
     ASSERT_EQ(0, a.client->SetSendOption(-200, &option));
-    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.client->UserId(), 1, "1", 1, 1, 1));
-    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.client->UserId(), 1, "2", 1, 1, 1));
-    m_loop.RunUntilIdle();
+    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.userId, 1, "1", 1, 1, 1));
+    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.userId, 1, "2", 1, 1, 1));
+    Run();
     const std::vector<ArmEvent> got = b.sink->Named("ApeDataIndication");
     ASSERT_EQ(2u, got.size());
     EXPECT_EQ(0x92, got[0].flags);
@@ -389,32 +343,33 @@ TEST_F(InProcessConferenceTest, SendOptionMarksTheNextSendOnly) {
 }
 
 TEST_F(InProcessConferenceTest, DestroyAndReleaseEndEverythingQuietly) {
-    Member& a = Attached(11);
-    Member& b = Attached(12);
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
     ASSERT_EQ(0, Enroll(a, "a"));
     ASSERT_EQ(0, Enroll(b, "b"));
-    m_loop.RunUntilIdle();
+    Run();
     b.sink->Clear();
-    ASSERT_EQ(0, a.client->ApeSendData(a.ape, a.client->UserId(), 1, "x", 1, 1, 1));
+    ASSERT_EQ(0, a.client->ApeSendData(a.ape, a.userId, 1, "x", 1, 1, 1));
     a.sink->Clear();
     ASSERT_EQ(0, a.client->Destroy(a.sink.get(), 1));
-    m_loop.RunUntilIdle();
+    Run();
     EXPECT_TRUE(a.sink->Events().empty());
     EXPECT_EQ(1u, b.sink->Count("ApeRosterChanged"));
-    EXPECT_EQ(0u, a.client->ApeHandle());
+    EXPECT_EQ(0u, Ctl(a)->ApeHandle());
     EXPECT_EQ(kArmNotConnected, a.client->ConferenceJoin(0, kConference, a.sink.get(), 3));
 
-    EXPECT_EQ(2u, m_conference.ClientCount());
+    EXPECT_EQ(2u, Conference().ClientCount());
     EXPECT_EQ(0, a.client->Release());
-    EXPECT_EQ(1u, m_conference.ClientCount());
+    EXPECT_EQ(1u, Conference().ClientCount());
 
     // A conference that ends with answers still posted delivers none of them.
+    VirtualRunLoop loop;
     ArmRecorder late;
     {
         InProcessConference gone(kConference);
-        InProcessArmClient* client = gone.CreateClient(m_loop, 13);
+        InProcessArmClient* client = gone.CreateClient(loop, 13);
         ASSERT_EQ(0, client->Connect(&late, "late", 0, 0, 0));
     }
-    EXPECT_GT(m_loop.RunUntilIdle(), 0u);
+    EXPECT_GT(loop.RunUntilIdle(), 0u);
     EXPECT_TRUE(late.Events().empty());
 }
