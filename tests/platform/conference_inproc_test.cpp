@@ -151,8 +151,7 @@ TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect
     EXPECT_TRUE(b.sink->Events().empty());
 
     const std::uint32_t cache = Handle(a, "70001_chat_status");
-    ASSERT_EQ(0, b.client->ApeRequestSharedDataEx(b.ape, cache, 0, CACHE_REQUEST_SUBSCRIBE, 255,
-                                                  b.sink.get()));
+    ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_SUBSCRIBE));
     Ctl(a)->ConfirmNextWith(ArmConfirmation::ApeCacheActionConfirmEx, 7);
     const std::vector<std::uint8_t> one = ContractBytes("1");
     ASSERT_EQ(0, Write(a, cache, CACHE_APPEND, &one));
@@ -160,8 +159,7 @@ TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect
     NameHandle entry{};
     std::strcpy(entry.name, "70001_chat_cache_1");
     ASSERT_EQ(0, a.client->AllocNameHandle(a.ape, 1, &entry, a.sink.get()));
-    ASSERT_EQ(0, b.client->ApeRequestSharedDataEx(b.ape, cache, 0, CACHE_REQUEST_RETRIEVE, 255,
-                                                  b.sink.get()));
+    ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_RETRIEVE));
     Run();
     const std::vector<ArmEvent> action = a.sink->Named("ApeCacheActionConfirmEx");
     ASSERT_EQ(1u, action.size());
