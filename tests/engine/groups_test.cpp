@@ -46,9 +46,8 @@ CUsersGroup* Append(CUsersGroupList& list, std::unique_ptr<CUsersGroup> group) {
 
 std::vector<std::uint32_t> Ids(const CUsersGroupList& list) {
     std::vector<std::uint32_t> ids;
-    for (std::int32_t i = 0; i < list.GetGroupsCount(); ++i) {
+    for (std::int32_t i = 0; i < list.GetGroupsCount(); ++i)
         ids.push_back(list.GetGroupByIndex(i)->GetGroupId());
-    }
     return ids;
 }
 
@@ -100,10 +99,9 @@ TEST(CUsersGroup, SetGroupRefusesIncompleteOrLyingData) {
                                {"null label", noLabel},
                                {"null name", noName}};
     // Every cut of the complete group ends too early.
-    for (std::size_t size = 1; size < kRoleGroupBytes.size(); ++size) {
+    for (std::size_t size = 1; size < kRoleGroupBytes.size(); ++size)
         cases.push_back(
             {"truncated", Bytes(kRoleGroupBytes.begin(), kRoleGroupBytes.begin() + size)});
-    }
     for (const Case& c : cases) {
         SCOPED_TRACE(std::string(c.what) + ", size " + std::to_string(c.data.size()));
         // The stream may read only the given bytes: a copy on the heap lets a sanitizer see

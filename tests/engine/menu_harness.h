@@ -9,6 +9,7 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "engine/chat_client.h"
@@ -56,35 +57,28 @@ class RosterReport {
 public:
     // Adds a record of the given session holding the entries.
     RosterReport& Record(std::uint32_t session, std::vector<ReportEntry> entries) {
-        m_entries.push_back(std::move(entries));
-        m_sessions.push_back(session);
+        m_entries.emplace_back(session, std::move(entries));
         return *this;
     }
     // The records, valid while the report lives and is not changed.
     ARMApeRoster* Records() {
-        m_users.clear();
+        m_users.assign(m_entries.size(), {});
         m_records.assign(m_entries.size(), ARMApeRoster{});
         for (std::size_t i = 0; i < m_entries.size(); ++i) {
-            m_users.emplace_back(m_entries[i].size());
-            for (std::size_t j = 0; j < m_entries[i].size(); ++j) {
-                const ReportEntry& e = m_entries[i][j];
-                ARMApeUser& u = m_users.back()[j];
-                u.dwNodeID = e.node;
-                u.dwUserID = e.user;
-                u.pEnrollInfo =
-                    e.withData ? reinterpret_cast<const std::uint8_t*>(e.bytes.data()) : nullptr;
-                u.nEnrollInfoLen = e.withData ? static_cast<std::int32_t>(e.bytes.size()) : -1;
+            for (const ReportEntry& e : m_entries[i].second) {
+                const auto* data = reinterpret_cast<const std::uint8_t*>(e.bytes.data());
+                m_users[i].push_back({e.node, e.user, e.withData ? data : nullptr,
+                                      e.withData ? static_cast<std::int32_t>(e.bytes.size()) : -1});
             }
-            m_records[i].dwSessionID = m_sessions[i];
-            m_records[i].wUserCount = static_cast<std::uint16_t>(m_entries[i].size());
-            m_records[i].pUsers = m_users.back().data();
+            m_records[i].dwSessionID = m_entries[i].first;
+            m_records[i].wUserCount = static_cast<std::uint16_t>(m_users[i].size());
+            m_records[i].pUsers = m_users[i].data();
         }
         return m_records.data();
     }
 
 private:
-    std::vector<std::vector<ReportEntry>> m_entries;
-    std::vector<std::uint32_t> m_sessions;
+    std::vector<std::pair<std::uint32_t, std::vector<ReportEntry>>> m_entries;
     std::vector<std::vector<ARMApeUser>> m_users;
     std::vector<ARMApeRoster> m_records;
 };

@@ -99,7 +99,6 @@ TEST(ProcessAddEnrollInfo, PrivateChatPrivilegeOrHostGivesEntries) {
     };
     const Case cases[] = {
         {"type 1 attendee without private chat", 1, 0x1, false, {"All Attendees"}},
-        {"type 2 attendee without private chat", 2, 0x1, false, {"All Attendees"}},
         {"type 1 attendee with private chat", 1, 0x8, false, {"All Attendees", "ann"}},
         {"type 1 host whatever the privilege", 1, 0, true, {"All Attendees", "ann"}},
         {"type 2 host whatever the privilege", 2, 0, true, {"All Attendees", "ann"}},

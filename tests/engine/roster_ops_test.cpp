@@ -30,9 +30,8 @@ Strings Groups(const CUsersGroupList& list) {
 // Menu entries as "title/group id", separators as "---".
 Strings Entries(const MenuStatusList& menu) {
     Strings entries;
-    for (const MenuStatus& e : menu) {
+    for (const MenuStatus& e : menu)
         entries.push_back(e.bSeparator ? "---" : e.strTitle + "/" + std::to_string(e.nGroupID));
-    }
     return entries;
 }
 
@@ -45,19 +44,7 @@ void Enrolled(CChatClient& engine) {
 
 }  // namespace
 
-TEST(RosterOps, PanelMeetingStartsWithTenGroupsAndFiveMenuEntries) {
-    TraceCapture capture;
-    MenuHarness h({3});
-    EXPECT_EQ(Groups(h.engine.GroupList()),
-              Strings({"1:1:Host", "1:2:Presenter", "1:3:Host & Presenter", "2:0:-",
-                       "1:8:All Attendees", "1:4:All Panelists", "2:0:-", "1:15:All Participants",
-                       "2:0:-", "1:16:Select an Attendee..."}));
-    EXPECT_EQ(Entries(h.engine.Menu()),
-              Strings({"Host/1", "Presenter/2", "Host & Presenter/3", "---", "All Panelists/4"}));
-    EXPECT_TRUE(capture.Has("Enter CChatClient::SetMeetingType = 3"));
-}
-
-TEST(RosterOps, OtherMeetingTypesBringGroupsOnlyInQMMode) {
+TEST(RosterOps, DefaultGroupsByMeetingTypeAndQMMode) {
     struct Case {
         std::int32_t meetingType;
         std::uint32_t features;
@@ -65,17 +52,21 @@ TEST(RosterOps, OtherMeetingTypesBringGroupsOnlyInQMMode) {
         Strings menu;
     };
     const Case cases[] = {
+        {3,
+         0,
+         {"1:1:Host", "1:2:Presenter", "1:3:Host & Presenter", "2:0:-", "1:8:All Attendees",
+          "1:4:All Panelists", "2:0:-", "1:15:All Participants", "2:0:-",
+          "1:16:Select an Attendee..."},
+         {"Host/1", "Presenter/2", "Host & Presenter/3", "---", "All Panelists/4"}},
         {1, 0, {}, {}},
         {1, FEATURE_QM_MODE, {"1:15:Everyone"}, {"Everyone/15"}},
         {2, FEATURE_QM_MODE, {}, {}},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(std::to_string(c.meetingType) + (c.features ? " QM" : ""));
-        CChatClient other;
-        other.SetMeetingType(c.meetingType);
-        other.SelectFeature(c.features, 0, 0, 0, 0, nullptr);
-        EXPECT_EQ(Groups(other.GroupList()), c.groups);
-        EXPECT_EQ(Entries(other.Menu()), c.menu);
+        MenuHarness h({c.meetingType, false, 0, c.features});
+        EXPECT_EQ(Groups(h.engine.GroupList()), c.groups);
+        EXPECT_EQ(Entries(h.engine.Menu()), c.menu);
     }
 }
 
