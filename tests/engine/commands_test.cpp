@@ -20,8 +20,7 @@ using menutest::Options;
 using menutest::Person;
 
 // Reported telemetry actions, collected while the object lives.
-class TelemetryCapture {
-public:
+struct TelemetryCapture {
     TelemetryCapture() {
         SetTelemetrySink([this](int id) { actions.push_back(id); });
     }

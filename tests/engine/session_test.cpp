@@ -77,7 +77,6 @@ TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
     EXPECT_EQ(engine.State(), kStateEnrolled);
     EXPECT_EQ(engine.Enrolled(), 1);
     EXPECT_EQ(engine.MyUserID(), client->UserId());
-    EXPECT_NE(engine.SessionValue(), 0u);
     EXPECT_EQ(engine.SessionValue(), conference.SessionValue(kSessionId));
     EXPECT_EQ(spy.RegisteredSink(), static_cast<IArmSharedDataSink*>(&engine));
     EXPECT_EQ(host.events, (std::vector<std::string>{"modified 0", "content 0"}));
@@ -99,7 +98,6 @@ TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
         // The first participant found the status cache empty and initialised every cache.
         EXPECT_EQ(group->IsCacheSet(), 1) << group->GetGroupId();
     }
-    // Which caches each role subscribes is the caches test's concern.
 
     RecordingWindow* window = RecordingWindow::Latest();
     ASSERT_NE(window, nullptr);
@@ -272,12 +270,16 @@ TEST_F(SessionTest, AttachAndEnrollFailuresEndInIdle) {
     }
 }
 
-TEST_F(SessionTest, EnrollConfirmationWithoutResourceChangesNothing) {
+TEST_F(SessionTest, NoResourceOrNoServiceChangesNothing) {
     CChatClient engine;
     EXPECT_EQ(engine.ApeEnrollConfirm(1, 0, 0, nullptr), 0);
     EXPECT_EQ(engine.Enrolled(), 0);
     EXPECT_EQ(engine.SessionValue(), 0u);
     EXPECT_EQ(engine.State(), kStateIdle);
+    EXPECT_EQ(engine.SetRosterStatus(0, 0), 0);
+    EXPECT_EQ(engine.NeedRosterInfo(), 0);
+    EXPECT_EQ(engine.BroadcastRosterInfo(), 0);
+    EXPECT_EQ(engine.Enroll(), 1);
 }
 
 TEST_F(SessionTest, SetRosterStatusReEnrollsOnlyOnChange) {
@@ -303,14 +305,6 @@ TEST_F(SessionTest, SetRosterStatusReEnrollsOnlyOnChange) {
     EXPECT_EQ(spy.Count("ApeEnroll"), 2u);
     EXPECT_EQ(engine.NeedRosterInfo(), 0);
     EXPECT_EQ(engine.BroadcastRosterInfo(), 1);
-}
-
-TEST_F(SessionTest, SetRosterStatusWithoutServiceDoesNotCrash) {
-    CChatClient engine;
-    EXPECT_EQ(engine.SetRosterStatus(0, 0), 0);
-    EXPECT_EQ(engine.NeedRosterInfo(), 0);
-    EXPECT_EQ(engine.BroadcastRosterInfo(), 0);
-    EXPECT_EQ(engine.Enroll(), 1);
 }
 
 TEST_F(SessionTest, PrivilegesAreReappliedOnTheNinthTick) {
