@@ -122,18 +122,18 @@ TEST(InsertChatUserName, PrivateOnlyAttendeeInputFollowsParticipantEntries) {
 
 TEST(SetGroupMenuEnable, TellsOnlyOfChangesAndAnInsertReplacesADisabledSelection) {
     MenuHarness h({1});
-    h.Seed({{"All Attendees", 8}, {"Host", 1}});
-    h.engine.SelectMenuItemByIndex(0);
+    h.Seed({{"Host", 1}, {"All Attendees", 8}});
+    h.engine.SelectMenuItemByIndex(1);
     h.Commands();
     h.engine.SetGroupMenuEnable(8, false);
     h.engine.SetGroupMenuEnable(8, false);
     h.engine.SetGroupMenuEnable(4, false);  // no such entry
-    EXPECT_EQ(h.Commands(), Strings({"update 0 off"}));
-    h.engine.InsertChatUserName("bob", 201, 0);
-    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "*bob", "Host"}));
-    EXPECT_EQ(h.Commands(), Strings({"insert 1 bob", "select 1"}));
+    EXPECT_EQ(h.Commands(), Strings({"update 1 off"}));
+    h.engine.InsertChatUserName("bob", 201, 0);  // the first enabled entry takes the selection
+    EXPECT_EQ(h.Titles(), Strings({"*Host", "All Attendees", "bob"}));
+    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "select 0"}));
     h.engine.SetGroupMenuEnable(8, true);
-    EXPECT_EQ(h.Commands(), Strings({"update 0 on"}));
+    EXPECT_EQ(h.Commands(), Strings({"update 1 on"}));
 }
 
 TEST(RemoveChatUserName, TidiesSeparatorsAndFallsBack) {
