@@ -1,6 +1,5 @@
 // The in-process conference: the contract suite on the virtual clock, and the fault
 // injection, refusals and choices that belong to this implementation.
-#include <algorithm>
 #include <cstring>
 
 #include "platform/conference_results.h"
