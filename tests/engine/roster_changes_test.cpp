@@ -1,22 +1,18 @@
 // Roster change processing: hand-made application-roster reports as the conference service
 // lays them out, including enroll data that no honest participant would send.
 #include <gtest/gtest.h>
-#include <sys/stat.h>
 
 #include <algorithm>
-#include <clocale>
 #include <cstdint>
-#include <cstdlib>
 #include <memory>
 #include <string>
-#include <utility>
 #include <vector>
 
 #include "platform/inproc_conference.h"
 #include "platform/string_table.h"
 #include "platform/virtual_run_loop.h"
 #include "tests/engine/menu_harness.h"
-#include "tests/support/temp_dir.h"
+#include "tests/support/german_host.h"
 #include "tests/support/trace_capture.h"
 
 using namespace menutest;
@@ -153,65 +149,9 @@ TEST(ProcessAddEnrollInfo, QMHostReturnsToEveryoneForEachArrivalAfterItsOwnRecor
     }
 }
 
-namespace {
-
-// A German catalogue for the component in the binary layout gettext reads: a header of seven
-// words, the tables of originals and of translations (length, offset; sorted by original),
-// then the strings, each ending in a NUL.
-std::string GermanCatalogue(const std::vector<std::pair<std::string, std::string>>& sorted) {
-    std::vector<std::pair<std::string, std::string>> entries = {
-        {"", "Content-Type: text/plain; charset=UTF-8\n"}};
-    entries.insert(entries.end(), sorted.begin(), sorted.end());
-    const auto count = static_cast<std::uint32_t>(entries.size());
-    const std::uint32_t originals = 28;
-    const std::uint32_t translations = originals + 8 * count;
-    std::uint32_t at = translations + 8 * count;
-    std::string words;
-    std::string strings;
-    const auto put = [&words](std::uint32_t value) {
-        words.append(reinterpret_cast<const char*>(&value), sizeof value);
-    };
-    for (const std::uint32_t value : {0x950412DEu, 0u, count, originals, translations, 0u, at})
-        put(value);
-    for (const bool translated : {false, true}) {
-        for (const auto& entry : entries) {
-            const std::string& text = translated ? entry.second : entry.first;
-            put(static_cast<std::uint32_t>(text.size()));
-            put(at);
-            strings += text + '\0';
-            at += static_cast<std::uint32_t>(text.size() + 1);
-        }
-    }
-    return words + strings;
-}
-
-// The host runs in German; the component's table translates "Host".
-class GermanRoster : public ::testing::Test {
-protected:
-    void SetUp() override {
-        const std::string messages = dir.Path() + "/de/LC_MESSAGES";
-        ASSERT_EQ(mkdir((dir.Path() + "/de").c_str(), 0700), 0);
-        ASSERT_EQ(mkdir(messages.c_str(), 0700), 0);
-        ASSERT_TRUE(PutFile(messages + "/" + kChatBundleId + ".mo",
-                            GermanCatalogue({{"Host", "Gastgeber"}})));
-        SetStringTableDirectory(dir.Path().c_str());
-        setenv("LC_ALL", "C.UTF-8", 1);
-        setenv("LANGUAGE", "de", 1);
-        std::setlocale(LC_ALL, "");
-        ASSERT_EQ(GetLocalizedString("Host"), "Gastgeber");
-    }
-    void TearDown() override {
-        unsetenv("LANGUAGE");
-        unsetenv("LC_ALL");
-        std::setlocale(LC_ALL, "C");
-    }
-
-    TempDir dir;
-};
-
-}  // namespace
-
-TEST_F(GermanRoster, QMHostEntryTitleIsTranslatedButTheRoleWordIsNot) {
+// The component's table translates "Host" for a German host.
+TEST_F(GermanHost, QMHostEntryTitleIsTranslatedButTheRoleWordIsNot) {
+    ASSERT_EQ(GetLocalizedString("Host"), "Gastgeber");
     MenuHarness h({1, false, 1, FEATURE_QM_MODE});
     h.engine.OnHostChanged(300);
     h.Commands();

@@ -1,28 +1,11 @@
 #include <gtest/gtest.h>
 
-#include <clocale>
-#include <cstdlib>
 #include <string>
 
 #include "platform/string_table.h"
+#include "tests/support/german_host.h"
 
 namespace {
-
-// The test plays the host: it owns the locale and picks German through LANGUAGE.
-class GermanHost : public ::testing::Test {
-protected:
-    void SetUp() override {
-        SetStringTableDirectory(QC_TEST_LOCALE_DIR);
-        setenv("LC_ALL", "C.UTF-8", 1);
-        setenv("LANGUAGE", "de", 1);
-        std::setlocale(LC_ALL, "");
-    }
-    void TearDown() override {
-        unsetenv("LANGUAGE");
-        unsetenv("LC_ALL");
-        std::setlocale(LC_ALL, "C");
-    }
-};
 
 TEST_F(GermanHost, KeysWithATranslationComeBackTranslatedInUtf8) {
     EXPECT_EQ(GetLocalizedString("Select an Attendee...", kChatBundleId),

@@ -1,0 +1,11 @@
+// A fixture for tests that play a German host: the host owns the locale and picks German
+// through LANGUAGE, and the component's strings come from a small German table.
+#pragma once
+
+#include <gtest/gtest.h>
+
+class GermanHost : public ::testing::Test {
+protected:
+    void SetUp() override;
+    void TearDown() override;
+};
