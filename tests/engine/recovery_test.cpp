@@ -1,0 +1,328 @@
+// Chat history recovery on its own, against an engine stand-in: when it starts, what it asks
+// the service for, in which order restored lines are shown, which copies are dropped, what is
+// backed up, and how it ends when the service refuses a retrieval.
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "engine/chat_client.h"
+#include "engine/chat_recovery_mgr.h"
+#include "pdu/chat_user_info_pdu.h"
+#include "pdu/group_message_pdu.h"
+#include "pdu/private_message_pdu.h"
+#include "tests/support/trace_capture.h"
+
+namespace {
+
+using Strings = std::vector<std::string>;
+
+constexpr std::uint32_t kUserInfoCache = 501;
+constexpr std::uint32_t kCustomerCache = 502;
+constexpr std::uint32_t kEveryoneCache = 515;
+constexpr std::uint32_t kAttendeesCache = 508;
+constexpr std::uint32_t kRecovering = FEATURE_GROUP_MSG_RECOVERY | FEATURE_QM_MODE;
+
+std::string UserInfo(std::uint32_t userId, const std::string& name) {
+    CChatUserInfoPDU pdu;
+    pdu.SetUserID(userId);
+    pdu.SetUserName(name);
+    pdu.GenerateXMLPDU();
+    return pdu.ToWireText();
+}
+
+std::string GroupLine(std::uint32_t sendId, std::uint32_t groupId, std::uint32_t groupCacheId,
+                      const std::string& text) {
+    CGroupMessagePDU pdu;
+    pdu.SetSendID(sendId);
+    pdu.SetGroupID(groupId);
+    if (groupCacheId != 0) pdu.SetGroupCacheId(groupCacheId);
+    pdu.SetMessageContent(text);
+    pdu.GenerateXMLPDU();
+    return pdu.ToWireText();
+}
+
+std::string PrivateLine(std::uint32_t sendId, std::uint32_t receiveId, const std::string& text) {
+    CPrivateMessagePDU pdu;
+    pdu.SetSendID(sendId);
+    pdu.SetReveID(receiveId);
+    pdu.SetMessageContent(text);
+    pdu.GenerateXMLPDU();
+    return pdu.ToWireText();
+}
+
+// The engine as recovery sees it: memory handles holding texts, the caches of groups 8 and 15,
+// a live roster, and a record of what was requested, shown and copied. Showing a private line
+// asks the manager for its title, as the engine does for a line between two others.
+class FakeEngine final : public IChatDataCmdProcess {
+public:
+    explicit FakeEngine(ChatRecoveryMgr& mgr) : m_mgr(mgr) {}
+
+    // A memory handle holding text.
+    std::uint32_t Mem(const std::string& text) {
+        memory[++m_lastMem] = text;
+        return m_lastMem;
+    }
+
+    int ParseATMemHandle(std::uint32_t, char*, std::uint32_t*) override { return 0; }
+    int ChatRequestSharedDataEx(std::uint32_t cacheHandle, tagCacheRequestType type,
+                                short maxItems) override {
+        requests.push_back(std::to_string(cacheHandle) + ":" + std::to_string(type) + ":" +
+                           std::to_string(maxItems));
+        const auto refusal = refuse.find(cacheHandle);
+        return refusal == refuse.end() ? 0 : refusal->second;
+    }
+    void SendCopyToCustomerCache(CKvoChatXMLPDU* pdu) override {
+        copies.push_back(pdu->ToWireText());
+    }
+    void SetCustomerCache() override { ++customerCacheSets; }
+    void ParseAndShowGroupMessages(CGroupMessagePDU* pdu, std::uint32_t cacheHandle) override {
+        std::string name = pdu->GetSenderName();
+        if (name.empty()) m_mgr.ParseGroupSenderName(pdu, name);
+        shown.push_back(name + "@" + pdu->GetGroupID() + ":" + pdu->GetMessageContent());
+        EXPECT_EQ(cacheHandle, 0u);
+    }
+    int ParseAndShowPrivateMessages(CPrivateMessagePDU* pdu, int) override {
+        std::string title;
+        if (!m_mgr.ParsePrivateMsgTitle(pdu, title)) return -1;
+        shown.push_back(title + ":" + pdu->GetMessageContent());
+        return 0;
+    }
+    bool AllocStringForMemoryHandle(std::uint32_t memHandle, std::string& out) override {
+        const auto found = memory.find(memHandle);
+        if (found == memory.end() || found->second.empty()) return false;
+        out = found->second;
+        return true;
+    }
+    std::uint32_t GetGroupIdFormCacheName(const char*) override { return 0; }
+    std::uint32_t GetGroupIdFormCacheHandle(std::uint32_t cacheHandle) override {
+        return cacheHandle == kEveryoneCache ? 15 : cacheHandle == kAttendeesCache ? 8 : 0;
+    }
+    std::uint32_t GetCacheHandleFormGroupId(std::uint32_t groupId) override {
+        return groupId == 15 ? everyoneCache : 0;
+    }
+    const char* GetGroupNameFromGroupCacheHandle(std::uint32_t) override { return nullptr; }
+    int GetUserNameFromId(std::uint32_t userId, std::string& out) override {
+        const auto found = liveRoster.find(userId);
+        if (found == liveRoster.end()) return 0;
+        out = found->second;
+        return 1;
+    }
+
+    std::map<std::uint32_t, std::string> memory;
+    std::map<std::uint32_t, int> refuse;  // cache handle -> request result
+    std::map<std::uint32_t, std::string> liveRoster;
+    std::uint32_t everyoneCache = kEveryoneCache;
+    Strings requests;
+    Strings shown;
+    Strings copies;
+    int customerCacheSets = 0;
+
+private:
+    ChatRecoveryMgr& m_mgr;
+    std::uint32_t m_lastMem = 0;
+};
+
+// A manager wired to a fake engine, with a customer cache and the QM and recovery bits.
+struct Recovery {
+    explicit Recovery(std::uint32_t features = kRecovering) {
+        mgr.InitParameters(&engine, features);
+        mgr.SetCustomerId(77);
+    }
+    bool Start() { return mgr.CheckUpdate4CustomRecovery(kUserInfoCache, kCustomerCache); }
+    void Roster(const std::string& text) { mgr.HandleHistoryUserRoster(engine.Mem(text)); }
+    void Customer(const std::string& text, tagCacheAction action = CACHE_REPLY_ITEM,
+                  short result = 0) {
+        mgr.HandleCustomerRecovery(0, kCustomerCache, text.empty() ? 0 : engine.Mem(text), result,
+                                   action);
+    }
+    // One delivery on the everyone cache, offered as the engine offers it; false when the
+    // manager left it to the live path.
+    bool Everyone(std::uint32_t cacheId, const std::string& text,
+                  tagCacheAction action = CACHE_REPLY_ITEM, std::uint32_t senderId = 0) {
+        if (!mgr.CheckUpdate4GroupRecovery(kEveryoneCache)) return false;
+        mgr.HandleGroupRecovery(cacheId, kEveryoneCache, text.empty() ? 0 : engine.Mem(text), 0,
+                                action, senderId);
+        return true;
+    }
+
+    ChatRecoveryMgr mgr;
+    FakeEngine engine{mgr};
+};
+
+}  // namespace
+
+TEST(Recovery, StartsOnlyInQMModeWithGroupRecoveryAndOnlyOnce) {
+    const struct {
+        std::uint32_t features;
+        bool starts;
+    } cases[] = {{0, false},
+                 {FEATURE_GROUP_MSG_RECOVERY, false},
+                 {FEATURE_QM_MODE, false},
+                 {kRecovering | 0x10000, true}};
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.features);
+        Recovery r(c.features);
+        EXPECT_EQ(r.Start(), c.starts);
+        EXPECT_FALSE(r.Start());
+        EXPECT_EQ(r.engine.requests, c.starts ? Strings({"501:1:255", "502:1:255"}) : Strings());
+        EXPECT_EQ(r.mgr.CheckUpdate4GroupRecovery(kEveryoneCache), c.starts);
+    }
+}
+
+TEST(Recovery, PrivateHistoryIsTitledWithBothNamesWhileTheCustomerCacheIsRestored) {
+    Recovery r;
+    r.engine.liveRoster[11] = "Ann";
+    r.Start();
+    r.Roster(UserInfo(12, "Bob (left)"));
+    r.Roster(UserInfo(12, "Bob again"));  // the first record of an id names it
+    r.Roster("not a record");
+    EXPECT_EQ(r.mgr.Mediator().HistoryRoster().GetCount(), 2u);
+    r.Customer(PrivateLine(11, 12, "hi Bob"));
+    r.Customer(PrivateLine(12, 13, "to nobody known"));
+    r.Customer(std::string(2, '\0'));  // the block the cache was initialised with
+    r.Customer("", CACHE_REPLY_LAST);
+    EXPECT_EQ(r.engine.shown, Strings({"from Ann to Bob (left) (privately):hi Bob",
+                                       "from Bob (left) to  (privately):to nobody known"}));
+    // Outside the customer cache a line between two others has no title and is not shown.
+    CPrivateMessagePDU live;
+    live.SetSendID(11u);
+    live.SetReveID(12u);
+    std::string title;
+    EXPECT_EQ(r.mgr.ParsePrivateMsgTitle(&live, title), 0);
+    EXPECT_EQ(r.engine.requests.back(), "515:1:255");
+}
+
+TEST(Recovery, EveryoneHistoryIsShownInCacheIdOrderAfterTheCustomerCache) {
+    Recovery r;
+    r.engine.liveRoster[11] = "Ann";
+    r.Start();
+    r.Roster(UserInfo(12, "Bob"));
+    r.Customer(GroupLine(11, 15, 5, "five"));
+    // A later attendees line with a higher id of its own cache says nothing about group 15.
+    r.Customer(GroupLine(12, 8, 12, "attendees"));
+    r.Customer("", CACHE_REPLY_LAST);
+    EXPECT_TRUE(r.mgr.IsInGroupCacheRecoveryProgress());
+    EXPECT_TRUE(r.Everyone(7, GroupLine(12, 15, 0, "seven")));
+    r.Everyone(5, GroupLine(11, 15, 0, "five"));
+    r.Everyone(9, GroupLine(11, 15, 0, "nine"), CACHE_REPLY_LAST);
+    EXPECT_EQ(r.engine.shown,
+              Strings({"Ann@15:five", "Bob@8:attendees", "Bob@15:seven", "Ann@15:nine"}));
+    // Each restored everyone line is backed up without names, with its cache id.
+    EXPECT_EQ(r.engine.copies,
+              Strings({GroupLine(12, 15, 7, "seven"), GroupLine(11, 15, 9, "nine")}));
+    EXPECT_FALSE(r.mgr.IsInGroupCacheRecoveryProgress());
+    EXPECT_FALSE(r.mgr.CheckUpdate4GroupRecovery(kEveryoneCache));  // live from now on
+}
+
+TEST(Recovery, EachLineIsShownOnceWhateverHoldsCopiesOfIt) {
+    Recovery r;
+    r.engine.liveRoster = {{11, "Ann"}, {12, "Bob"}};
+    r.Start();
+    r.mgr.NoteLiveGroupMessage(8, 4);
+    // Every receiver copied the attendees line 3 and the line 4 shown live; the sender and
+    // the receiver each copied the private line; "ok" was really said twice.
+    for (int copy = 0; copy < 3; ++copy) {
+        r.Customer(GroupLine(11, 8, 3, "three"));
+        r.Customer(GroupLine(11, 8, 4, "four"));
+    }
+    for (int said = 0; said < 2; ++said) {
+        r.Customer(PrivateLine(11, 12, "ok"));
+        r.Customer(PrivateLine(11, 12, "ok"));
+    }
+    r.Customer("", CACHE_REPLY_LAST);
+    // Live everyone lines meanwhile join the history, each cache id once.
+    r.Everyone(21, GroupLine(12, 15, 0, "live"), CACHE_APPEND);
+    r.Everyone(20, GroupLine(11, 15, 0, "old"));
+    r.Everyone(21, GroupLine(12, 15, 0, "live"));
+    r.Everyone(21, GroupLine(12, 15, 0, "live"), CACHE_APPEND);
+    r.Everyone(22, GroupLine(12, 15, 0, "after"), CACHE_REPLY_LAST);
+    EXPECT_EQ(r.engine.shown, Strings({"Ann@8:three", "from Ann to Bob (privately):ok",
+                                       "from Ann to Bob (privately):ok", "Ann@15:old",
+                                       "Bob@15:live", "Bob@15:after"}));
+}
+
+TEST(Recovery, PrivateCopiesAreMatchedWithinTheLastSixteenLines) {
+    RecoveredMessageFilter filter;
+    EXPECT_TRUE(filter.FirstShowOfPrivateMessage(1, 2, "copied"));
+    for (std::uint32_t i = 0; i < RecoveredMessageFilter::kPrivateWindow - 1; ++i)
+        EXPECT_TRUE(filter.FirstShowOfPrivateMessage(1, 2, std::to_string(i)));
+    EXPECT_FALSE(filter.FirstShowOfPrivateMessage(1, 2, "copied"));
+    EXPECT_TRUE(filter.FirstShowOfPrivateMessage(2, 1, "0"));  // the other direction
+    EXPECT_TRUE(filter.FirstShowOfPrivateMessage(1, 2, "new"));
+    EXPECT_TRUE(filter.FirstShowOfPrivateMessage(1, 2, "0"));  // pushed out of the window
+}
+
+TEST(Recovery, ARefusedOrMissingRetrievalEndsOnlyWhatItWouldHaveRead) {
+    const struct {
+        const char* scenario;
+        std::map<std::uint32_t, int> refuse;
+        std::uint32_t everyoneCache;
+        Strings requests;
+        bool groupRecovery;
+        const char* warning;
+    } cases[] = {
+        {"user info refused",
+         {{kUserInfoCache, 1104}},
+         kEveryoneCache,
+         {"501:1:255", "502:1:255", "515:1:255"},
+         true,
+         "ChatRecoveryMgr: user info cache 501 not read (result 1104); senders who have left "
+         "stay unnamed"},
+        {"customer cache refused",
+         {{kCustomerCache, 1104}},
+         kEveryoneCache,
+         {"501:1:255", "502:1:255", "515:1:255"},
+         true,
+         "ChatRecoveryMgr: customer cache 502 not read (result 1104); restoring the everyone "
+         "group only"},
+        {"everyone cache refused",
+         {{kEveryoneCache, 1103}},
+         kEveryoneCache,
+         {"501:1:255", "502:1:255", "515:1:255"},
+         false,
+         "ChatRecoveryMgr: cache of group 15 (handle 515) not read (result 1103); recovery "
+         "ends"},
+        {"everyone group without a cache",
+         {},
+         0,
+         {"501:1:255", "502:1:255"},
+         false,
+         "ChatRecoveryMgr: cache of group 15 (handle 0) not read (result 0); recovery ends"},
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.scenario);
+        TraceCapture trace;
+        Recovery r;
+        r.engine.refuse = c.refuse;
+        r.engine.everyoneCache = c.everyoneCache;
+        r.engine.liveRoster[11] = "Ann";
+        r.Start();
+        r.Everyone(30, GroupLine(11, 15, 0, "held while the customer cache is read"), CACHE_APPEND);
+        r.Customer("", CACHE_REPLY_LAST);
+        EXPECT_EQ(r.engine.requests, c.requests);
+        EXPECT_EQ(r.mgr.IsInGroupCacheRecoveryProgress(), c.groupRecovery);
+        EXPECT_TRUE(trace.Has(TraceLevel::Warn, c.warning));
+        // Nothing is lost: what was held is shown once recovery can no longer add to it.
+        const Strings held{"Ann@15:held while the customer cache is read"};
+        EXPECT_EQ(r.engine.shown, c.groupRecovery ? Strings() : held);
+        EXPECT_EQ(r.mgr.IsRecoveryRunning(), c.groupRecovery);
+    }
+}
+
+TEST(Recovery, ACustomerCacheNeverSetIsSetOnceAndForgedLinesAreDropped) {
+    Recovery r;
+    r.Start();
+    r.Customer(PrivateLine(11, 12, "unread"), CACHE_REPLY_LAST, kArmRetry);
+    EXPECT_EQ(r.engine.customerCacheSets, 1);
+    EXPECT_TRUE(r.engine.shown.empty());
+    TraceCapture trace;
+    r.Everyone(3, GroupLine(11, 15, 0, "forged"), CACHE_APPEND, 12);
+    r.Everyone(4, GroupLine(11, 15, 0, "kept"), CACHE_REPLY_LAST, 11);
+    EXPECT_EQ(r.engine.shown, Strings({"@15:kept"}));
+    EXPECT_TRUE(trace.Has(TraceLevel::Warn,
+                          "CChatClient::SharedDataReceivedEx,CACHE_APPEND or CACHE_SET,Detect "
+                          "faked group message, senderId:12, senderId in PDU:11"));
+}
