@@ -51,9 +51,9 @@ public:
     // its retrieval has ended, live appends included, so that they show in cache-id order.
     bool CheckUpdate4GroupRecovery(std::uint32_t entityId);
     // An everyone-group delivery is collected; the retrieval's end shows them all and ends
-    // recovery. senderId: who the service says wrote it.
+    // recovery. senderId: who the service says wrote it (0: unknown, not checked).
     int HandleGroupRecovery(std::uint32_t cacheId, std::uint32_t entityId, std::uint32_t memHandle,
-                            short result, tagCacheAction action, std::uint32_t senderId);
+                            short result, tagCacheAction action, std::uint32_t senderId = 0);
     // The engine showed a group message live; while recovery runs its copies are not shown.
     void NoteLiveGroupMessage(std::uint32_t groupId, std::uint32_t cacheId);
 
