@@ -1,0 +1,81 @@
+// quintara-chat-sim: runs a conference scenario on the in-process conference.
+//   quintara-chat-sim [--print] [--out DIR] [--log FILE] SCENARIO
+// Exit status 0 when every expectation holds, 1 when some failed, 2 for a bad command line
+// or a scenario that does not read.
+#include <cstdio>
+#include <cstring>
+#include <fstream>
+#include <sstream>
+#include <string>
+
+#include "sim/lang/scenario.h"
+#include "sim/simulator.h"
+
+namespace {
+
+int Usage() {
+    std::fprintf(stderr,
+                 "usage: quintara-chat-sim [--print] [--out DIR] [--log FILE] SCENARIO\n"
+                 "  --print     print every transcript and send-to list at the end\n"
+                 "  --out DIR   write each transcript (and window picture) into DIR\n"
+                 "  --log FILE  write every log line, with the participant's name, to FILE\n");
+    return 2;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    SimOptions options;
+    std::string scenarioPath;
+    std::string logPath;
+    for (int i = 1; i < argc; ++i) {
+        const bool hasValue = i + 1 < argc;
+        if (std::strcmp(argv[i], "--print") == 0) {
+            options.printAtEnd = true;
+        } else if (std::strcmp(argv[i], "--out") == 0 && hasValue) {
+            options.outputDir = argv[++i];
+        } else if (std::strcmp(argv[i], "--log") == 0 && hasValue) {
+            logPath = argv[++i];
+        } else if (argv[i][0] != '-' && scenarioPath.empty()) {
+            scenarioPath = argv[i];
+        } else {
+            return Usage();
+        }
+    }
+    if (scenarioPath.empty()) return Usage();
+
+    std::ifstream file(scenarioPath, std::ios::binary);
+    if (!file) {
+        std::fprintf(stderr, "%s: cannot read the scenario\n", scenarioPath.c_str());
+        return 2;
+    }
+    std::stringstream text;
+    text << file.rdbuf();
+    std::vector<ScenarioCommand> commands;
+    ScenarioError error;
+    if (!ParseScenario(text.str(), &commands, &error)) {
+        std::fprintf(stderr, "%s:%d: %s\n", scenarioPath.c_str(), error.line,
+                     error.message.c_str());
+        return 2;
+    }
+    if (!logPath.empty()) {
+        options.log = std::fopen(logPath.c_str(), "w");
+        if (!options.log) {
+            std::fprintf(stderr, "%s: cannot write the log\n", logPath.c_str());
+            return 2;
+        }
+    }
+
+    int failures;
+    {
+        Simulator simulator(options);
+        failures = simulator.Run(commands);
+    }
+    if (options.log) std::fclose(options.log);
+    if (failures == 0) {
+        std::printf("%s: every expectation holds\n", scenarioPath.c_str());
+        return 0;
+    }
+    std::printf("%s: %d failure(s)\n", scenarioPath.c_str(), failures);
+    return 1;
+}

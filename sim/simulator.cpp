@@ -1,0 +1,217 @@
+// The simulator's running core: dispatch, settling, the clock, participants and the end.
+#include "sim/simulator.h"
+
+#include <sys/stat.h>
+
+#include "engine/chat_client.h"
+#include "platform/trace.h"
+#include "platform/warning_window.h"
+#include "sim/model_window.h"
+
+namespace {
+
+const char* LevelName(TraceLevel level) {
+    switch (level) {
+        case TraceLevel::Info:
+            return "info";
+        case TraceLevel::Warn:
+            return "warn";
+        case TraceLevel::Error:
+            return "error";
+    }
+    return "?";
+}
+
+}  // namespace
+
+const Simulator::CommandEntry Simulator::kCommands[] = {
+    {"conference", &Simulator::Conference},
+    {"join", &Simulator::Join},
+    {"host", &Simulator::HostOrPresenter},
+    {"presenter", &Simulator::HostOrPresenter},
+    {"roles", &Simulator::Roles},
+    {"privilege", &Simulator::Privilege},
+    {"before-host", &Simulator::BeforeHost},
+    {"practice", &Simulator::Practice},
+    {"panel", &Simulator::Panel},
+    {"feature", &Simulator::Feature},
+    {"nbr", &Simulator::Nbr},
+    {"config", &Simulator::Config},
+    {"roster-status", &Simulator::RosterStatus},
+    {"add-group", &Simulator::AddGroup},
+    {"select-node", &Simulator::SelectNode},
+    {"sound", &Simulator::Sound},
+    {"close-dialogs", &Simulator::CloseDialogs},
+    {"select", &Simulator::Select},
+    {"say", &Simulator::Say},
+    {"pick", &Simulator::Pick},
+    {"answer", &Simulator::Answer},
+    {"save", &Simulator::SaveOrOpen},
+    {"open", &Simulator::SaveOrOpen},
+    {"leave", &Simulator::Leave},
+    {"fail", &Simulator::FailOperation},
+    {"inject", &Simulator::Inject},
+    {"expect", &Simulator::Expect},
+    {"print", &Simulator::Print},
+    {"tick", &Simulator::TickCommand},
+    {"startup", &Simulator::Startup},
+};
+
+Simulator::Simulator(SimOptions options) : m_options(std::move(options)) {
+    std::FILE* log = m_options.log;
+    SetTraceSink([log](TraceLevel level, const char* tag, const char* text) {
+        if (!log) return;
+        const std::string& acting = ParticipantLoop::Acting();
+        std::fprintf(log, "%-5s %s [%s] %s\n", LevelName(level), tag ? tag : "",
+                     acting.empty() ? "-" : acting.c_str(), text);
+    });
+    SetChatWindowFactory([this]() -> IChatWindow* {
+        auto* window = new ModelWindow(
+            [this](bool bSave, std::string* path) { return NextPanelAnswer(bSave, path); });
+        m_pNewWindow = window;
+        return window;
+    });
+    SetWarningPresenter([this](const char* title, const char* message) {
+        const std::string& acting = ParticipantLoop::Acting();
+        for (auto& p : m_participants)
+            if (p->name == acting) p->warnings.push_back(message ? message : "");
+        if (!m_warningAnswers.empty()) m_warningAnswers.pop_front();
+        if (m_options.log)
+            std::fprintf(m_options.log, "box   [%s] %s: %s\n", acting.c_str(), title ? title : "",
+                         message ? message : "");
+    });
+}
+
+Simulator::~Simulator() {
+    CloseAll();
+    SetWarningPresenter(nullptr);
+    SetChatWindowFactory(nullptr);
+    SetTraceSink(nullptr);
+}
+
+int Simulator::Run(const std::vector<ScenarioCommand>& commands) {
+    for (const ScenarioCommand& command : commands)
+        Execute(command);
+    if (m_options.printAtEnd)
+        for (const auto& p : m_participants)
+            if (!p->left) PrintParticipant(*p);
+    if (!m_options.outputDir.empty()) WriteOutputs();
+    CloseAll();
+    return m_failures;
+}
+
+void Simulator::Execute(const ScenarioCommand& command) {
+    for (const CommandEntry& entry : kCommands) {
+        if (command.verb != entry.verb) continue;
+        (this->*entry.handler)(command);
+        return;
+    }
+    Fail(command, "unknown command " + command.verb);
+}
+
+void Simulator::Settle() {
+    while (m_clock.RunUntilIdle() != 0) {
+    }
+}
+
+void Simulator::Tick(std::uint32_t halfSeconds) {
+    for (std::uint32_t i = 0; i < halfSeconds; ++i) {
+        m_clock.AdvanceBy(0.5);
+        Settle();
+    }
+}
+
+void Simulator::Fail(const ScenarioCommand& command, const std::string& message) {
+    ++m_failures;
+    std::fprintf(m_options.out, "line %d: %s: %s\n", command.line, command.verb.c_str(),
+                 message.c_str());
+}
+
+Simulator::Participant* Simulator::Find(const ScenarioCommand& command, const std::string& name) {
+    for (auto& p : m_participants)
+        if (p->name == name && !p->left) return p.get();
+    Fail(command, "nobody called " + name + " is in the conference");
+    return nullptr;
+}
+
+bool Simulator::Targets(const ScenarioCommand& command, std::size_t first,
+                        std::vector<Participant*>* out) {
+    out->clear();
+    const auto positional = command.Positional();
+    for (std::size_t i = first; i < positional.size(); ++i) {
+        Participant* p = Find(command, positional[i]->value);
+        if (!p) return false;
+        out->push_back(p);
+    }
+    if (first >= positional.size())
+        for (auto& p : m_participants)
+            if (!p->left) out->push_back(p.get());
+    return true;
+}
+
+void Simulator::ForEach(const ScenarioCommand& command, std::size_t first,
+                        const std::function<void(Participant&)>& fn) {
+    std::vector<Participant*> targets;
+    if (!Targets(command, first, &targets)) return;
+    for (Participant* p : targets) {
+        ActingScope acting(*p->loop);
+        fn(*p);
+    }
+    Settle();
+}
+
+CChatClient& Simulator::Engine(const Participant& p) {
+    return *static_cast<CChatClient*>(p.handle);
+}
+
+void Simulator::CloseAll() {
+    for (auto& p : m_participants) {
+        if (p->left) continue;
+        {
+            ActingScope acting(*p->loop);
+            ChDeleteInstance(p->handle);
+        }
+        p->left = true;
+        p->window = nullptr;
+        Settle();
+    }
+}
+
+void Simulator::WriteOutputs() {
+    mkdir(m_options.outputDir.c_str(), 0755);
+    for (const auto& p : m_participants) {
+        if (p->left) continue;
+        const std::string base = m_options.outputDir + "/" + p->name;
+        ActingScope acting(*p->loop);
+        if (!Engine(*p).WriteChatFileToFolder(base + ".txt"))
+            std::fprintf(m_options.out, "could not write %s.txt\n", base.c_str());
+        if (p->window && p->window->SavePicture(base + ".png"))
+            std::fprintf(m_options.out, "wrote %s.png\n", base.c_str());
+    }
+}
+
+bool Simulator::NextPanelAnswer(bool bSave, std::string* path) {
+    auto& answers = bSave ? m_saveAnswers : m_openAnswers;
+    if (answers.empty()) return false;  // nobody scripted an answer: the user cancels
+    const std::optional<std::string> answer = answers.front();
+    answers.pop_front();
+    if (!answer) return false;
+    *path = *answer;
+    return true;
+}
+
+std::optional<std::uint32_t> Simulator::NodeOf(const ScenarioCommand& c, const std::string& text) {
+    for (auto& p : m_participants)
+        if (p->name == text) return p->nodeId;
+    if (auto number = ParseScenarioNumber(text)) return number;
+    Fail(c, "nobody called " + text + " joined");
+    return std::nullopt;
+}
+
+void Simulator::TickCommand(const ScenarioCommand& c) {
+    Tick(*ParseScenarioNumber(c.Positional()[0]->value));
+}
+
+void Simulator::Startup(const ScenarioCommand&) {
+    Tick(20);
+}
