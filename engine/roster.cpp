@@ -7,25 +7,15 @@
 
 bool CChatClient::IsUserExist(const UserItem* item) const {
     CFuncTrace trace("CChatClient::IsuserExist");
-    if (!item) return false;
-    for (std::uint32_t i = 0; i < m_UserList.GetCount(); ++i) {
-        const UserItem* known = m_UserList.GetUserItemByIndex(i);
-        if (known->dwUserID == item->dwUserID && known->dwNodeID == item->dwNodeID) return true;
-    }
-    return false;
+    return item && m_UserList.HasUserOnNode(item->dwUserID, item->dwNodeID);
 }
 
 std::uint32_t CChatClient::GetPanelistCount() const {
-    std::uint32_t count = 0;
-    for (std::uint32_t i = 0; i < m_UserList.GetCount(); ++i) {
-        const UserItem* item = m_UserList.GetUserItemByIndex(i);
-        if (item->dwRoles & (ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST)) ++count;
-    }
-    return count;
+    return m_UserList.GetPrivilegedCount();
 }
 
 bool CChatClient::IsBeforeHost() const {
-    if (m_UserList.GetHosUser()) return false;
+    if (m_UserList.GetHostCount() != 0) return false;
     if (m_bQMMode) return m_dwHostID == 0 && m_dwPresenterID == 0;
     return m_dwHostID != m_dwMyNodeID && !(m_dwMyRosters & ROLE_HOST);
 }

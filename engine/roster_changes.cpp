@@ -35,19 +35,6 @@ std::string CleanDisplayName(std::string name) {
     return name;
 }
 
-// Copies what an enroll record says about a participant onto a roster item.
-void CopyEnrollFields(const UserItem& from, UserItem& to, bool bWithReserved16) {
-    to.dwUserID = from.dwUserID;
-    to.strName = from.strName;
-    to.dwNodeID = from.dwNodeID;
-    to.dwRoles = from.dwRoles;
-    to.dwUserType = from.dwUserType;
-    to.bVisible = from.bVisible;
-    to.dwExternalTag = from.dwExternalTag;
-    to.dwReserved1 = from.dwReserved1;
-    if (bWithReserved16) to.wReserved = from.wReserved;
-}
-
 bool IsPrivilegedRoles(std::uint32_t roles) {
     return (roles & (ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST)) != 0;
 }
@@ -107,16 +94,15 @@ int CChatClient::ProcessAddEnrollInfo(std::uint32_t count, const ARMApeRoster* f
     MacInfoTrace2(kChatTag, "CChatClient::ProcessAddEnrollInfo bPreIsBeforeHost = %d,IsHost()=%d",
                   wasBeforeHost, m_dwHostID == m_dwMyNodeID);
     bool ownArrived = false;
-    ForEachSessionUser(
-        count, first, m_dwSessionID, [&](const ARMApeRoster& record, std::uint32_t j) {
-            UserItem extracted;
-            if (ExtractEnrollInfoAndReturnLen(j, &extracted, &record) == -1) return;
-            auto user = std::make_unique<UserItem>();
-            CopyEnrollFields(extracted, *user, (m_dwFeatures & FEATURE_GROUP_SCHEME2) != 0);
-            const bool own = user->dwUserID == m_dwMyUserID;
-            if (own) ownArrived = true;
-            AddEnrolledUser(std::move(user), own, ownArrived);
-        });
+    ForEachSessionUser(count, first, m_dwSessionID,
+                       [&](const ARMApeRoster& record, std::uint32_t j) {
+                           UserItem extracted;
+                           if (ExtractEnrollInfoAndReturnLen(j, &extracted, &record) == -1) return;
+                           auto user = std::make_unique<UserItem>(extracted);
+                           const bool own = user->dwUserID == m_dwMyUserID;
+                           if (own) ownArrived = true;
+                           AddEnrolledUser(std::move(user), own, ownArrived);
+                       });
 
     const bool beforeHost = IsBeforeHost();
     MacInfoTrace2(kChatTag, "CChatClient::ProcessAddEnrollInfo IsBeforeHost = %d", beforeHost);
@@ -227,13 +213,14 @@ int CChatClient::ProcessModifyEnrollInfo(std::uint32_t count, const ARMApeRoster
         count, first, m_dwSessionID, [&](const ARMApeRoster& record, std::uint32_t j) {
             UserItem extracted;
             if (ExtractEnrollInfoAndReturnLen(j, &extracted, &record) == -1) return;
-            UserItem* user = m_UserList.GetUserItemFromNodeId(extracted.dwNodeID);
+            const UserItem* user = m_UserList.GetUserItemFromNodeId(extracted.dwNodeID);
             if (!user) return;
             const bool wasPrivileged = IsPrivilegedRoles(user->dwRoles);
             const bool own = user->dwUserID == m_dwMyUserID;
             if (own && user->dwRoles != extracted.dwRoles) ownRolesChanged = true;
-            CopyEnrollFields(extracted, *user, (m_dwFeatures & FEATURE_GROUP_SCHEME2) != 0);
-            const bool privileged = IsPrivilegedRoles(user->dwRoles);
+            m_UserList.UpdateItem(extracted.dwNodeID, extracted,
+                                  (m_dwFeatures & FEATURE_GROUP_SCHEME2) != 0);
+            const bool privileged = IsPrivilegedRoles(extracted.dwRoles);
             if (own) {
                 if (m_dwMeetingType == 3 && ownRolesChanged && wasPrivileged != privileged) {
                     OnRosterChange(0);

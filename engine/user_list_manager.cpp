@@ -1,5 +1,18 @@
 #include "engine/user_list_manager.h"
 
+#include <algorithm>
+
+namespace {
+
+constexpr std::uint32_t kHostBit = 0x1;
+constexpr std::uint32_t kPrivilegedBits = 0x7;  // host, presenter, panelist
+
+std::uint64_t PairKey(std::uint32_t userId, std::uint32_t nodeId) {
+    return (static_cast<std::uint64_t>(userId) << 32) | nodeId;
+}
+
+}  // namespace
+
 CUserListManager::~CUserListManager() {
     for (std::int32_t i = m_Items.GetCount() - 1; i >= 0; --i)
         delete At(i);
@@ -9,21 +22,24 @@ CUserListManager::~CUserListManager() {
 int CUserListManager::AddItem(std::unique_ptr<UserItem> item) {
     if (!item) return 0;
     if (!m_Items.Add(item.get())) return 0;
-    item.release();
+    m_Arrival[item.get()] = m_nNextArrival++;
+    Index(item.release());
     return 1;
 }
 
 int CUserListManager::RemoveItem(std::uint32_t nodeId) {
-    const std::int32_t index = IndexOfNode(nodeId);
-    if (index < 0) return kNotFound;
-    delete At(index);
-    m_Items.RemoveAt(index);
+    UserItem* item = FirstOfNode(nodeId);
+    if (!item) return kNotFound;
+    Unindex(item);
+    m_Arrival.erase(item);
+    m_Items.Remove(item);
+    delete item;
     return 1;
 }
 
 std::uint32_t CUserListManager::JudgeRosters(std::uint32_t nodeId, std::uint32_t mask,
                                              UserItem* out) const {
-    const UserItem* item = GetUserItemFromNodeId(nodeId);
+    const UserItem* item = FirstOfNode(nodeId);
     if (!item) return kNotFound;
     if (out) {
         out->dwRoles = item->dwRoles;
@@ -54,15 +70,34 @@ std::uint32_t CUserListManager::IsPanelist(std::uint32_t nodeId, bool bStrict,
 }
 
 int CUserListManager::SetRosters(std::uint32_t nodeId, std::uint32_t roles) {
-    UserItem* item = GetUserItemFromNodeId(nodeId);
+    UserItem* item = FirstOfNode(nodeId);
     if (!item) return kNotFound;
+    Unindex(item);
     item->dwRoles = roles;
+    Index(item);
+    return 1;
+}
+
+int CUserListManager::UpdateItem(std::uint32_t nodeId, const UserItem& from, bool bWithReserved16) {
+    UserItem* item = FirstOfNode(nodeId);
+    if (!item) return kNotFound;
+    Unindex(item);
+    item->dwUserID = from.dwUserID;
+    item->strName = from.strName;
+    item->dwNodeID = from.dwNodeID;
+    item->dwRoles = from.dwRoles;
+    item->dwUserType = from.dwUserType;
+    item->bVisible = from.bVisible;
+    item->dwExternalTag = from.dwExternalTag;
+    item->dwReserved1 = from.dwReserved1;
+    if (bWithReserved16) item->wReserved = from.wReserved;
+    Index(item);
     return 1;
 }
 
 int CUserListManager::ModifyItemName(std::uint32_t nodeId, const char* name) {
     if (!name) return 0;
-    UserItem* item = GetUserItemFromNodeId(nodeId);
+    UserItem* item = FirstOfNode(nodeId);
     if (!item) return kNotFound;
     item->strName.CopyFrom(name);
     return 1;
@@ -71,23 +106,20 @@ int CUserListManager::ModifyItemName(std::uint32_t nodeId, const char* name) {
 int CUserListManager::ModifyItemGrp(std::uint32_t nodeId, std::uint32_t /*groupId*/,
                                     const char* name, const char* label) const {
     if (!name || !label) return 0;
-    return IndexOfNode(nodeId) >= 0 ? 1 : kNotFound;
-}
-
-UserItem* CUserListManager::GetUserItemFromNodeId(std::uint32_t nodeId) {
-    return At(IndexOfNode(nodeId));
+    return FirstOfNode(nodeId) ? 1 : kNotFound;
 }
 
 const UserItem* CUserListManager::GetUserItemFromNodeId(std::uint32_t nodeId) const {
-    return At(IndexOfNode(nodeId));
-}
-
-UserItem* CUserListManager::GetUserItemFromUserId(std::uint32_t userId) {
-    return At(IndexOfUser(userId));
+    return FirstOfNode(nodeId);
 }
 
 const UserItem* CUserListManager::GetUserItemFromUserId(std::uint32_t userId) const {
-    return At(IndexOfUser(userId));
+    const auto found = m_ByUser.find(userId);
+    return found == m_ByUser.end() ? nullptr : found->second.front();
+}
+
+bool CUserListManager::HasUserOnNode(std::uint32_t userId, std::uint32_t nodeId) const {
+    return m_ByUserNode.count(PairKey(userId, nodeId)) != 0;
 }
 
 int CUserListManager::GetNodeIdFromUserId(std::uint32_t userId, std::uint32_t& nodeId) const {
@@ -98,37 +130,59 @@ int CUserListManager::GetNodeIdFromUserId(std::uint32_t userId, std::uint32_t& n
 }
 
 int CUserListManager::GetUserIdFromNodeId(std::uint32_t nodeId, std::uint32_t& userId) const {
-    const UserItem* item = GetUserItemFromNodeId(nodeId);
+    const UserItem* item = FirstOfNode(nodeId);
     if (!item) return 0;
     userId = item->dwUserID;
     return 1;
 }
 
 const UserItem* CUserListManager::GetHosUser() const {
+    if (m_nHosts == 0) return nullptr;
     for (std::int32_t i = 0; i < m_Items.GetCount(); ++i) {
-        if (At(i)->dwRoles & 0x1) return At(i);
+        if (At(i)->dwRoles & kHostBit) return At(i);
     }
     return nullptr;
-}
-
-UserItem* CUserListManager::GetUserItemByIndex(std::uint32_t index) {
-    return index < GetCount() ? At(static_cast<std::int32_t>(index)) : nullptr;
 }
 
 const UserItem* CUserListManager::GetUserItemByIndex(std::uint32_t index) const {
     return index < GetCount() ? At(static_cast<std::int32_t>(index)) : nullptr;
 }
 
-std::int32_t CUserListManager::IndexOfNode(std::uint32_t nodeId) const {
-    for (std::int32_t i = 0; i < m_Items.GetCount(); ++i) {
-        if (At(i)->dwNodeID == nodeId) return i;
-    }
-    return -1;
+UserItem* CUserListManager::FirstOfNode(std::uint32_t nodeId) const {
+    const auto found = m_ByNode.find(nodeId);
+    return found == m_ByNode.end() ? nullptr : found->second.front();
 }
 
-std::int32_t CUserListManager::IndexOfUser(std::uint32_t userId) const {
-    for (std::int32_t i = 0; i < m_Items.GetCount(); ++i) {
-        if (At(i)->dwUserID == userId) return i;
-    }
-    return -1;
+void CUserListManager::Index(UserItem* item) {
+    Enter(m_ByNode, item->dwNodeID, item);
+    Enter(m_ByUser, item->dwUserID, item);
+    Enter(m_ByUserNode, PairKey(item->dwUserID, item->dwNodeID), item);
+    if (item->dwRoles & kHostBit) ++m_nHosts;
+    if (item->dwRoles & kPrivilegedBits) ++m_nPrivileged;
+}
+
+void CUserListManager::Unindex(UserItem* item) {
+    Leave(m_ByNode, item->dwNodeID, item);
+    Leave(m_ByUser, item->dwUserID, item);
+    Leave(m_ByUserNode, PairKey(item->dwUserID, item->dwNodeID), item);
+    if (item->dwRoles & kHostBit) --m_nHosts;
+    if (item->dwRoles & kPrivilegedBits) --m_nPrivileged;
+}
+
+void CUserListManager::Enter(KeyIndex& index, std::uint64_t key, UserItem* item) {
+    // Items sharing a key are few; keep them in arrival order so the first stays the answer.
+    ItemList& items = index[key];
+    const std::uint64_t arrival = m_Arrival.at(item);
+    const auto later = std::find_if(items.begin(), items.end(), [&](const UserItem* other) {
+        return m_Arrival.at(other) > arrival;
+    });
+    items.insert(later, item);
+}
+
+void CUserListManager::Leave(KeyIndex& index, std::uint64_t key, const UserItem* item) {
+    const auto found = index.find(key);
+    if (found == index.end()) return;
+    ItemList& items = found->second;
+    items.erase(std::remove(items.begin(), items.end(), item), items.end());
+    if (items.empty()) index.erase(found);
 }

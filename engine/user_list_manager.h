@@ -4,6 +4,8 @@
 
 #include <cstdint>
 #include <memory>
+#include <unordered_map>
+#include <vector>
 
 #include "kyutil/ky_string2.h"
 #include "kyutil/ky_vector.h"
@@ -56,6 +58,9 @@ public:
 
     // Replaces the node's roles: 1, or 2 when the node is unknown.
     int SetRosters(std::uint32_t nodeId, std::uint32_t roles);
+    // Copies what an enroll record says (ids, name, roles, user type, visibility, tag, first
+    // reserved value; the 16-bit value only when asked) onto the node's item: 1, or 2.
+    int UpdateItem(std::uint32_t nodeId, const UserItem& from, bool bWithReserved16);
     // Roles become exactly host / presenter.
     int SetHost(std::uint32_t nodeId) { return SetRosters(nodeId, 0x1); }
     int SetPresenter(std::uint32_t nodeId) { return SetRosters(nodeId, 0x2); }
@@ -69,28 +74,48 @@ public:
     int ModifyItemGrp(std::uint32_t nodeId, std::uint32_t groupId, const char* name,
                       const char* label) const;
 
-    // The first item with that node id / user id, or null.
-    UserItem* GetUserItemFromNodeId(std::uint32_t nodeId);
+    // The first item with that node id / user id, or null. Items change only through the
+    // setters above, which keep the lookups right.
     const UserItem* GetUserItemFromNodeId(std::uint32_t nodeId) const;
-    UserItem* GetUserItemFromUserId(std::uint32_t userId);
     const UserItem* GetUserItemFromUserId(std::uint32_t userId) const;
+    // True when some item has both the user id and the node id.
+    bool HasUserOnNode(std::uint32_t userId, std::uint32_t nodeId) const;
     // 1 with the node id of the user / the user id of the node stored in out; 0 when unknown.
     int GetNodeIdFromUserId(std::uint32_t userId, std::uint32_t& nodeId) const;
     int GetUserIdFromNodeId(std::uint32_t nodeId, std::uint32_t& userId) const;
     // The first item with the host bit, or null.
     const UserItem* GetHosUser() const;
+    // Number of items with the host bit / with any of host, presenter and panelist.
+    std::uint32_t GetHostCount() const { return m_nHosts; }
+    std::uint32_t GetPrivilegedCount() const { return m_nPrivileged; }
     // The item at position index, or null past the last item.
-    UserItem* GetUserItemByIndex(std::uint32_t index);
     const UserItem* GetUserItemByIndex(std::uint32_t index) const;
     // Number of items.
     std::uint32_t GetCount() const { return static_cast<std::uint32_t>(m_Items.GetCount()); }
 
 private:
-    // Position of the first item with that node id / user id, or -1.
-    std::int32_t IndexOfNode(std::uint32_t nodeId) const;
-    std::int32_t IndexOfUser(std::uint32_t userId) const;
+    // Items sharing one key, in roster order; the first is the one lookups answer with.
+    using ItemList = std::vector<UserItem*>;
+    using KeyIndex = std::unordered_map<std::uint64_t, ItemList>;
+
     UserItem* At(std::int32_t index) const { return static_cast<UserItem*>(m_Items[index]); }
+    UserItem* FirstOfNode(std::uint32_t nodeId) const;
+    // Enter the item into (or take it out of) the key indexes and the role counts.
+    void Index(UserItem* item);
+    void Unindex(UserItem* item);
+    void Enter(KeyIndex& index, std::uint64_t key, UserItem* item);
+    static void Leave(KeyIndex& index, std::uint64_t key, const UserItem* item);
 
     // Owned UserItem pointers in arrival order.
     CKyVector m_Items;
+    // Lookups by node id, by user id and by (user id, node id), and each item's arrival number,
+    // which orders items that share a key.
+    KeyIndex m_ByNode;
+    KeyIndex m_ByUser;
+    KeyIndex m_ByUserNode;
+    std::unordered_map<const UserItem*, std::uint64_t> m_Arrival;
+    std::uint64_t m_nNextArrival = 0;
+    // Items with the host bit, and with any of host, presenter and panelist.
+    std::uint32_t m_nHosts = 0;
+    std::uint32_t m_nPrivileged = 0;
 };

@@ -165,17 +165,7 @@ void** CKyVector::GetHead() const {
     return m_ppData;
 }
 
-int32_t CKyVector::GetCount() const {
-    LockScope lock(m_Lock);
-    return m_nUsed;
-}
-
 int32_t CKyVector::GetCapacity() const {
     LockScope lock(m_Lock);
     return m_nSize;
-}
-
-void* CKyVector::operator[](int32_t nIndex) const {
-    LockScope lock(m_Lock);
-    return nIndex >= 0 && nIndex < m_nUsed ? m_ppData[nIndex] : nullptr;
 }

@@ -52,13 +52,24 @@ public:
     void** GetData() const { return GetHead(); }
 
     // Number of pointers held.
-    int32_t GetCount() const;
+    int32_t GetCount() const {
+        m_Lock.Lock();
+        const int32_t nUsed = m_nUsed;
+        m_Lock.Unlock();
+        return nUsed;
+    }
 
     // Number of slots allocated.
     int32_t GetCapacity() const;
 
-    // The pointer at nIndex, or null when nIndex is negative or not below the count.
-    void* operator[](int32_t nIndex) const;
+    // The pointer at nIndex, or null when nIndex is negative or not below the count. Inline:
+    // roster and group lookups walk whole lists through it.
+    void* operator[](int32_t nIndex) const {
+        m_Lock.Lock();
+        void* pItem = nIndex >= 0 && nIndex < m_nUsed ? m_ppData[nIndex] : nullptr;
+        m_Lock.Unlock();
+        return pItem;
+    }
 
 private:
     // Empties the vector and copies nCount pointers into a new array of exactly that size.

@@ -104,3 +104,35 @@ TEST(CUserListManager, LookupsTakeTheFirstMatchAndRemoveDeletesOnlyIt) {
     EXPECT_EQ(list.ModifyItemName(40, nullptr), 0);
     EXPECT_EQ(list.ModifyItemGrp(40, 8, "name", nullptr), 0);
 }
+
+TEST(CUserListManager, LookupsAndCountsFollowRoleAndIdChanges) {
+    CUserListManager list;
+    FillRoster(list);
+    EXPECT_EQ(list.GetHostCount(), 2u);
+    EXPECT_EQ(list.GetPrivilegedCount(), 4u);
+    EXPECT_TRUE(list.HasUserOnNode(130, 30));
+    EXPECT_FALSE(list.HasUserOnNode(130, 40));
+
+    // The host at 10 becomes an attendee and moves to node 40, where an item already stands:
+    // being earlier in the roster, it is now the one node 40 finds.
+    UserItem moved;
+    moved.dwNodeID = 40;
+    moved.dwUserID = 110;
+    moved.strName.CopyFrom("moved");
+    EXPECT_EQ(list.UpdateItem(10, moved, false), 1);
+    EXPECT_EQ(list.UpdateItem(99, moved, false), 2);
+    EXPECT_EQ(list.GetUserItemFromNodeId(10), nullptr);
+    EXPECT_STREQ(list.GetUserItemFromNodeId(40)->strName.GetData(), "moved");
+    EXPECT_TRUE(list.HasUserOnNode(110, 40));
+    EXPECT_FALSE(list.HasUserOnNode(110, 10));
+    EXPECT_EQ(list.GetHostCount(), 1u);
+    EXPECT_EQ(list.GetPrivilegedCount(), 3u);
+    EXPECT_EQ(list.GetHosUser()->dwNodeID, 50u);
+
+    EXPECT_EQ(list.SetAttendee(50, 1), 1);
+    EXPECT_EQ(list.GetHostCount(), 0u);
+    EXPECT_EQ(list.GetHosUser(), nullptr);
+    EXPECT_EQ(list.RemoveItem(40), 1);  // the moved item goes; the original 40 answers again
+    EXPECT_EQ(list.GetUserItemFromNodeId(40)->dwUserID, 140u);
+    EXPECT_EQ(list.GetPrivilegedCount(), 2u);
+}
