@@ -12,6 +12,7 @@
 #include "engine/chat_recovery_mgr.h"
 #include "pdu/chat_user_info_pdu.h"
 #include "pdu/group_info_pdu.h"
+#include "pdu/xml_limits.h"
 #include "platform/func_trace.h"
 #include "platform/trace.h"
 
@@ -146,6 +147,10 @@ void CChatClient::OnChatStatusCacheAnswer(std::uint32_t memHandle, short result,
             // Somebody initialised the caches already: only join them.
             SetAllGroupCacheSetFlag();
             if (m_pRecoveryMgr && m_pRecoveryMgr->GetCustomerId() != 0) SetCustomerCache();
+            if (m_pRecoveryMgr &&
+                m_pRecoveryMgr->CheckUpdate4CustomRecovery(m_UserInfoCacheHandle.handle_value,
+                                                           m_CustomerCacheHandle.handle_value))
+                MacInfoTrace2(kChatTag, "Start recovery customer cache data......");
             SendOwnUserInfoToCache();
             SubscribeAllGroupCaches();
             return;
@@ -533,6 +538,13 @@ std::uint32_t CChatClient::AllocAsciiStringForMemoryHandle(std::uint32_t memHand
     if (!m_pArmClient) return 0;
     std::uint32_t size = 0;
     if (m_pArmClient->GetMemHandleSize(memHandle, &size) != kArmOk || size == 0) return 0;
+    // Nothing the engine stores in a cache is longer than a chat document: a larger size is
+    // not allocated.
+    if (size > kMaxXmlBytes) {
+        MacWarnTrace2(kChatTag, "CChatClient::AllocAsciiStringForMemoryHandle, %u bytes refused",
+                      size);
+        return 0;
+    }
     std::unique_ptr<char[]> buffer(new char[size + 1]());
     std::uint32_t read = size;
     if (m_pArmClient->ReadMemHandle(memHandle, 0, buffer.get(), &read) != kArmOk) return 0;

@@ -2,7 +2,7 @@
 // service's callbacks and the window's events, and owns roster, groups, menu and transcript.
 // The implementation is split by concern: session.cpp, caches.cpp, commands.cpp,
 // transcript.cpp, roster.cpp, roster_changes.cpp, groups.cpp, menu.cpp, privilege.cpp,
-// roles.cpp, practice.cpp, receive.cpp.
+// roles.cpp, practice.cpp, send.cpp, receive.cpp, show.cpp.
 #pragma once
 
 #include <cstdint>
@@ -235,9 +235,34 @@ public:
     // The file the transcript was last saved to or opened from; empty when none.
     const std::string& ChatFilePath() const { return m_strFilePath; }
 
+    // ---- Sending chat (send.cpp) ----
+    // Sends the typed text to the selected send-to entry's audience; the input is cleared only
+    // when the service took the message. The QM form follows the QM audience rules.
+    void SendChat();
+    void SendChatInQM();
+    // The flags of a group send under the QM rules: recording and save-for-report bits.
+    std::uint32_t GetGroupSendPDUOption() const;
+    // True when a private message with this receive id goes to one person (or host, presenter).
+    bool IsPrivateChat(std::uint32_t userId) const;
+    // The receive id the selected entry stands for: a role id, 0, or the person's user id.
+    std::uint32_t GetSendUserChanelID() const;
+    void SetSaveForReportFlag(int bSave);
+    int SaveForReport() const { return m_bSaveForReport; }
+
     // ---- Receiving chat (receive.cpp) ----
+    // Private data that is not a private message: not for chat, 0.
+    int OnChatDataIndication(std::uint32_t senderId, const void* data, std::uint32_t length);
+    // Copies a live group message, with the cache id it got, into the customer cache.
+    void CacheGroupMsg2CustomerCache(const CGroupMessagePDU* pdu, std::uint32_t cacheId);
+
+    // ---- Showing chat (show.cpp) ----
+    // Shows the message when the local participant is in its audience.
     void ParseAndShowGroupMessages(CGroupMessagePDU* pdu, std::uint32_t cacheHandle) override;
     int ParseAndShowPrivateMessages(CPrivateMessagePDU* pdu, int reserved) override;
+    // Plays the incoming-chat sound when the sound mode asks for it.
+    void PlaySoundIfNeed();
+    // Stamps the transcript with the calendar time of the engine's run loop.
+    void InsertChatTime();
 
     // ---- Roster (roster.cpp, roster_changes.cpp) ----
     // True when a roster item has both the item's user id and its node id.
@@ -474,6 +499,37 @@ private:
                       std::uint32_t flags);
     // The first group with a cache (not a separator) of that id, or null.
     CUsersGroup* FindCacheGroup(std::uint32_t groupId);
+
+    // Sending (send.cpp).
+    void SendTypedChat(bool bQM);
+    // Index of the first selected menu entry, or -1.
+    int SelectedMenuIndex() const;
+    // Tells the window that the typed text is gone.
+    void ClearSentInput();
+    // True when the service took the message.
+    bool SendGroupChat(const std::string& text, std::uint32_t groupId, bool bQM);
+    bool SendPrivateChat(const std::string& text, std::uint32_t receiveId, bool bQM);
+
+    // Receiving and showing (receive.cpp, show.cpp).
+    // What a show operation knows of a sender; copied, so that a host call may change the roster.
+    struct ChatSender {
+        std::uint32_t dwSendID = 0;
+        std::string strName;  // roster name, else the name the message carries
+        bool bInRoster = false;
+        std::uint32_t dwNodeID = 0;  // roster node id, else the send id
+        std::uint32_t dwExternalTag = 0;
+    };
+    ChatSender FindChatSender(std::uint32_t sendId, const std::string& pduName) const;
+    // The sender's tag mark, " (external)" and the like; empty outside the roster.
+    std::string SenderTagSuffix(const ChatSender& sender) const;
+    // One group delivery read from a cache: checked, shown and, live, copied. The result of
+    // SharedDataReceivedEx.
+    int OnGroupDelivery(std::uint32_t cacheId, std::uint32_t entityId, std::uint32_t memHandle,
+                        std::uint32_t senderId, bool bLive);
+    // Shows a title and text: sound, host notification, time, window and transcript, then
+    // selects the sender as the next target where the meeting asks for it.
+    void ShowChatLine(const std::string& title, const std::string& text, const ChatSender& sender,
+                      bool bPrivate);
 
     // Engine fields, in the order the component has always kept them.
     std::uint32_t m_dwMyRosters = 0;  // own role bits (ChSetRosters)

@@ -84,9 +84,19 @@ void CChatClient::SetSoundFSSpec(const FSRef& file) {
 
 int CChatClient::HandleUIMessage(int message, void* iParam, void*) {
     switch (message) {
+        case msg_SendChat:
+            if (m_bQMMode) {
+                SendChatInQM();
+            } else {
+                SendChat();
+            }
+            return 0;
         case msg_SelectionChanged: {
             if (!iParam) return 0;
-            const int index = *static_cast<std::int32_t*>(iParam);
+            // Without a send-to list the window reports index 0 whatever it shows; the one
+            // audience there is everyone.
+            const int index = m_bEveryoneOnly ? GetIndexOfMenuByGroup(GROUP_EVERYONE)
+                                              : *static_cast<std::int32_t*>(iParam);
             const bool valid = index >= 0 && index < static_cast<int>(m_MenuStatus.size());
             if (valid && m_MenuStatus[index].nGroupID == static_cast<int>(GROUP_EVERYONE))
                 SendTelemetryActionByID(kTelemetryEveryoneSelected);

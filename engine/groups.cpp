@@ -42,8 +42,20 @@ constexpr DefaultGroup kPanelMeetingGroups[] = {
 };
 
 // Meeting type 1 in QM mode.
-constexpr DefaultGroup kQMEveryoneGroup = {0,          kRoleGroup, GROUP_EVERYONE,
-                                           "Everyone", {0, 1, 0},  true};
+constexpr DefaultGroup kQMEveryoneGroups[] = {
+    {0, kRoleGroup, GROUP_EVERYONE, "Everyone", {0, 1, 0}, true}};
+
+// True when every role group of the set is in the list already: the set was added before
+// (QM mode turning on runs the meeting type again), and adding it again would double it.
+template <std::size_t N>
+bool HasDefaultGroups(const CUsersGroupList& list, const DefaultGroup (&groups)[N]) {
+    for (const DefaultGroup& group : groups) {
+        if (group.dwGroupType == kSeparator) continue;
+        const std::string label = GetLocalizedString(group.key);
+        if (!list.GetGroupInfo(group.dwGroupType, group.dwGroupId, label.c_str())) return false;
+    }
+    return true;
+}
 
 void AddDefaultGroup(CChatClient& client, const DefaultGroup& group) {
     const std::string label = group.key ? GetLocalizedString(group.key) : std::string();
@@ -117,6 +129,7 @@ void CChatClient::SetMeetingType(std::int32_t meetingType) {
     switch (meetingType) {
         case 3:
             m_dwFeatures |= FEATURE_GROUPS;
+            if (HasDefaultGroups(m_GroupList, kPanelMeetingGroups)) break;
             for (const DefaultGroup& group : kPanelMeetingGroups)
                 AddDefaultGroup(*this, group);
             break;
@@ -125,7 +138,8 @@ void CChatClient::SetMeetingType(std::int32_t meetingType) {
             break;
         case 1:
             m_dwFeatures |= FEATURE_GROUPS;
-            if (m_bQMMode) AddDefaultGroup(*this, kQMEveryoneGroup);
+            if (m_bQMMode && !HasDefaultGroups(m_GroupList, kQMEveryoneGroups))
+                AddDefaultGroup(*this, kQMEveryoneGroups[0]);
             break;
         default:
             break;

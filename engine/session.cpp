@@ -83,6 +83,8 @@ int CChatClient::Initialize(_tagChatData data) {
 
     // A repeated start must not leave a second window behind the first.
     if (!m_hChatUI) CreateUI(&m_hChatUI, m_hParentView, this);
+    // A feature word set before the start found no window to hide the send-to list in.
+    if (m_bEveryoneOnly) NotifyUI(msg_NoSendToItems);
     SetMeetingType(m_dwMeetingType);
 
     if (m_pHostSink) {

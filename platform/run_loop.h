@@ -5,6 +5,8 @@
 #include <cstdint>
 #include <functional>
 
+#include "platform/calendar.h"
+
 class RunLoop {
 public:
     using Task = std::function<void()>;
@@ -22,6 +24,10 @@ public:
     // Stops a timer; an unknown or already cancelled id does nothing. Safe inside the
     // timer's own task.
     virtual void CancelTimer(TimerId id) = 0;
+
+    // The calendar time now, as chat lines are stamped with it. A real loop answers the
+    // system clock in local time; a virtual one its own clock from a chosen origin.
+    virtual CalendarTime CalendarNow() const { return LocalCalendarNow(); }
 
     // The loop the calling thread runs, or null when none was made current.
     static RunLoop* Current();

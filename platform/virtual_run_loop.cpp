@@ -12,6 +12,14 @@ double VirtualRunLoop::Now() const {
     return static_cast<double>(m_now) / kTicksPerSecond;
 }
 
+bool VirtualRunLoop::SetCalendarOrigin(const CalendarTime& origin) {
+    return UnixSecondsFromCalendar(origin, &m_calendarOrigin);
+}
+
+CalendarTime VirtualRunLoop::CalendarNow() const {
+    return CalendarFromUnixSeconds(m_calendarOrigin + m_now / static_cast<Ticks>(kTicksPerSecond));
+}
+
 void VirtualRunLoop::Post(Task task) {
     m_queue.Post(std::move(task));
 }

@@ -3,6 +3,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 
 #include "platform/loop_queue.h"
 #include "platform/run_loop.h"
@@ -30,6 +31,12 @@ public:
     // instant to fire it; the posted work runs before the clock moves on.
     void AdvanceBy(double seconds);
 
+    // The calendar time at virtual second 0: stamps are the origin plus Now(), in no time
+    // zone, so they are the same on every machine. False (nothing changed) for an invalid
+    // time. The origin starts at 2009-03-05 09:00:00.
+    bool SetCalendarOrigin(const CalendarTime& origin);
+    CalendarTime CalendarNow() const override;
+
     // Posted tasks not yet run.
     std::size_t PendingTasks() const { return m_queue.PostedCount(); }
 
@@ -43,6 +50,9 @@ private:
     // The instant of a repeating timer's next firing after one at due, or -1 when the
     // timer is done.
     Ticks NextDue(TimerId id, Ticks due, Ticks interval, std::size_t fired) const;
+
+    // The calendar time of virtual second 0, as seconds since 1970.
+    std::int64_t m_calendarOrigin = 1236243600;
 
     // The clock, and the instant the running AdvanceBy moves it to.
     Ticks m_now = 0;

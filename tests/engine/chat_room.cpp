@@ -1,0 +1,110 @@
+#include "tests/engine/chat_room.h"
+
+#include "api/ui_protocol.h"
+
+namespace chatroom {
+
+namespace {
+
+constexpr std::uint32_t kSession = 5;
+
+}  // namespace
+
+ChatRoom::ChatRoom(std::int32_t meetingType, std::uint32_t features)
+    : m_meetingType(meetingType), m_features(features) {
+    RecordingWindow::Install();
+}
+
+ChatRoom::~ChatRoom() {
+    members.clear();
+    RecordingWindow::Uninstall();
+}
+
+Member& ChatRoom::Join(const Person& person, IHostChatSink* hostSink) {
+    members.push_back(std::make_unique<Member>());
+    Member& m = *members.back();
+    m.person = person;
+    m.client = conference.CreateClient(loop, person.node);
+    m.engine.SetRosters(person.roles, 0);
+    if (m_features != 0) m.engine.SelectFeature(m_features, 0, 0, 0, 0, nullptr);
+    _tagChatData data{};
+    data.pArmClient = m.client;
+    data.pHostSink = hostSink;
+    data.wConferenceID = conference.ConferenceId();
+    data.dwSessionID = kSession;
+    data.lpszUserName = person.name;
+    data.dwNodeID = person.node;
+    data.lMeetingType = m_meetingType;
+    m.engine.Initialize(data);
+    m.window = static_cast<RecordingWindow*>(m.engine.ChatUI());
+    Run();
+    return m;
+}
+
+void ChatRoom::SetHostAndPresenter(std::uint32_t hostNode, std::uint32_t presenterNode) {
+    for (auto& m : members) {
+        m->engine.OnHostChanged(hostNode);
+        m->engine.OnPresenterChanged(presenterNode);
+        m->engine.SubscribeAllGroupCaches();
+    }
+    loop.AdvanceBy(6.0);
+}
+
+bool ChatRoom::Select(Member& from, std::int32_t groupId, std::uint32_t node) {
+    CChatClient& engine = from.engine;
+    std::int32_t index =
+        groupId >= 0 ? engine.GetIndexOfMenuByGroup(groupId) : engine.GetIndexOfMenuByNodeID(node);
+    if (index == -1 && groupId >= 0) {
+        const CUsersGroup* group = nullptr;
+        for (std::int32_t i = 0; i < engine.GroupList().GetGroupsCount() && !group; ++i) {
+            const CUsersGroup* g = engine.GroupList().GetGroupByIndex(i);
+            if (g->GetGroupType() != 2 && g->GetGroupId() == static_cast<std::uint32_t>(groupId))
+                group = g;
+        }
+        _tagChatGroupInfo info{};
+        info.dwIndex = static_cast<std::uint32_t>(engine.Menu().size());
+        info.dwGroupType = 1;
+        info.dwGroupId = static_cast<std::uint32_t>(groupId);
+        info.cszGroupName = group && group->GetGrpName() ? group->GetGrpName() : "Group";
+        engine.AddGroup(&info, 1);
+        index = engine.GetIndexOfMenuByGroup(groupId);
+    } else if (index == -1) {
+        const UserItem* user = engine.UserList().GetUserItemFromNodeId(node);
+        engine.InsertChatUserName(user ? user->strName.GetData() : "?", node, 0);
+        index = engine.GetIndexOfMenuByNodeID(node);
+    }
+    if (index == -1) return false;
+    engine.HandleUIMessage(msg_SelectionChanged, &index, nullptr);
+    return true;
+}
+
+void ChatRoom::Say(Member& from, const std::string& text, std::int32_t groupId,
+                   std::uint32_t node) {
+    Select(from, groupId, node);
+    from.window->inputText = text;
+    from.engine.HandleUIMessage(msg_SendChat, nullptr, nullptr);
+    Run();
+}
+
+std::vector<std::string> ChatRoom::Transcript(const Member& member) {
+    std::vector<std::string> lines;
+    const CChatContentStorage& content = member.engine.ChatContent();
+    for (std::size_t i = 0; i < content.GetLineCount(); ++i) {
+        std::string line(content.GetLineAtIndex(i));
+        const std::size_t end = line.find(":\r\t");
+        if (end != std::string::npos) line.replace(end, 3, "|");
+        lines.push_back(line);
+    }
+    return lines;
+}
+
+std::vector<std::string> ChatRoom::Holders(const std::string& line) const {
+    std::vector<std::string> names;
+    for (const auto& m : members) {
+        const std::vector<std::string> lines = Transcript(*m);
+        if (!lines.empty() && lines.back() == line) names.push_back(m->person.name);
+    }
+    return names;
+}
+
+}  // namespace chatroom
