@@ -1,12 +1,15 @@
 // The demo host: a conference on the in-process service with three participants, each a
 // chat component driven through its exported functions. It prints how each walked from
 // connect to enrolment, then what each one knows: named handles, roster and send-to menu.
+// Then everybody chats: a line to each audience of its menu and a private line, and each
+// transcript shows who received what.
 #include <cstdio>
 #include <memory>
 #include <string>
 #include <vector>
 
 #include "api/quintarachat.h"
+#include "api/window_bridge.h"
 #include "engine/chat_client.h"
 #include "platform/inproc_conference.h"
 #include "platform/trace.h"
@@ -15,6 +18,18 @@
 namespace {
 
 constexpr std::uint32_t kSessionId = 1;
+
+// The chat window of a demo participant: it types what the demo gives it.
+class TypingWindow final : public IChatWindow {
+public:
+    void SetSuperView(void*) override {}
+    void SetSink(IChatCommSinkForChatUI*) override {}
+    int HandleCommand(int command, void* inParam, void*) override {
+        if (command == msg_GetInputText) *static_cast<std::string*>(inParam) = typed;
+        return 0;
+    }
+    std::string typed;
+};
 
 struct Person {
     const char* name;
@@ -94,6 +109,43 @@ void PrintRoster(const CChatClient& engine) {
     }
 }
 
+// Types text and sends it to the menu entry at index, as a user picking it would.
+void Say(Participant& p, int index, const std::string& text) {
+    CChatClient* engine = Engine(p);
+    static_cast<TypingWindow*>(engine->ChatUI())->typed = text;
+    engine->HandleUIMessage(msg_SelectionChanged, &index, nullptr);
+    engine->HandleUIMessage(msg_SendChat, nullptr, nullptr);
+}
+
+// A line to every audience the participant may choose, and one private line.
+void ChatRound(Participant& p) {
+    ScopedCurrentRunLoop current(&p.loop);
+    const MenuStatusList menu = Engine(p)->Menu();
+    bool privately = false;
+    for (std::size_t i = 0; i < menu.size(); ++i) {
+        const MenuStatus& entry = menu[i];
+        if (!entry.bEnabled || entry.bSeparator || entry.nGroupID == GROUP_SELECT_ATTENDEE)
+            continue;
+        if (entry.nGroupID != -1) {
+            Say(p, static_cast<int>(i), std::string("hello, ") + entry.strTitle);
+        } else if (!privately) {
+            Say(p, static_cast<int>(i), "a private word for " + entry.strTitle);
+            privately = true;
+        }
+    }
+}
+
+void PrintTranscript(const CChatClient& engine) {
+    std::printf("  transcript:\n");
+    const CChatContentStorage& content = engine.ChatContent();
+    for (std::size_t i = 0; i < content.GetLineCount(); ++i) {
+        const std::string line(content.GetLineAtIndex(i));
+        const std::size_t tab = line.find('\t');
+        std::printf("    %s\n      %s\n", line.substr(0, line.find(":\r")).c_str(),
+                    tab == std::string::npos ? "" : line.substr(tab + 1).c_str());
+    }
+}
+
 void PrintMenu(const CChatClient& engine) {
     std::printf("  send-to menu:\n");
     for (const MenuStatus& entry : engine.Menu()) {
@@ -116,6 +168,7 @@ int main() {
         {"Pavel Panelist", 102, ROLE_PANELIST},
         {"Ada Attendee", 103, 0},
     };
+    SetChatWindowFactory([] { return new TypingWindow; });
     std::vector<std::unique_ptr<Participant>> participants;
     for (const Person& person : people) {
         auto p = std::make_unique<Participant>();
@@ -149,6 +202,13 @@ int main() {
     for (int round = 0; round < 3; ++round)
         for (auto& p : participants)
             Run(*p, 2.0);
+    for (auto& p : participants) {
+        ChatRound(*p);
+        for (auto& q : participants)
+            Run(*q, 0.0);
+    }
+    for (auto& p : participants)
+        Run(*p, 0.0);
 
     for (auto& p : participants) {
         const CChatClient& engine = *Engine(*p);
@@ -162,6 +222,7 @@ int main() {
         PrintHandles(engine);
         PrintRoster(engine);
         PrintMenu(engine);
+        PrintTranscript(engine);
         std::printf("\n");
     }
 
@@ -169,5 +230,6 @@ int main() {
         ScopedCurrentRunLoop current(&p->loop);
         ChDeleteInstance(p->handle);
     }
+    SetChatWindowFactory(nullptr);
     return 0;
 }
