@@ -1,0 +1,87 @@
+// How messages split into text and link runs.
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "ui/chat_unit.h"
+
+namespace {
+
+struct UnitRun {
+    std::string text;
+    bool url;
+    bool operator==(const UnitRun& other) const { return text == other.text && url == other.url; }
+};
+
+std::vector<UnitRun> Runs(const char* message) {
+    std::vector<UnitRun> runs;
+    for (const CChatUnit& unit : CChatUnit::GetChatUnitListFromString(message))
+        runs.push_back({unit.GetContent(), unit.IsText() == 0});
+    return runs;
+}
+
+TEST(ChatUnit, WordsThatAreUrls) {
+    const struct {
+        const char* word;
+        bool url;
+    } cases[] = {
+        {"www.example.com", true},       {"WWW.Example.COM/Path", true},
+        {"https://a.b", true},           {"http://a.b", true},
+        {"ftp://files.example", true},   {"ftp://nodot", false},
+        {"mailto:me@example.org", true}, {"mailto:me@localhost", false},
+        {"telnet:host.example", true},   {"file://x.txt", true},
+        {"www.example.com.", false},     {".www.example.com", false},
+        {"www.example.\r", false},       {"example.com", false},
+        {"xwww.example.com", false},     {"", false},
+    };
+    for (const auto& c : cases)
+        EXPECT_EQ(CChatUnit::IsUrl(c.word), c.url) << c.word;
+    EXPECT_FALSE(CChatUnit::IsUrl(nullptr));
+}
+
+TEST(ChatUnit, MessagesWithUrlContent) {
+    EXPECT_TRUE(CChatUnit::IsHaveUrlContent("see www.example.com now"));
+    EXPECT_TRUE(CChatUnit::IsHaveUrlContent("a\r\nhttp://x.y"));
+    EXPECT_TRUE(CChatUnit::IsHaveUrlContent("a\tmailto:x@y.z"));
+    // A dot but no prefix, and a prefix but no dot.
+    EXPECT_FALSE(CChatUnit::IsHaveUrlContent("see example.com now"));
+    EXPECT_FALSE(CChatUnit::IsHaveUrlContent("see www now"));
+    EXPECT_FALSE(CChatUnit::IsHaveUrlContent(nullptr));
+}
+
+TEST(ChatUnit, SplitsIntoAlternatingRuns) {
+    EXPECT_EQ(Runs("go www.a.com now"),
+              (std::vector<UnitRun>{
+                  {"go", false}, {" ", false}, {"www.a.com", true}, {" ", false}, {"now", false}}));
+    // Leading and doubled blanks form one run each; a trailing full stop keeps a word plain.
+    EXPECT_EQ(Runs("  see  www.a.com."),
+              (std::vector<UnitRun>{
+                  {"  ", false}, {"see", false}, {"  ", false}, {"www.a.com.", false}}));
+    // Bytes of multi-byte characters belong to words.
+    EXPECT_EQ(Runs("h\xC3\xA9 www.a.com\r"),
+              (std::vector<UnitRun>{
+                  {"h\xC3\xA9", false}, {" ", false}, {"www.a.com", true}, {"\r", false}}));
+    // Without URL-like content the message is one run, whatever it holds.
+    EXPECT_EQ(Runs("a b.c  d"), (std::vector<UnitRun>{{"a b.c  d", false}}));
+    EXPECT_TRUE(Runs(nullptr).empty());
+}
+
+TEST(ChatUnit, CopiesOwnTheirText) {
+    CChatUnit unit;
+    EXPECT_EQ(unit.GetContent(), nullptr);
+    EXPECT_EQ(unit.IsText(), 1);
+    unit.SetContent("abc");
+    unit.SetIsText(0);
+    CChatUnit copy(unit);
+    unit.SetContent("xyz");
+    EXPECT_STREQ(copy.GetContent(), "abc");
+    EXPECT_EQ(copy.IsText(), 0);
+    copy = unit;
+    EXPECT_STREQ(copy.GetContent(), "xyz");
+    EXPECT_NE(copy.GetContent(), unit.GetContent());
+    unit.SetContent(nullptr);  // changes nothing
+    EXPECT_STREQ(unit.GetContent(), "xyz");
+}
+
+}  // namespace

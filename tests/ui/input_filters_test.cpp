@@ -1,0 +1,65 @@
+// The input formatters: length limit with beeps, digits up to a largest value.
+#include <gtest/gtest.h>
+
+#include "ui/input_filters.h"
+
+namespace {
+
+TEST(MaxFilter, BeepsAtTheLimitAndCutsWholeCharacters) {
+    int beeps = 0;
+    MaxFilter filter;
+    filter.setMax(1000);
+    filter.setBeeper([&beeps] { ++beeps; });
+    EXPECT_TRUE(filter.isPartialStringValid(QString(999, 'a')));
+    EXPECT_EQ(beeps, 0);
+    const QString pasted(1200, 'b');
+    EXPECT_TRUE(filter.isPartialStringValid(pasted));
+    EXPECT_EQ(beeps, 1);
+    EXPECT_EQ(filter.getObjectValue(pasted), QString(1000, 'b'));
+    EXPECT_EQ(filter.getObjectValue("short"), "short");
+
+    // A character outside the basic plane is one character and is never split.
+    const QString clef = QString::fromUcs4(U"\U0001D11E");
+    filter.setMax(2);
+    EXPECT_EQ(filter.getObjectValue("a" + clef + "b"), "a" + clef);
+    filter.setMax(1);
+    EXPECT_EQ(filter.getObjectValue("a" + clef), "a");
+    EXPECT_EQ(filter.getObjectValue(clef + "a"), clef);
+    EXPECT_EQ(filter.stringForObjectValue(QVariant(QString("x"))), "x");
+    EXPECT_TRUE(filter.stringForObjectValue(QVariant(5)).isNull());
+}
+
+TEST(NumberFilter, AcceptsDigitsUpToTheLimit) {
+    int beeps = 0;
+    NumberFilter filter;
+    filter.setMaxnumber(100);
+    filter.setBeeper([&beeps] { ++beeps; });
+    const struct {
+        const char* text;
+        bool valid;
+    } cases[] = {{"", true},    {"1", true},   {"100", true},
+                 {"0", false},  {"05", false}, {"101", false},
+                 {"1a", false}, {"-1", false}, {"99999999999999999999", false}};
+    int rejected = 0;
+    for (const auto& c : cases) {
+        EXPECT_EQ(filter.isPartialStringValid(c.text), c.valid) << c.text;
+        rejected += c.valid ? 0 : 1;
+    }
+    EXPECT_EQ(beeps, rejected);
+}
+
+TEST(NumberFilter, ValuesOfLongDigitStringsDoNotOverflow) {
+    NumberFilter filter;
+    filter.setMaxnumber(INT_MAX);
+    EXPECT_TRUE(filter.isPartialStringValid("2147483647"));
+    filter.setBeeper([] {});
+    EXPECT_FALSE(filter.isPartialStringValid("2147483648"));
+    EXPECT_EQ(filter.getObjectValue("42abc"), 42);
+    EXPECT_EQ(filter.getObjectValue("abc"), 0);
+    EXPECT_EQ(filter.getObjectValue("123456789012345678901234567890"), INT_MAX);
+    EXPECT_EQ(filter.getObjectValue("-99999999999999999999"), -INT_MAX);
+    EXPECT_EQ(filter.stringForObjectValue(QVariant(17)), "17");
+    EXPECT_TRUE(filter.stringForObjectValue(QVariant(QString("17"))).isNull());
+}
+
+}  // namespace

@@ -1,0 +1,137 @@
+// Chat lines in the transcript: paragraphs, styles, link runs, clicks and following the end.
+#include <QScrollBar>
+#include <QTest>
+#include <QTextBlock>
+#include <QTextDocument>
+#include <QTextFragment>
+
+#include "tests/ui/window_fixture.h"
+#include "ui/chat_panels.h"
+#include "ui/chat_text_view.h"
+
+namespace {
+
+// The document's text runs with whether each is a link.
+std::vector<std::pair<std::string, bool>> Fragments(const QTextDocument* document) {
+    std::vector<std::pair<std::string, bool>> runs;
+    for (QTextBlock block = document->begin(); block.isValid(); block = block.next())
+        for (auto it = block.begin(); !it.atEnd(); ++it)
+            runs.emplace_back(it.fragment().text().toStdString(),
+                              it.fragment().charFormat().isAnchor());
+    return runs;
+}
+
+// Answers the link prompt from a script and records what would have opened.
+class ScriptedPanels final : public ChatPanelProvider {
+public:
+    bool RunSavePanel(QWidget*, const QString&, const QString&, const QString&, QString*) override {
+        return false;
+    }
+    bool RunOpenPanel(QWidget*, const QString&, const QStringList&, QString*) override {
+        return false;
+    }
+    void AbortPanels() override {}
+    bool ConfirmOpenLink(QWidget*, const QUrl& url) override {
+        asked.push_back(url.toString().toStdString());
+        return allow;
+    }
+    void OpenLink(const QUrl& url) override { opened.push_back(url.toString().toStdString()); }
+
+    bool allow = false;
+    std::vector<std::string> asked;
+    std::vector<std::string> opened;
+};
+
+class TranscriptTest : public WindowTest {
+protected:
+    void Show(const char* text, bool title = false) {
+        Command(title ? msg_ShowTitle : msg_ShowText, const_cast<char*>(text));
+    }
+    QTextDocument* Document() const { return window->textView()->document(); }
+};
+
+TEST_F(TranscriptTest, EveryLineEndsOneParagraph) {
+    Show("abc");
+    Show("def\n");
+    Show("two\r\nlines\r\n");
+    Show("");
+    EXPECT_EQ(Document()->toPlainText().toStdString(), "abc\ndef\ntwo\nlines\n");
+    EXPECT_EQ(Document()->blockCount(), 5);  // four paragraphs and the empty end
+}
+
+TEST_F(TranscriptTest, TitlesAndBodiesHaveTheirStylesAndPeerMarkupIsText) {
+    Show("from Ann to Everyone", true);
+    Show("<b>bold?</b> &amp;");
+    const QTextBlock title = Document()->begin();
+    const QTextBlock body = title.next();
+    EXPECT_EQ(title.begin().fragment().charFormat().foreground().color(), QColor(0x99, 0x99, 0x99));
+    EXPECT_EQ(title.begin().fragment().charFormat().font().pointSize(), 12);
+    EXPECT_EQ(title.blockFormat().bottomMargin(), 6);
+    const QTextCharFormat text = body.begin().fragment().charFormat();
+    EXPECT_EQ(text.foreground().color(), QColor(0x33, 0x33, 0x33));
+    EXPECT_EQ(text.font().pointSize(), 14);
+    EXPECT_EQ(body.blockFormat().bottomMargin(), 12);
+    EXPECT_EQ(body.text().toStdString(), "<b>bold?</b> &amp;");
+    // A title is never split into links.
+    Show("www.example.com", true);
+    for (const auto& run : Fragments(Document()))
+        EXPECT_FALSE(run.second) << run.first;
+}
+
+TEST_F(TranscriptTest, UrlWordsBecomeLinksWithoutUnderline) {
+    Show("see www.Example.com/A or ftp://nodot now");
+    const auto runs = Fragments(Document());
+    const std::vector<std::pair<std::string, bool>> expected = {
+        {"see ", false}, {"www.Example.com/A", true}, {" or ftp://nodot now", false}};
+    EXPECT_EQ(runs, expected);
+    QTextCursor cursor(Document());
+    cursor.setPosition(6);
+    EXPECT_EQ(cursor.charFormat().anchorHref(), "www.Example.com/A");
+    EXPECT_FALSE(cursor.charFormat().fontUnderline());
+    EXPECT_EQ(cursor.charFormat().foreground().color(), QColor(Qt::blue));
+}
+
+TEST_F(TranscriptTest, ClickedLinksOpenByScheme) {
+    auto panels = std::make_shared<ScriptedPanels>();
+    SetChatPanelProvider(panels);
+    NSTextViewWithLinks* view = window->textView();
+    view->clickedOnLink("WWW.Example.COM/Mixed");
+    view->clickedOnLink("https://a.example/x");
+    view->clickedOnLink("mailto:ann@example.org");
+    view->clickedOnLink("file:///etc/passwd");
+    panels->allow = true;
+    view->clickedOnLink("telnet:host.example");
+    EXPECT_EQ(panels->opened,
+              (std::vector<std::string>{"http://www.example.com/mixed", "https://a.example/x",
+                                        "mailto:ann@example.org", "telnet:host.example"}));
+    EXPECT_EQ(panels->asked,
+              (std::vector<std::string>{"file:///etc/passwd", "telnet:host.example"}));
+
+    // A real click on a link run goes the same way.
+    panels->opened.clear();
+    Show("go www.a.com");
+    QTextCursor cursor(view->document());
+    cursor.setPosition(4);
+    const QRect at = view->cursorRect(cursor);
+    QTest::mouseClick(view->viewport(), Qt::LeftButton, {}, at.center() + QPoint(4, 0));
+    EXPECT_EQ(panels->opened, (std::vector<std::string>{"http://www.a.com"}));
+    SetChatPanelProvider(nullptr);
+}
+
+TEST_F(TranscriptTest, FollowsNewLinesOnlyWhileAtTheEnd) {
+    for (int i = 0; i < 60; ++i)
+        Show("line");
+    QApplication::processEvents();
+    QScrollBar* bar = window->textView()->verticalScrollBar();
+    ASSERT_GT(bar->maximum(), 0);
+    EXPECT_TRUE(window->isScrollAtBottom());
+    Show("more");
+    EXPECT_EQ(bar->value(), bar->maximum());
+    window->scrollToTop();
+    Show("later");
+    EXPECT_EQ(bar->value(), 0);
+    Command(msg_ClearChat);
+    EXPECT_TRUE(Document()->isEmpty());
+}
+
+}  // namespace

@@ -1,0 +1,179 @@
+// The window's side of the engine's menu and input commands, the placeholder item included.
+#include <QTest>
+
+#include "tests/ui/window_fixture.h"
+#include "ui/chat_menu_item.h"
+
+namespace {
+
+const std::string kPlaceholder = "--- Please Select ---";
+
+TEST_F(WindowTest, InsertAppendsWithoutOrPastAPositionAndMakesSeparators) {
+    MenuStatus a = Entry("Everyone", 15);
+    Command(msg_InsertMenuItem, &a, nullptr);
+    MenuStatus b = Entry("Bob");
+    std::int32_t far = 7;
+    Command(msg_InsertMenuItem, &b, &far);
+    MenuStatus c = Entry("Ann");
+    std::int32_t first = 0;
+    Command(msg_InsertMenuItem, &c, &first);
+    MenuStatus titledSeparator = SeparatorEntry("ignored");
+    std::int32_t second = 1;
+    Command(msg_InsertMenuItem, &titledSeparator, &second);
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Ann", "-", "Everyone", "Bob"}));
+    EXPECT_TRUE(ChatMenuItem::From(window->userlist()->itemAtIndex(2))->isGroup());
+    EXPECT_TRUE(engine.events.empty());
+}
+
+TEST_F(WindowTest, RebuildKeepsTitledSeparatorEntriesAsItemsAndDisabledEntriesGrey) {
+    Rebuild({Entry("Everyone", 15), SeparatorEntry(), SeparatorEntry("Panelists"),
+             Entry("Carl", -1, false)});
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone", "-", "Panelists", "Carl"}));
+    QStandardItem* carl = window->userlist()->itemAtIndex(3);
+    EXPECT_FALSE(carl->isEnabled());
+    EXPECT_EQ(carl->foreground().color(), QColor(Qt::gray));
+    EXPECT_TRUE(window->userlist()->itemAtIndex(0)->font().bold());
+    // Removing and selecting from code never reports a selection by itself.
+    Command(msg_RemoveMenuItem, 9);
+    Command(msg_RemoveMenuItem, -1);
+    Command(msg_RemoveMenuItem, 1);
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone", "Panelists", "Carl"}));
+    EXPECT_TRUE(engine.events.empty());
+}
+
+TEST_F(WindowTest, SelectReportsNewIndexesOnly) {
+    Rebuild({Entry("Everyone", 15), Entry("Ann"), Entry("Bob")});
+    Command(msg_SelectMenuItem, 2);
+    Command(msg_SelectMenuItem, 2);
+    Command(msg_SelectMenuItem, 3);
+    EXPECT_EQ(Selected(), 2);
+    EXPECT_EQ(engine.events, (std::vector<RecordedEvent>{{msg_SelectionChanged, 2}}));
+    Command(msg_SelectMenuItem, -1);
+    EXPECT_EQ(Selected(), -1);
+    EXPECT_EQ(engine.events.back(), (RecordedEvent{msg_SelectionChanged, -1}));
+}
+
+TEST_F(WindowTest, SelectedUserLeftShowsThePlaceholderUntilATargetIsChosenAgain) {
+    Rebuild({Entry("Everyone", 15), Entry("Ann"), Entry("Bob")});
+    Command(msg_SelectMenuItem, 2);
+    engine.events.clear();
+    Command(msg_SelectedUserLeft, 2);
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone", "Ann", kPlaceholder}));
+    EXPECT_EQ(Selected(), 2);
+    EXPECT_FALSE(InputEnabled());
+    EXPECT_EQ(engine.events, (std::vector<RecordedEvent>{{msg_SelectionChanged, -1}}));
+
+    // The placeholder is out of the popup while a command runs, so indexes from the engine
+    // mean the same entries; afterwards it is last and selected again.
+    MenuStatus renamed = Entry("Anna");
+    std::string anna = "Anna";
+    Command(msg_RenameMenuItem, &anna, reinterpret_cast<void*>(1));
+    Command(msg_UpdateMenuItem, &renamed, reinterpret_cast<void*>(1));
+    MenuStatus carl = Entry("Carl");
+    Command(msg_InsertMenuItem, &carl, nullptr);
+    Command(msg_SelectMenuItem, 0);
+    std::int32_t allow = 1;
+    Command(msg_AllowUserInput, &allow);
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone", "Anna", "Carl", kPlaceholder}));
+    EXPECT_EQ(Selected(), 3);
+    EXPECT_FALSE(InputEnabled());
+    EXPECT_EQ(engine.events.back(), (RecordedEvent{msg_SelectionChanged, -1}));
+
+    Command(msg_SelectMenuItemAndAllowInput, 2);
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone", "Anna", "Carl"}));
+    EXPECT_EQ(Selected(), 2);
+    EXPECT_TRUE(InputEnabled());
+    EXPECT_FALSE(window->selectedUserLeft());
+    EXPECT_EQ(engine.events.back(), (RecordedEvent{msg_SelectionChanged, 2}));
+}
+
+TEST_F(WindowTest, OpeningThePopupHidesThePlaceholderAndClosingBringsItBack) {
+    Rebuild({Entry("Everyone", 15), Entry("Ann"), Entry("Bob")});
+    Command(msg_SelectedUserLeft, 2);
+    ChatPopUpButton* popup = window->userlist();
+    popup->showPopup();
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone", "Ann"}));
+    EXPECT_EQ(Selected(), -1);
+    popup->hidePopup();
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone", "Ann", kPlaceholder}));
+    EXPECT_EQ(Selected(), 2);
+
+    // A command arriving while the list is open keeps the placeholder out of it.
+    popup->showPopup();
+    Command(msg_PanelStatusChanged);
+    EXPECT_FALSE(window->menuPopup());
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone", "Ann", kPlaceholder}));
+    EXPECT_EQ(Selected(), 2);
+
+    // Choosing a real target with the keyboard removes the placeholder and enables input.
+    engine.events.clear();
+    popup->setFocus();
+    QTest::keyClick(popup, Qt::Key_Up);
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone", "Ann"}));
+    EXPECT_EQ(Selected(), 1);
+    EXPECT_TRUE(InputEnabled());
+    EXPECT_EQ(engine.events, (std::vector<RecordedEvent>{{msg_SelectionChanged, 1}}));
+}
+
+TEST_F(WindowTest, InputTextHasNormalisedLineEndsAndIsLimited) {
+    const struct {
+        const char* typed;
+        const char* sent;
+    } cases[] = {{"x\n\ny", "x\ry"}, {"x\n\n\ny", "x\r\ry"}, {"a\r\nb", "a\rb"}, {"abc", "abc"}};
+    for (const auto& c : cases) {
+        window->editView()->setStringValue(QString::fromUtf8(c.typed));
+        std::string text = "old";
+        Command(msg_GetInputText, &text);
+        EXPECT_EQ(text, c.sent) << c.typed;
+    }
+    window->editView()->setStringValue(QString(1200, 'z'));
+    std::string text;
+    Command(msg_GetInputText, &text);
+    EXPECT_EQ(text.size(), 1000u);
+    Command(msg_ClearInput);
+    EXPECT_TRUE(window->editView()->toPlainText().isEmpty());
+}
+
+TEST_F(WindowTest, ReturnSendsShiftReturnStartsANewLineAndTheAttendeeItemSendsNothing) {
+    Rebuild({Entry("Everyone", 15), Entry("Select an Attendee...", 16)});
+    QTest::keyClicks(window->editView(), "hi");
+    QTest::keyClick(window->editView(), Qt::Key_Return, Qt::ShiftModifier);
+    EXPECT_TRUE(engine.events.empty());
+    EXPECT_EQ(window->editView()->toPlainText(), "hi\n");
+    QTest::keyClick(window->editView(), Qt::Key_Return);
+    EXPECT_EQ(engine.events, (std::vector<RecordedEvent>{{msg_SendChat, 0}}));
+
+    window->userlist()->setCurrentIndex(1);
+    window->onSend();
+    EXPECT_EQ(engine.events.size(), 1u);
+}
+
+TEST_F(WindowTest, NoSendToModeHidesTheRowAndAlwaysReportsZero) {
+    Rebuild({Entry("Everyone", 15), Entry("Ann")});
+    Command(msg_NoSendToItems);
+    EXPECT_TRUE(window->isNoSendToMode());
+    EXPECT_FALSE(window->userlist()->isVisible());
+    EXPECT_FALSE(window->sendToLabel()->isVisible());
+    EXPECT_EQ(window->editView()->placeholderText(), "Type chat message, and send...");
+    Command(msg_SelectMenuItem, 1);
+    EXPECT_EQ(engine.events, (std::vector<RecordedEvent>{{msg_SelectionChanged, 0}}));
+}
+
+TEST_F(WindowTest, CommandsWithoutTheirSlotsOrUnknownIdsChangeNothing) {
+    Rebuild({Entry("Everyone", 15)});
+    window->editView()->setStringValue("draft");
+    for (const int id : std::vector<int>{msg_SendDone, msg_ShowChat, 4242, msg_CloseAttendeeWarning,
+                                         msg_AllowUserInput, msg_ShowText, msg_GetInputText,
+                                         msg_WriteTextFile, msg_ReadTextFile})
+        EXPECT_EQ(Command(id), 0) << id;
+    EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone"}));
+    EXPECT_EQ(window->editView()->toPlainText(), "draft");
+    EXPECT_TRUE(engine.events.empty());
+    // Without a sink the window reports nothing at all.
+    window->SetSink(nullptr);
+    Command(msg_SelectMenuItem, 0);
+    window->onSend();
+    EXPECT_TRUE(engine.events.empty());
+}
+
+}  // namespace
