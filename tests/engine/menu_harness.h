@@ -93,16 +93,15 @@ struct Options {
     bool selector = false;
     std::int32_t tagMode = 0;
     std::uint32_t features = 0;
+    bool answerBack = false;  // the window reports selections back as a real one does
 };
 
 // Commands that name one menu position, by verb; others not described here keep their names.
 inline std::string Describe(const RecordedCommand& c) {
     static const std::map<int, std::string> kAtIndex = {
-        {msg_RemoveMenuItem, "remove"},
-        {msg_SelectedUserLeft, "left"},
-        {msg_SelectMenuItem, "select"},
-        {msg_SelectMenuItemAndAllowInput, "select+input"},
-        {msg_AllowUserInput, "input"}};
+        {msg_RemoveMenuItem, "remove"}, {msg_SelectedUserLeft, "left"},
+        {msg_SelectMenuItem, "select"}, {msg_SelectMenuItemAndAllowInput, "select+input"},
+        {msg_AllowUserInput, "input"},  {msg_SelectionChanged, "report"}};
     const std::string index = std::to_string(c.index);
     if (kAtIndex.count(c.id)) return kAtIndex.at(c.id) + " " + index;
     if (c.id == msg_InsertMenuItem)
@@ -134,7 +133,7 @@ inline std::vector<std::string> Titles(const CChatClient& engine) {
 class MenuHarness {
 public:
     explicit MenuHarness(const Options& options = Options()) {
-        RecordingWindow::Install();
+        RecordingWindow::Install(options.answerBack);
         ChatData data{};
         data.dwSessionID = kSession;
         data.lpszUserName = "me";

@@ -198,6 +198,87 @@ TEST(RemoveChatUserNameInQM, SelectedEntryLeavesAsDepartedAudience) {
     EXPECT_EQ(h.Titles(), Strings({"Everyone"}));
 }
 
+TEST(RemoveChatUserNameInQM, RoleEntryGoesOnlyWhenSelectedAndTakesItsSeparatorAlong) {
+    const std::string status =
+        "CChatClient::RemoveChatUserNameInQM,user[node is 300] selected status ";
+    const std::string separator =
+        "CChatClient::RemoveChatUserNameInQM,remove spe line,its index is ";
+    struct Case {
+        const char* scenario;
+        std::int32_t meetingType;  // 1 brings the everyone entry, 2 does not
+        std::uint32_t host, presenter;
+        Seed seed;
+        int selected;  // index selected before the node leaves
+        Strings menu;
+        Strings commands;
+        Strings log;
+    };
+    const Case cases[] = {
+        {"host entry selected, the local participant presents: separator above goes",
+         1,
+         300,
+         kMyNode,
+         {{"---", 0}, {"Host", 1}, {"Presenter", 2}},
+         2,
+         {"Everyone", "Presenter"},
+         {"left 2", "input 0", "remove 1"},
+         {status + "1,its index is 2", separator + "1"}},
+        {"host entry not selected: it stays",
+         1,
+         300,
+         kMyNode,
+         {{"---", 0}, {"Host", 1}, {"Presenter", 2}},
+         0,
+         {"*Everyone", "---", "hank (Host)", "Presenter"},
+         {},
+         {status + "0,its index is 2"}},
+        {"host entry selected, the presenter is someone else: separator stays",
+         1,
+         300,
+         301,
+         {{"---", 0}, {"Host", 1}, {"Presenter", 2}},
+         2,
+         {"Everyone", "---", "Presenter"},
+         {"left 2", "input 0"},
+         {status + "1,its index is 2"}},
+        {"presenter entry selected with no host known",
+         1,
+         0,
+         300,
+         {{"---", 0}, {"Presenter", 2}},
+         2,
+         {"Everyone"},
+         {"left 2", "input 0", "remove 1"},
+         {status + "1,its index is 2", separator + "1"}},
+        {"combined entry at the top: the separator now at the top goes",
+         2,
+         300,
+         300,
+         {{"Host & Presenter", 3}, {"---", 0}, {"All Attendees", 8}},
+         0,
+         {"All Attendees"},
+         {"left 0", "input 0", "remove 0"},
+         {status + "1,its index is 0", separator + "0"}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.scenario);
+        MenuHarness h({c.meetingType, false, 0, kQM});
+        h.engine.OnHostChanged(c.host);
+        h.engine.OnPresenterChanged(c.presenter);
+        h.Seed(c.seed);
+        h.Enroll({{300, "hank", ROLE_HOST}});
+        h.engine.SelectMenuItemByIndexInQM(c.selected);
+        h.Commands();
+        TraceCapture trace;
+        h.Leave({300, "hank", ROLE_HOST});
+        EXPECT_EQ(h.Titles(), c.menu);
+        EXPECT_EQ(h.Commands(), c.commands);
+        for (const std::string& line : c.log)
+            EXPECT_TRUE(trace.Has(line)) << line;
+        EXPECT_EQ(trace.Has(separator + "0") || trace.Has(separator + "1"), c.log.size() == 2);
+    }
+}
+
 TEST(RecentEntries, PickerKeepsTwentyNewestFirst) {
     MenuHarness h({1, true});
     h.engine.OnHostChanged(kMyNode);
@@ -221,6 +302,47 @@ TEST(RecentEntries, PickerKeepsTwentyNewestFirst) {
     // Picking again moves the entry to the top.
     EXPECT_TRUE(h.engine.SelectUserByNodeID(205, false, true));
     EXPECT_EQ(h.Commands(), Strings({"remove 17", "insert 1 u5", "select 1"}));
+}
+
+TEST(RecentEntries, GoBelowTheSeparatorsUnderAllAttendees) {
+    for (const std::int32_t meetingType : {1, 2}) {
+        SCOPED_TRACE(meetingType);
+        MenuHarness h({meetingType, true});
+        h.engine.OnHostChanged(kMyNode);
+        h.Seed({{"All Attendees", 8}, {"---", 0}, {"Host", 1}});
+        h.Enroll({{201, "ann"}});
+        h.Commands();
+        EXPECT_TRUE(h.engine.SelectUserByNodeID(201, false, true));
+        EXPECT_EQ(h.Commands(), Strings({"insert 2 ann", "select 2"}));
+    }
+}
+
+TEST(RecentEntries, PanelMeetingWithoutEveryoneWalksDownFromAllAttendees) {
+    const std::string below = "CChatClient::InsertRecentUserName item below'all attendee'";
+    for (const bool attendees : {false, true}) {
+        SCOPED_TRACE(attendees);
+        MenuHarness h({3});
+        h.engine.SetRosters(ROLE_PANELIST, 1);
+        if (attendees) h.Seed({{"All Attendees", 8}, {"Select an Attendee...", 16}});
+        h.Enroll({{201, ""}, {202, "bo"}});
+        h.Commands();
+        TraceCapture trace;
+        h.engine.SelectUserByNodeID(201, false, true);
+        h.engine.SelectUserByNodeID(202, false, true);
+        Strings log;
+        for (const TraceLine& line : trace.Lines())
+            if (line.text.rfind("CChatClient::InsertRecentUserName", 0) == 0)
+                log.push_back(line.text);
+        if (!attendees) {
+            EXPECT_EQ(log, Strings(2, "CChatClient::InsertRecentUserName indexStart== -1"));
+            EXPECT_EQ(h.Commands(), Strings());
+            continue;
+        }
+        // Every entry passed is logged, an untitled one with the short form.
+        EXPECT_EQ(log, Strings({below + ", Select an Attendee...", below + " ",
+                                below + ", Select an Attendee..."}));
+        EXPECT_EQ(h.Commands(), Strings({"insert 6 ", "select 6", "insert 7 bo", "select 7"}));
+    }
 }
 
 TEST(RecentEntries, PanelMeetingSectionAndDepartures) {
@@ -373,4 +495,33 @@ TEST(ExternalInternalTags, MarkFollowsTheTaggingMode) {
         EXPECT_EQ(h.engine.GetUserExternalInternalString(c.tag, 1),
                   std::string(c.title) == "ann" ? "" : (c.tag == 1 ? ", internal" : ", external"));
     }
+}
+
+TEST(WindowReentry, SelectionReportsFromInsideCommandsEndOnTheRightEntry) {
+    // A real window reports the selection (5001) from inside SetSink, before any menu
+    // exists, and from inside 2303, 2305 and 2306; the engine takes each report in mid-command.
+    Options normal{1};
+    normal.answerBack = true;
+    MenuHarness h(normal);
+    h.Seed({{"All Participants", 15}, {"All Attendees", 8}});
+    EXPECT_EQ(h.Commands().front(), "report 0");
+    h.Enroll({{201, "bob"}});
+    h.Commands();
+    EXPECT_TRUE(h.engine.SelectUserByNodeID(201, false, true));
+    h.Leave({201, "bob"});  // the fallback selection is reported back too
+    EXPECT_EQ(h.Commands(), Strings({"select 2", "report 2", "remove 2", "select 0", "report 0"}));
+    EXPECT_EQ(h.Titles(), Strings({"*All Participants", "All Attendees"}));
+
+    Options qm{1, false, 0, kQM};
+    qm.answerBack = true;
+    MenuHarness q(qm);
+    q.Enroll({{201, "bob"}, {202, "carl"}});
+    q.Commands();
+    EXPECT_TRUE(q.engine.SelectUserByNodeID(202, false, true));
+    q.Leave({202, "carl"});  // the window shows the departed audience and reports -1
+    EXPECT_EQ(q.Titles(), Strings({"Everyone", "---", "bob"}));
+    EXPECT_TRUE(q.engine.SelectUserByNodeID(201, false, true));
+    EXPECT_EQ(q.Commands(), Strings({"select+input 3", "report 3", "left 3", "report -1", "input 0",
+                                     "select+input 2", "report 2"}));
+    EXPECT_EQ(q.Titles(), Strings({"Everyone", "---", "*bob"}));
 }

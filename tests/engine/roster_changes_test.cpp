@@ -149,6 +149,55 @@ TEST(ProcessAddEnrollInfo, QMHostReturnsToEveryoneForEachArrivalAfterItsOwnRecor
     }
 }
 
+TEST(RosterChanges, BeforeHostChangeReappliesThePrivilegeWithForce) {
+    // The QM trace shows the force flag of each re-application.
+    const std::string reapplied =
+        "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65607, bDefault = ";
+    struct Case {
+        const char* scenario;
+        std::int32_t meetingType;
+        bool modify;  // else an add
+        Person person;
+        Strings forces;  // of the re-applications, in order
+    };
+    const Case cases[] = {
+        {"type 3: the host's arrival ends the before-host state",
+         3,
+         false,
+         {300, "hank", ROLE_HOST},
+         {"1"}},
+        {"type 3: an attendee's arrival changes nothing", 3, false, {201, "ann"}, {}},
+        {"type 1: the host's arrival re-applies nothing", 1, false, {300, "hank", ROLE_HOST}, {}},
+        {"modify to host", 1, true, {201, "ann", ROLE_HOST}, {"1"}},
+        {"modify keeping the before-host state", 1, true, {201, "anne"}, {"0"}},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.scenario);
+        MenuHarness h({c.meetingType, false, 0, FEATURE_QM_MODE});
+        if (c.modify) h.Enroll({{201, "ann"}});
+        TraceCapture trace;
+        if (c.modify) {
+            h.Modify(c.person);
+        } else {
+            h.Enroll({c.person});
+        }
+        Strings forces;
+        for (const std::string& text : trace.Texts())
+            if (text.rfind(reapplied, 0) == 0) forces.push_back(text.substr(reapplied.size()));
+        EXPECT_EQ(forces, c.forces);
+    }
+}
+
+TEST(ProcessAddEnrollInfo, QMPresenterEntryIsRetitled) {
+    MenuHarness h({2, false, 0, FEATURE_QM_MODE});
+    h.engine.OnPresenterChanged(301);
+    h.Seed({{"Presenter", 2}});
+    h.Commands();
+    h.Enroll({{301, "pia", ROLE_PRESENTER}});
+    EXPECT_EQ(h.Commands(), Strings({"rename 0 pia (Presenter)"}));
+    EXPECT_EQ(h.Titles(), Strings({"pia (Presenter)"}));
+}
+
 // The component's table translates "Host" for a German host.
 TEST_F(GermanHost, QMHostEntryTitleIsTranslatedButTheRoleWordIsNot) {
     ASSERT_EQ(GetLocalizedString("Host"), "Gastgeber");

@@ -71,9 +71,19 @@ TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
     EXPECT_EQ(engine.State(), kStateIdle);
     loop.RunUntilIdle();
 
-    EXPECT_EQ(Prefix(spy.Calls(), 6),
-              (std::vector<std::string>{"Connect", "ConferenceJoin", "ApeAttach", "ApeEnroll",
-                                        "AllocNameHandle", "RegisterSharedDataSink"}));
+    // Each request with what the engine passes: the enroll payload's own length, the session
+    // resource, and the ape handle the attach gave.
+    const std::string conf = std::to_string(conference.ConferenceId());
+    const std::string ape = std::to_string(spy.ApeHandle());
+    ASSERT_NE(spy.ApeHandle(), 0u);
+    ASSERT_FALSE(spy.EnrollPayloads().empty());
+    const std::string length = std::to_string(spy.EnrollPayloads().front().size());
+    EXPECT_EQ(Prefix(spy.CallsWithArguments(), 6),
+              (std::vector<std::string>{
+                  "Connect(Alice, 0, 0, 0)", "ConferenceJoin(0, " + conf + ", 3)",
+                  "ApeAttach(0, " + conf + ")",
+                  "ApeEnroll(" + ape + ", 1, 42, 0, 1, {1, c_session_id, 1}, " + length + ", 3)",
+                  "AllocNameHandle(" + ape + ", 9)", "RegisterSharedDataSink(" + ape + ")"}));
     EXPECT_EQ(engine.State(), kStateEnrolled);
     EXPECT_EQ(engine.Enrolled(), 1);
     EXPECT_EQ(engine.MyUserID(), client->UserId());
@@ -165,15 +175,22 @@ TEST_F(SessionTest, RosterInfoCarriesFaqFieldsTagAndCustomerId) {
               "<UserName><![CDATA[Ann]]></UserName><RoleSet>7</RoleSet><Visible>1</Visible>"
               "<UserType>1</UserType><FName><![CDATA[Ann]]></FName><Phone>1 &amp; 2</Phone>"
               "<GuestID>555</GuestID><UIT>2</UIT></chat>");
+    // With a customer id its cache is asked for between the user-info and the status cache.
+    const std::string prefix = std::to_string(engine.SessionValue());
+    ASSERT_GE(spy.HandleNames().size(), 3u);
+    EXPECT_EQ(std::vector<std::string>(spy.HandleNames().end() - 3, spy.HandleNames().end()),
+              (std::vector<std::string>{prefix + "_Chat_User_Info", "switch_cache_555",
+                                        prefix + "_chat_status"}));
 }
 
 TEST_F(SessionTest, ConnectResultDecidesWhetherTheChainGoesOn) {
     std::uint32_t node = 7;
-    for (const int result : {1202, 1, 19}) {
+    for (const int result : {1202, 1, 19, -5}) {  // -5: the confirmation carries 5
         SCOPED_TRACE(result);
         InProcessArmClient* client = conference.CreateClient(loop, node);
         SpyArmClient spy(client);
-        client->FailNext(ArmOperation::Connect, result);
+        if (result > 0) client->FailNext(ArmOperation::Connect, result);
+        if (result < 0) client->ConfirmNextWith(ArmConfirmation::ConnectConfirm, -result);
         CChatClient engine;
         engine.Initialize(Data(&spy, node++, "Alice"));
         loop.RunUntilIdle();
@@ -181,6 +198,12 @@ TEST_F(SessionTest, ConnectResultDecidesWhetherTheChainGoesOn) {
         EXPECT_EQ(spy.Count("ConferenceJoin"), joins ? 1u : 0u);
         if (joins) {
             EXPECT_EQ(engine.State(), kStateEnrolled);
+            continue;
+        }
+        if (result < 0) {  // a confirmation other than 0 and 19 changes nothing
+            EXPECT_EQ(spy.Calls(), std::vector<std::string>{"Connect"});
+            EXPECT_EQ(engine.ArmClient(), &spy);
+            EXPECT_EQ(engine.State(), kStateIdle);
             continue;
         }
         // The session ends at once, but the window is made and the tick still runs.
@@ -308,8 +331,10 @@ TEST_F(SessionTest, SetRosterStatusReEnrollsOnlyOnChange) {
 }
 
 TEST_F(SessionTest, PrivilegesAreReappliedOnTheNinthTick) {
+    const std::string reapplied = "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65607";
     CChatClient engine;
     engine.Initialize(Data(nullptr, 7, "Alice"));
+    TraceCapture trace;
     ASSERT_EQ(engine.PrivilegeCountdown(), 1);
     ASSERT_EQ(engine.PrivilegePending(), 1);
     loop.AdvanceBy(1.0);  // first tick
@@ -317,7 +342,9 @@ TEST_F(SessionTest, PrivilegesAreReappliedOnTheNinthTick) {
     loop.AdvanceBy(0.5 * 7);  // ticks two to eight
     EXPECT_EQ(engine.PrivilegeCountdown(), 9);
     EXPECT_EQ(engine.PrivilegePending(), 1);
+    EXPECT_FALSE(trace.Has(reapplied));
     loop.AdvanceBy(0.5);  // the ninth tick
+    EXPECT_TRUE(trace.Has(reapplied));
     EXPECT_EQ(engine.PrivilegeCountdown(), 0);
     EXPECT_EQ(engine.PrivilegePending(), 0);
     EXPECT_EQ(engine.StartupTicks(), 10);
@@ -370,8 +397,12 @@ TEST_F(SessionTest, CleanupIsSafeTwiceAndReleasesOnce) {
     EXPECT_EQ(engine.ChatUI(), nullptr);
     EXPECT_EQ(engine.RecoveryMgr(), nullptr);
     EXPECT_EQ(engine.ArmClient(), nullptr);
-    EXPECT_EQ(std::vector<std::string>(spy.Calls().end() - 4, spy.Calls().end()),
-              (std::vector<std::string>{"ApeDetach", "ConferenceLeave", "Destroy", "Release"}));
+    const std::string conf = std::to_string(conference.ConferenceId());
+    EXPECT_EQ(
+        std::vector<std::string>(spy.CallsWithArguments().end() - 4,
+                                 spy.CallsWithArguments().end()),
+        (std::vector<std::string>{"ApeDetach(" + std::to_string(spy.ApeHandle()) + ")",
+                                  "ConferenceLeave(0, " + conf + ")", "Destroy(1)", "Release()"}));
 }
 
 TEST_F(SessionTest, SecondInitializeKeepsTheFirstServiceWindowAndTimer) {

@@ -6,13 +6,14 @@
 
 namespace {
 RecordingWindow* g_latest = nullptr;
+bool g_answerBack = false;
 
 std::int32_t IndexAt(void* param) {
     return param ? *static_cast<std::int32_t*>(param) : -2;
 }
 }  // namespace
 
-RecordingWindow::RecordingWindow() {
+RecordingWindow::RecordingWindow() : m_bAnswerBack(g_answerBack) {
     g_latest = this;
 }
 
@@ -20,7 +21,8 @@ RecordingWindow::~RecordingWindow() {
     if (g_latest == this) g_latest = nullptr;
 }
 
-void RecordingWindow::Install() {
+void RecordingWindow::Install(bool answerBack) {
+    g_answerBack = answerBack;
     SetChatWindowFactory([] { return new RecordingWindow; });
 }
 
@@ -30,6 +32,22 @@ void RecordingWindow::Uninstall() {
 
 RecordingWindow* RecordingWindow::Latest() {
     return g_latest;
+}
+
+void RecordingWindow::SetSink(IChatCommSinkForChatUI* sink) {
+    m_pSink = sink;
+    // A real window reports its selection as soon as it has a sink, before any menu exists.
+    if (sink) ReportSelection(m_selectedIndex);
+}
+
+void RecordingWindow::ReportSelection(std::int32_t index) {
+    if (!m_bAnswerBack || !m_pSink) return;
+    RecordedCommand rec;
+    rec.id = msg_SelectionChanged;
+    rec.name = ChatUIMessageName(msg_SelectionChanged);
+    rec.index = index;
+    m_commands.push_back(rec);
+    m_pSink->HandleUIMessage(msg_SelectionChanged, &index, nullptr);
 }
 
 int RecordingWindow::HandleCommand(int command, void* inParam, void* outParam) {
@@ -82,6 +100,18 @@ int RecordingWindow::HandleCommand(int command, void* inParam, void* outParam) {
             break;
     }
     m_commands.push_back(rec);
+    // The selection reports a real window sends from inside these commands.
+    if (command == msg_SelectedUserLeft) {
+        m_bSelectedUserLeft = true;
+        ReportSelection(-1);
+    } else if (command == msg_SelectMenuItem && m_bSelectedUserLeft) {
+        ReportSelection(-1);
+    } else if ((command == msg_SelectMenuItem || command == msg_SelectMenuItemAndAllowInput) &&
+               (rec.index != m_selectedIndex || m_bSelectedUserLeft)) {
+        m_selectedIndex = rec.index;
+        m_bSelectedUserLeft = false;
+        ReportSelection(rec.index);
+    }
     return 0;
 }
 

@@ -1,5 +1,7 @@
 // A chat window for engine tests: records every command with its decoded payload and
-// answers what a user would type or pick. Install it with RecordingWindow::Install().
+// answers what a user would type or pick. Install it with RecordingWindow::Install(); with
+// answerBack it also reports the selection from inside SetSink, 2303, 2305 and 2306 as a real
+// window does, re-entering the engine before the command returns.
 #pragma once
 
 #include <cstdint>
@@ -13,7 +15,8 @@ struct RecordedCommand {
     int id = 0;
     std::string name;           // protocol name, e.g. "msg_ShowText"
     std::string text;           // 2200/2201 text, 2304 title, 2602/2603 path
-    std::int32_t index = -2;    // 2301 position (-1 = append), 2302..2307 index, 2103 flag
+    std::int32_t index = -2;    // 2301 position (-1 = append), 2302..2307 index, 2103 flag,
+                                // 5001 reported index
     MenuStatus entry;           // 2301, 2307
     MenuStatusList menu;        // 2400
     AttendeeRecord attendee{};  // 2604
@@ -25,14 +28,15 @@ public:
     ~RecordingWindow() override;
 
     // Makes CreateUI build RecordingWindow objects from now on; Latest() is the newest one.
-    static void Install();
+    // With answerBack they report selections (5001) back to the engine, recorded in order.
+    static void Install(bool answerBack = false);
     // Makes CreateUI build no window at all.
     static void Uninstall();
     // The window made most recently and still alive, or null.
     static RecordingWindow* Latest();
 
     void SetSuperView(void* view) override { m_pSuperView = view; }
-    void SetSink(IChatCommSinkForChatUI* sink) override { m_pSink = sink; }
+    void SetSink(IChatCommSinkForChatUI* sink) override;
     int HandleCommand(int command, void* inParam, void* outParam) override;
 
     // What the window answers.
@@ -51,7 +55,14 @@ public:
     void* SuperView() const { return m_pSuperView; }
 
 private:
+    // Sends 5001 with the index to the engine and records that it did.
+    void ReportSelection(std::int32_t index);
+
     std::vector<RecordedCommand> m_commands;
+    // What a real window keeps to decide what it reports.
+    bool m_bAnswerBack = false;
+    std::int32_t m_selectedIndex = 0;
+    bool m_bSelectedUserLeft = false;
     IChatCommSinkForChatUI* m_pSink = nullptr;
     void* m_pSuperView = nullptr;
 };

@@ -1,6 +1,6 @@
-// Wraps a service object and records the name of every request the component makes, then
-// forwards it. Tests read the request names in order, the enroll payloads, the handle
-// requests and the registered sinks.
+// Wraps a service object and records every request the component makes, its name and its
+// arguments, then forwards it. Tests read the requests in order, the enroll payloads, the
+// handle requests and the registered sinks.
 #pragma once
 
 #include <cstdint>
@@ -17,6 +17,11 @@ public:
     SpyArmClient& operator=(const SpyArmClient&) = delete;
 
     const std::vector<std::string>& Calls() const { return m_calls; }
+    // Each call with its plain arguments, e.g. "ConferenceJoin(0, 5, 3)"; sinks are left out,
+    // handles and pointers written out only where they are constants.
+    const std::vector<std::string>& CallsWithArguments() const { return m_details; }
+    // The last call of that name with its arguments, or empty.
+    std::string Last(const std::string& name) const;
     std::size_t Count(const std::string& name) const;
     // The payload of every ApeEnroll, in order.
     const std::vector<std::string>& EnrollPayloads() const { return m_enrollPayloads; }
@@ -24,9 +29,14 @@ public:
     const std::vector<std::string>& HandleNames() const { return m_handleNames; }
     // The entries of every AllocNameHandle, in order, as they were handed over.
     const std::vector<std::vector<NameHandle>>& HandleRequests() const { return m_handleRequests; }
+    // The ape handle the service wrote at the last ApeAttach.
+    std::uint32_t ApeHandle() const { return m_apeHandle; }
     IArmSharedDataSink* RegisteredSink() const { return m_pRegisteredSink; }
     bool Released() const { return m_bReleased; }
-    void ClearCalls() { m_calls.clear(); }
+    void ClearCalls() {
+        m_calls.clear();
+        m_details.clear();
+    }
 
     int Release() override;
     int Connect(IArmNodeControllerSink* sink, const char* userName, std::uint32_t a,
@@ -64,11 +74,15 @@ public:
                       std::uint32_t* size) override;
 
 private:
+    void Record(const std::string& name, const std::string& arguments);
+
     IArmClient* m_pInner;
     std::vector<std::string> m_calls;
+    std::vector<std::string> m_details;
     std::vector<std::string> m_enrollPayloads;
     std::vector<std::string> m_handleNames;
     std::vector<std::vector<NameHandle>> m_handleRequests;
     IArmSharedDataSink* m_pRegisteredSink = nullptr;
+    std::uint32_t m_apeHandle = 0;
     bool m_bReleased = false;
 };

@@ -1,0 +1,124 @@
+// The exact log lines of the engine's session walk and of the host's tuning commands: hosts
+// and support staff search their logs for these texts.
+#include <gtest/gtest.h>
+
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "engine/chat_client.h"
+#include "platform/inproc_conference.h"
+#include "platform/virtual_run_loop.h"
+#include "tests/support/trace_capture.h"
+
+namespace {
+
+using Strings = std::vector<std::string>;
+using Engine = std::unique_ptr<CChatClient>;
+
+// Enter and Leave lines of one scoped trace around the given inner lines.
+Strings Scoped(const std::string& text, Strings inner = {}) {
+    inner.insert(inner.begin(), "Enter " + text);
+    inner.push_back("Leave " + text);
+    return inner;
+}
+
+const Strings kCleanup =
+    Scoped("CChatClient::Cleanup", {"CChatClient::ape detach", "CChatClient::conference leave",
+                                    "CChatClient::destroy", "CChatClient::after destroy"});
+
+// The lines of the capture that are the expected ones, each on the info channel with the
+// component's tag, kept in the order they were logged.
+Strings Matching(const TraceCapture& capture, const Strings& expected) {
+    Strings found;
+    std::size_t next = 0;
+    for (const TraceLine& line : capture.Lines()) {
+        if (next == expected.size()) break;
+        if (line.text != expected[next]) continue;
+        EXPECT_EQ(line.tag, "Chat") << line.text;
+        EXPECT_EQ(line.level, TraceLevel::Info) << line.text;
+        found.push_back(line.text);
+        ++next;
+    }
+    return found;
+}
+
+}  // namespace
+
+TEST(LogTexts, SessionWalkAndHostCommands) {
+    VirtualRunLoop loop;
+    ScopedCurrentRunLoop current{&loop};
+    InProcessConference conference;
+    struct Step {
+        const char* step;
+        bool withService;  // started on a conference before the capture begins
+        std::function<void(Engine&)> act;
+        Strings lines;
+    };
+    const std::string initialize = "CChatClient::Initialize";
+    const Step steps[] = {
+        {"Initialize", false,
+         [](Engine& e) {
+             ChatData data{};
+             data.lpszUserName = "Alice";
+             e->Initialize(data);
+         },
+         Scoped(initialize, {"Enter CChatClient::ShowChatUI, bShow = 1",
+                             "Enter CChatClient::SetChatPanelUI inState = -1",
+                             "Leave CChatClient::SetChatPanelUI inState = -1",
+                             "Leave CChatClient::ShowChatUI, bShow = 1",
+                             "Enter CChatClient::SetChatPanelUI inState = 0",
+                             "Leave CChatClient::SetChatPanelUI inState = 0"})},
+        {"attach confirmation", false, [](Engine& e) { e->ApeAttachConfirm(5, 0, 33); },
+         Scoped("CChatClient::::ApeAttachConfirm, ape_handle = 5, result = 0, userId = 33",
+                Scoped("CChatClient::Enroll"))},
+        {"enroll confirmation", false, [](Engine& e) { e->ApeEnrollConfirm(5, 0, 1, nullptr); },
+         Scoped("CChatClient::ApeEnrollConfirm, ape_handle = 5, result = 0, resource_number = 1")},
+        {"SetRosterStatus", false, [](Engine& e) { e->SetRosterStatus(0, 1); },
+         Scoped("CChatClient::SetRosterStatus, inNeedRosterInfo = 0, inBroadcastRosterInfo = 1",
+                Scoped("CChatClient::Enroll"))},
+        {"DisconnectIndication", false, [](Engine& e) { e->DisconnectIndication(7); },
+         Scoped("CChatClient::DisconnectIndication, reason=7.")},
+        {"Cleanup", true, [](Engine& e) { e->Cleanup(); }, kCleanup},
+        {"destructor", true, [](Engine& e) { e.reset(); },
+         Scoped("CChatClient::~CChatClient", kCleanup)},
+        {"SelectFeature", false, [](Engine& e) { e->SelectFeature(0x8000, 0, 0, 0, 0, nullptr); },
+         Scoped("CChatClient::SelectFeature")},
+        {"SetNBRStatus", false, [](Engine& e) { e->SetNBRStatus(3, 2, 1); },
+         Scoped("CChatClient::SetNBRStatus, dwStatus = 3, dwOption = 2, dwReserved = 1")},
+        {"SetSoundIncomingChat", false, [](Engine& e) { e->SetSoundIncomingChat(2); },
+         Scoped("CChatClient::SetSourndIncomingChat, inSoundWork = 2")},
+        {"SetSoundFSSpec", false, [](Engine& e) { e->SetSoundFSSpec(FSRef{}); },
+         Scoped("CChatClient::SetSoundFSSpec")},
+        {"customer id configuration", false,
+         [](Engine& e) {
+             e->SetConfig(3,
+                          "<chat ver=\"1.0\"><mtype>11</mtype><customerid>5</customerid></chat>");
+         },
+         Scoped("CChatClient::HandleCustomerIdConfig()")},
+        {"FAQ macro configuration", false,
+         [](Engine& e) {
+             e->SetConfig(2, "<chat ver=\"1.0\"><mtype>8</mtype><fname>Ann</fname></chat>");
+         },
+         Scoped("CChatClient::HandleFAQMacroInfoConfig()")},
+    };
+    std::uint32_t node = 7;
+    for (const Step& s : steps) {
+        SCOPED_TRACE(s.step);
+        Engine engine = std::make_unique<CChatClient>();
+        if (s.withService) {
+            ChatData data{};
+            data.pArmClient = conference.CreateClient(loop, node);
+            data.wConferenceID = conference.ConferenceId();
+            data.dwSessionID = 42;
+            data.lpszUserName = "Alice";
+            data.dwNodeID = node++;
+            engine->Initialize(data);
+            loop.RunUntilIdle();
+        }
+        TraceCapture capture;
+        s.act(engine);
+        EXPECT_EQ(Matching(capture, s.lines), s.lines);
+    }
+}
