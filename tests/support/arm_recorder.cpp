@@ -59,57 +59,11 @@ int ArmRecorder::ConnectConfirm(short result, std::uint32_t value) {
     return Record(std::move(event));
 }
 
-int ArmRecorder::DisconnectIndication(short reason) {
-    return Record(Event("DisconnectIndication", 0, reason));
-}
-
-int ArmRecorder::TransportStatusIndication(std::uint32_t status) {
-    ArmEvent event = Event("TransportStatusIndication");
-    event.value = status;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::DisconnectConfirm(short result) {
-    return Record(Event("DisconnectConfirm", 0, result));
-}
-
 int ArmRecorder::ConferenceJoinConfirm(std::uint16_t conferenceId, const char*, short result,
                                        std::uint32_t value) {
     ArmEvent event = Event("ConferenceJoinConfirm", 0, result);
     event.entityId = conferenceId;
     event.value = value;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::ConferenceLeaveIndication(std::uint16_t conferenceId, short reason) {
-    ArmEvent event = Event("ConferenceLeaveIndication", 0, reason);
-    event.entityId = conferenceId;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::ConferenceRosterConfirm(std::uint16_t conferenceId, short result) {
-    ArmEvent event = Event("ConferenceRosterConfirm", 0, result);
-    event.entityId = conferenceId;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::ConferenceRosterChanged(std::uint16_t conferenceId, std::uint32_t nodeCount) {
-    ArmEvent event = Event("ConferenceRosterChanged");
-    event.entityId = conferenceId;
-    event.value = nodeCount;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::ApeRosterConfirm(std::uint16_t conferenceId, short result) {
-    ArmEvent event = Event("ApeRosterConfirm", 0, result);
-    event.entityId = conferenceId;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::ApeRosterChanged(std::uint16_t conferenceId, std::uint32_t sessionId) {
-    ArmEvent event = Event("ConferenceApeRosterChanged");
-    event.entityId = conferenceId;
-    event.value = sessionId;
     return Record(std::move(event));
 }
 
@@ -143,72 +97,6 @@ int ArmRecorder::ApeDataIndication(std::uint32_t apeHandle, std::uint32_t sender
     return Record(std::move(event));
 }
 
-int ArmRecorder::ApeBufferFullIndication(std::uint32_t apeHandle) {
-    return Record(Event("ApeBufferFullIndication", apeHandle));
-}
-
-int ArmRecorder::TokenGrabConfirm(std::uint32_t apeHandle, std::uint32_t tokenId, short result) {
-    ArmEvent event = Event("TokenGrabConfirm", apeHandle, result);
-    event.value = tokenId;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::TokenInhibitConfirm(std::uint32_t apeHandle, std::uint32_t tokenId, short result) {
-    ArmEvent event = Event("TokenInhibitConfirm", apeHandle, result);
-    event.value = tokenId;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::TokenGiveIndication(std::uint32_t apeHandle, std::uint32_t tokenId,
-                                     std::uint32_t fromUserId) {
-    ArmEvent event = Event("TokenGiveIndication", apeHandle);
-    event.value = tokenId;
-    event.userId = fromUserId;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::TokenGiveConfirm(std::uint32_t apeHandle, std::uint32_t tokenId, short result) {
-    ArmEvent event = Event("TokenGiveConfirm", apeHandle, result);
-    event.value = tokenId;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::TokenPleaseIndication(std::uint32_t apeHandle, std::uint32_t tokenId,
-                                       std::uint32_t fromUserId) {
-    ArmEvent event = Event("TokenPleaseIndication", apeHandle);
-    event.value = tokenId;
-    event.userId = fromUserId;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::TokenReleaseConfirm(std::uint32_t apeHandle, std::uint32_t tokenId, short result) {
-    ArmEvent event = Event("TokenReleaseConfirm", apeHandle, result);
-    event.value = tokenId;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::TokenTestConfirm(std::uint32_t apeHandle, std::uint32_t tokenId,
-                                  std::uint32_t status) {
-    ArmEvent event = Event("TokenTestConfirm", apeHandle);
-    event.value = tokenId;
-    event.cacheId = status;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::ApeRosterInquireConfirm(std::uint32_t apeHandle, short result) {
-    return Record(Event("ApeRosterInquireConfirm", apeHandle, result));
-}
-
-int ArmRecorder::ApeRosterRefreshConfirm(std::uint32_t apeHandle, short result) {
-    return Record(Event("ApeRosterRefreshConfirm", apeHandle, result));
-}
-
-int ArmRecorder::ApeRosterReportIndication(std::uint32_t apeHandle, std::uint32_t sessionId) {
-    ArmEvent event = Event("ApeRosterReportIndication", apeHandle);
-    event.value = sessionId;
-    return Record(std::move(event));
-}
-
 int ArmRecorder::ApeRosterChanged(std::uint32_t serviceId, std::uint16_t value,
                                   std::uint32_t addedCount, std::uint32_t deletedCount,
                                   std::uint32_t modifiedCount, ARMApeRoster* records) {
@@ -222,18 +110,6 @@ int ArmRecorder::ApeRosterChanged(std::uint32_t serviceId, std::uint16_t value,
     return Record(std::move(event));
 }
 
-int ArmRecorder::ApeDetachIndication(std::uint32_t apeHandle, short reason) {
-    return Record(Event("ApeDetachIndication", apeHandle, reason));
-}
-
-int ArmRecorder::ApeDataIndicationEx(std::uint32_t apeHandle, std::uint32_t senderId,
-                                     const void* data, std::uint32_t length) {
-    ArmEvent event = Event("ApeDataIndicationEx", apeHandle);
-    event.userId = senderId;
-    event.data = Bytes(data, length);
-    return Record(std::move(event));
-}
-
 int ArmRecorder::ApeCacheActionConfirmEx(std::uint32_t apeHandle, std::uint32_t entityId,
                                          tagCacheAction action, std::uint32_t requestIdx,
                                          std::uint32_t cacheId, short result) {
@@ -242,15 +118,6 @@ int ArmRecorder::ApeCacheActionConfirmEx(std::uint32_t apeHandle, std::uint32_t 
     event.action = action;
     event.requestIdx = requestIdx;
     event.cacheId = cacheId;
-    return Record(std::move(event));
-}
-
-int ArmRecorder::SharedDataReceived(std::uint32_t apeHandle, std::uint32_t entityId,
-                                    std::uint32_t memHandle, short result) {
-    ArmEvent event = Event("SharedDataReceived", apeHandle, result);
-    event.entityId = entityId;
-    event.memHandle = memHandle;
-    ReadMemory(event);
     return Record(std::move(event));
 }
 
@@ -270,18 +137,16 @@ int ArmRecorder::SharedDataReceivedEx(std::uint32_t apeHandle, std::uint32_t cac
     return Record(std::move(event));
 }
 
-int ArmRecorder::AllocHandleConfirm(std::uint32_t apeHandle, std::uint32_t handle, short result) {
-    ArmEvent event = Event("AllocHandleConfirm", apeHandle, result);
-    event.entityId = handle;
-    return Record(std::move(event));
-}
-
 int ArmRecorder::AllocNameHandleConfirm(std::uint32_t apeHandle, std::uint32_t count,
                                         NameHandle* handles, short result, std::uint32_t reserved) {
     ArmEvent event = Event("AllocNameHandleConfirm", apeHandle, result);
     event.value = reserved;
     if (handles != nullptr) event.handles.assign(handles, handles + count);
     return Record(std::move(event));
+}
+
+int ArmRecorder::Other(const char* name) {
+    return Record(Event(name));
 }
 
 int ArmRecorder::Record(ArmEvent event) {

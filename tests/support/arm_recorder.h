@@ -65,61 +65,76 @@ public:
     void Clear() { m_events.clear(); }
 
     int ConnectConfirm(short result, std::uint32_t value) override;
-    int DisconnectIndication(short reason) override;
-    int TransportStatusIndication(std::uint32_t status) override;
-    int DisconnectConfirm(short result) override;
+    // Callbacks the services never make are recorded by name only.
+    int DisconnectIndication(short) override { return Other("DisconnectIndication"); }
+    int TransportStatusIndication(std::uint32_t) override { return Other("TransportStatus"); }
+    int DisconnectConfirm(short) override { return Other("DisconnectConfirm"); }
 
     int ConferenceJoinConfirm(std::uint16_t conferenceId, const char* conferenceName, short result,
                               std::uint32_t value) override;
-    int ConferenceLeaveIndication(std::uint16_t conferenceId, short reason) override;
-    int ConferenceRosterConfirm(std::uint16_t conferenceId, short result) override;
-    int ConferenceRosterChanged(std::uint16_t conferenceId, std::uint32_t nodeCount) override;
-    int ApeRosterConfirm(std::uint16_t conferenceId, short result) override;
-    int ApeRosterChanged(std::uint16_t conferenceId, std::uint32_t sessionId) override;
+    int ConferenceLeaveIndication(std::uint16_t, short) override {
+        return Other("LeaveIndication");
+    }
+    int ConferenceRosterConfirm(std::uint16_t, short) override { return Other("RosterConfirm"); }
+    int ConferenceRosterChanged(std::uint16_t, std::uint32_t) override { return Other("Roster"); }
+    int ApeRosterConfirm(std::uint16_t, short) override { return Other("ApeRosterConfirm"); }
+    int ApeRosterChanged(std::uint16_t, std::uint32_t) override {
+        return Other("ConferenceApeRosterChanged");
+    }
 
     int ApeAttachConfirm(std::uint32_t apeHandle, short result, std::uint32_t userId) override;
     int ApeEnrollConfirm(std::uint32_t apeHandle, short result, short resourceNumber,
                          ARMSessionResource* resources) override;
     int ApeDataIndication(std::uint32_t apeHandle, std::uint32_t senderId, std::uint32_t value,
                           std::uint16_t flags, const void* data, std::uint32_t length) override;
-    int ApeBufferFullIndication(std::uint32_t apeHandle) override;
-    int TokenGrabConfirm(std::uint32_t apeHandle, std::uint32_t tokenId, short result) override;
-    int TokenInhibitConfirm(std::uint32_t apeHandle, std::uint32_t tokenId, short result) override;
-    int TokenGiveIndication(std::uint32_t apeHandle, std::uint32_t tokenId,
-                            std::uint32_t fromUserId) override;
-    int TokenGiveConfirm(std::uint32_t apeHandle, std::uint32_t tokenId, short result) override;
-    int TokenPleaseIndication(std::uint32_t apeHandle, std::uint32_t tokenId,
-                              std::uint32_t fromUserId) override;
-    int TokenReleaseConfirm(std::uint32_t apeHandle, std::uint32_t tokenId, short result) override;
-    int TokenTestConfirm(std::uint32_t apeHandle, std::uint32_t tokenId,
-                         std::uint32_t status) override;
-    int ApeRosterInquireConfirm(std::uint32_t apeHandle, short result) override;
-    int ApeRosterRefreshConfirm(std::uint32_t apeHandle, short result) override;
-    int ApeRosterReportIndication(std::uint32_t apeHandle, std::uint32_t sessionId) override;
+    int ApeBufferFullIndication(std::uint32_t) override { return Other("BufferFull"); }
+    int TokenGrabConfirm(std::uint32_t, std::uint32_t, short) override { return Other("Token"); }
+    int TokenInhibitConfirm(std::uint32_t, std::uint32_t, short) override { return Other("Token"); }
+    int TokenGiveIndication(std::uint32_t, std::uint32_t, std::uint32_t) override {
+        return Other("Token");
+    }
+    int TokenGiveConfirm(std::uint32_t, std::uint32_t, short) override { return Other("Token"); }
+    int TokenPleaseIndication(std::uint32_t, std::uint32_t, std::uint32_t) override {
+        return Other("Token");
+    }
+    int TokenReleaseConfirm(std::uint32_t, std::uint32_t, short) override { return Other("Token"); }
+    int TokenTestConfirm(std::uint32_t, std::uint32_t, std::uint32_t) override {
+        return Other("Token");
+    }
+    int ApeRosterInquireConfirm(std::uint32_t, short) override { return Other("RosterInquire"); }
+    int ApeRosterRefreshConfirm(std::uint32_t, short) override { return Other("RosterRefresh"); }
+    int ApeRosterReportIndication(std::uint32_t, std::uint32_t) override {
+        return Other("RosterReport");
+    }
     int ApeRosterChanged(std::uint32_t serviceId, std::uint16_t value, std::uint32_t addedCount,
                          std::uint32_t deletedCount, std::uint32_t modifiedCount,
                          ARMApeRoster* records) override;
-    int ApeDetachIndication(std::uint32_t apeHandle, short reason) override;
-    int ApeDataIndicationEx(std::uint32_t apeHandle, std::uint32_t senderId, const void* data,
-                            std::uint32_t length) override;
+    int ApeDetachIndication(std::uint32_t, short) override { return Other("DetachIndication"); }
+    int ApeDataIndicationEx(std::uint32_t, std::uint32_t, const void*, std::uint32_t) override {
+        return Other("ApeDataIndicationEx");
+    }
     int ApeCacheActionConfirmEx(std::uint32_t apeHandle, std::uint32_t entityId,
                                 tagCacheAction action, std::uint32_t requestIdx,
                                 std::uint32_t cacheId, short result) override;
 
-    int SharedDataReceived(std::uint32_t apeHandle, std::uint32_t entityId, std::uint32_t memHandle,
-                           short result) override;
+    int SharedDataReceived(std::uint32_t, std::uint32_t, std::uint32_t, short) override {
+        return Other("SharedDataReceived");
+    }
     int SharedDataReceivedEx(std::uint32_t apeHandle, std::uint32_t cacheId, std::uint32_t entityId,
                              std::uint32_t memHandle, short result, tagCacheAction action,
                              std::uint32_t senderId, std::uint32_t value,
                              std::uint16_t flags) override;
 
-    int AllocHandleConfirm(std::uint32_t apeHandle, std::uint32_t handle, short result) override;
+    int AllocHandleConfirm(std::uint32_t, std::uint32_t, short) override {
+        return Other("AllocHandleConfirm");
+    }
     int AllocNameHandleConfirm(std::uint32_t apeHandle, std::uint32_t count, NameHandle* handles,
                                short result, std::uint32_t reserved) override;
 
 private:
     // Stores event, runs the hook; returns 0 (what the callbacks answer).
     int Record(ArmEvent event);
+    int Other(const char* name);
     // Reads a delivered memory handle into event.
     void ReadMemory(ArmEvent& event) const;
 
