@@ -65,6 +65,7 @@ void Simulator::Join(const ScenarioCommand& c) {
     p->nodeId = OptionNumber(c, "node", 0);
     p->loop = std::make_unique<ParticipantLoop>(m_clock, name);
     p->client = m_conference->CreateClient(*p->loop, p->nodeId);
+    p->service = std::make_unique<WatchedArmClient>(p->client);
     Participant& joined = *p;
     m_participants.push_back(std::move(p));
 
@@ -72,7 +73,7 @@ void Simulator::Join(const ScenarioCommand& c) {
     m_pNewWindow = nullptr;
     joined.handle = ChNewInstance();
     _tagChatData data{};
-    data.pArmClient = joined.client;
+    data.pArmClient = joined.service.get();
     data.wConferenceID = m_conference->ConferenceId();
     data.dwSessionID = m_sessionId;
     data.lpszUserName = joined.displayName.c_str();

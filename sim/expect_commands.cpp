@@ -1,4 +1,6 @@
 // Expectations: what a participant sees, compared with what the scenario says.
+#include <cstdio>
+
 #include "engine/chat_client.h"
 #include "sim/simulator.h"
 #include "sim/transcript_view.h"
@@ -95,6 +97,18 @@ void Simulator::Expect(const ScenarioCommand& c) {
             Fail(c, p->name + "'s newest warning is " + Quoted(p->warnings.back()));
         }
         p->warnings.clear();
+    } else if (kind == "service-flags") {
+        if (!needArgs(1)) return;
+        const auto want = ParseScenarioNumber(args[2]->value);
+        if (!want) return Fail(c, "expect service-flags takes a number");
+        const auto flags = p->service->LastCacheWriteFlags();
+        if (!flags) {
+            Fail(c, p->name + " has written no cache");
+        } else if (*flags != *want) {
+            char seen[16];
+            std::snprintf(seen, sizeof(seen), "0x%x", *flags);
+            Fail(c, p->name + "'s last cache write carried flags " + seen);
+        }
     } else {
         Fail(c, "expect " + kind + " is not available in this build");
     }

@@ -17,6 +17,7 @@
 #include "sim/lang/scenario.h"
 #include "sim/participant_loop.h"
 #include "sim/sim_window.h"
+#include "sim/watched_arm_client.h"
 
 class CChatClient;
 
@@ -45,6 +46,7 @@ private:
         std::uint32_t nodeId = 0;
         std::unique_ptr<ParticipantLoop> loop;
         InProcessArmClient* client = nullptr;
+        std::unique_ptr<WatchedArmClient> service;  // what the component holds
         ChatHandle handle = nullptr;
         SimWindow* window = nullptr;
         bool left = false;
