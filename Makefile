@@ -19,8 +19,11 @@ build: configure
 test: build
 	@cd $(BUILD) && ctest --output-on-failure -j$(JOBS)
 
-demo: build
-	@$(BUILD)/apps/quintara-demo
+# The demo builds quietly (the build's output shows only when it fails), then runs a training
+# session and leaves each participant's transcript (and window picture) under $(BUILD)/demo.
+demo: configure
+	@out=$$(cmake --build $(BUILD) -j$(JOBS) --target quintara-chat-sim 2>&1) || { echo "$$out"; exit 1; }
+	@$(BUILD)/sim/quintara-chat-sim --print --out $(BUILD)/demo --log $(BUILD)/demo/demo.log scenarios/demo.chat
 
 bench: configure
 	@cmake --build $(BUILD) --target benches -j$(JOBS)

@@ -1,4 +1,5 @@
 // The conference line, joining, and the host client's calls on the components.
+#include <cstdio>
 #include <cstring>
 
 #include "engine/chat_client.h"
@@ -44,6 +45,15 @@ void Simulator::Conference(const ScenarioCommand& c) {
     m_meetingType = static_cast<std::int32_t>(OptionNumber(c, "type", 0));
     m_bQM = !c.Positional().empty();
     m_sessionId = OptionNumber(c, "session", 1);
+    if (const ScenarioArg* start = c.Option("start")) {
+        CalendarTime origin;
+        char extra = 0;
+        const int fields =
+            std::sscanf(start->value.c_str(), "%d-%d-%d %d:%d:%d%c", &origin.year, &origin.month,
+                        &origin.day, &origin.hour, &origin.minute, &origin.second, &extra);
+        if (fields != 6 || !m_clock.SetCalendarOrigin(origin))
+            Fail(c, "start= takes a time such as \"2009-03-05 09:03:00\", not " + start->value);
+    }
     m_conference = std::make_unique<InProcessConference>();
     Settle();
 }

@@ -97,6 +97,12 @@ void Simulator::Expect(const ScenarioCommand& c) {
             Fail(c, p->name + "'s newest warning is " + Quoted(p->warnings.back()));
         }
         p->warnings.clear();
+    } else if (kind == "sound") {
+        if (!needArgs(1)) return;
+        const auto want = ParseScenarioNumber(args[2]->value);
+        if (!want) return Fail(c, "expect sound takes a number");
+        if (static_cast<std::uint32_t>(p->sounds) != *want)
+            Fail(c, p->name + " heard " + std::to_string(p->sounds) + " sound(s)");
     } else if (kind == "service-flags") {
         if (!needArgs(1)) return;
         const auto want = ParseScenarioNumber(args[2]->value);

@@ -2,6 +2,8 @@
 //   quintara-chat-sim [--print] [--out DIR] [--log FILE] SCENARIO
 // Exit status 0 when every expectation holds, 1 when some failed, 2 for a bad command line
 // or a scenario that does not read.
+#include <sys/stat.h>
+
 #include <cstdio>
 #include <cstring>
 #include <fstream>
@@ -58,6 +60,7 @@ int main(int argc, char** argv) {
                      error.message.c_str());
         return 2;
     }
+    if (!options.outputDir.empty()) mkdir(options.outputDir.c_str(), 0755);
     if (!logPath.empty()) {
         options.log = std::fopen(logPath.c_str(), "w");
         if (!options.log) {

@@ -18,6 +18,7 @@ public:
     void Post(Task task) override;
     TimerId AddTimer(double firstDelay, double interval, Task task) override;
     void CancelTimer(TimerId id) override;
+    CalendarTime CalendarNow() const override { return m_shared.CalendarNow(); }
 
     // The participant acting now (the one whose work runs, or whom the script addresses);
     // empty when nobody is.

@@ -1,9 +1,8 @@
 // The simulator's running core: dispatch, settling, the clock, participants and the end.
 #include "sim/simulator.h"
 
-#include <sys/stat.h>
-
 #include "engine/chat_client.h"
+#include "platform/sound.h"
 #include "platform/trace.h"
 #include "platform/warning_window.h"
 #include "sim/model_window.h"
@@ -71,6 +70,10 @@ Simulator::Simulator(SimOptions options) : m_options(std::move(options)) {
         m_pNewWindow = window;
         return window;
     });
+    SetSoundPlayer([this](const char*) {
+        for (auto& p : m_participants)
+            if (p->name == ParticipantLoop::Acting()) ++p->sounds;
+    });
     SetWarningPresenter([this](const char* title, const char* message) {
         const std::string& acting = ParticipantLoop::Acting();
         for (auto& p : m_participants)
@@ -85,6 +88,7 @@ Simulator::Simulator(SimOptions options) : m_options(std::move(options)) {
 Simulator::~Simulator() {
     CloseAll();
     SetWarningPresenter(nullptr);
+    SetSoundPlayer(nullptr);
     SetChatWindowFactory(nullptr);
     SetTraceSink(nullptr);
 }
@@ -178,7 +182,6 @@ void Simulator::CloseAll() {
 }
 
 void Simulator::WriteOutputs() {
-    mkdir(m_options.outputDir.c_str(), 0755);
     for (const auto& p : m_participants) {
         if (p->left) continue;
         const std::string base = m_options.outputDir + "/" + p->name;

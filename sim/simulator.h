@@ -52,6 +52,7 @@ private:
         bool left = false;
         std::size_t linesSeen = 0;          // transcript entries at the last expect or print
         std::vector<std::string> warnings;  // warning boxes shown, newest last
+        int sounds = 0;                     // incoming-chat sounds played
     };
     using Handler = void (Simulator::*)(const ScenarioCommand&);
 

@@ -7,7 +7,18 @@ TranscriptEntry ReadTranscriptEntry(const CChatContentStorage& store, std::size_
     const std::string_view line = store.GetLineAtIndex(index);
     const std::size_t tab = line.find('\t');
     std::string_view title = line.substr(0, tab);
-    if (tab != std::string_view::npos) entry.text = std::string(line.substr(tab + 1));
+    // Line breaks travel as CR or CR LF; the simulator shows each as one \n.
+    if (tab != std::string_view::npos) {
+        const std::string_view text = line.substr(tab + 1);
+        for (std::size_t i = 0; i < text.size(); ++i) {
+            if (text[i] != '\r') {
+                entry.text.push_back(text[i]);
+                continue;
+            }
+            entry.text.push_back('\n');
+            if (i + 1 < text.size() && text[i + 1] == '\n') ++i;
+        }
+    }
     if (!title.empty() && title.back() == '\r') title.remove_suffix(1);
     if (!title.empty() && title.back() == ':') title.remove_suffix(1);
     entry.title = std::string(title);

@@ -1,5 +1,5 @@
 // Reading the engine's transcript store the way the simulator reports it: one entry is a
-// title (without its ":" and CR), a text and a time.
+// title (without its ":" and CR), a text (line breaks as \n) and a time.
 #pragma once
 
 #include <string>
