@@ -3,12 +3,15 @@
 // Exit status 0 when every expectation holds, 1 when some failed, 2 for a bad command line
 // or a scenario that does not read.
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include <cstdio>
 #include <cstring>
 #include <fstream>
 #include <sstream>
 #include <string>
+
+#include <QApplication>
 
 #include "sim/lang/scenario.h"
 #include "sim/simulator.h"
@@ -69,6 +72,15 @@ int main(int argc, char** argv) {
         }
     }
 
+    // The windows are real chat windows; they draw offscreen. Qt wants a private runtime
+    // folder and complains on every run without one.
+    qputenv("QT_QPA_PLATFORM", "offscreen");
+    if (qEnvironmentVariableIsEmpty("XDG_RUNTIME_DIR")) {
+        const std::string runtime = "/tmp/runtime-" + std::to_string(getuid());
+        mkdir(runtime.c_str(), 0700);
+        qputenv("XDG_RUNTIME_DIR", runtime.c_str());
+    }
+    QApplication application(argc, argv);
     int failures;
     {
         Simulator simulator(options);

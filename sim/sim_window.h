@@ -22,8 +22,6 @@ public:
     virtual std::vector<PopupItem> Popup() const = 0;
     virtual bool InputEnabled() const = 0;
     virtual std::string InputText() const = 0;
-    // The lines of the transcript view, titles and texts in order.
-    virtual std::vector<std::string> TranscriptLines() const = 0;
 
     // The user types text into the input field (replacing what is there) and sends it;
     // false when the input field does not take text.

@@ -1,11 +1,14 @@
 // The simulator's running core: dispatch, settling, the clock, participants and the end.
 #include "sim/simulator.h"
 
+#include <QCoreApplication>
 #include "engine/chat_client.h"
 #include "platform/sound.h"
 #include "platform/trace.h"
 #include "platform/warning_window.h"
-#include "sim/model_window.h"
+
+#include "sim/qt_window.h"
+#include "sim/scripted_panels.h"
 
 namespace {
 
@@ -64,9 +67,10 @@ Simulator::Simulator(SimOptions options) : m_options(std::move(options)) {
         std::fprintf(log, "%-5s %s [%s] %s\n", LevelName(level), tag ? tag : "",
                      acting.empty() ? "-" : acting.c_str(), text);
     });
+    SetChatPanelProvider(std::make_shared<ScriptedPanels>(
+        [this](bool bSave, std::string* path) { return NextPanelAnswer(bSave, path); }));
     SetChatWindowFactory([this]() -> IChatWindow* {
-        auto* window = new ModelWindow(
-            [this](bool bSave, std::string* path) { return NextPanelAnswer(bSave, path); });
+        auto* window = new QtSimWindow(QString::fromStdString(ParticipantLoop::Acting()));
         m_pNewWindow = window;
         return window;
     });
@@ -90,6 +94,7 @@ Simulator::~Simulator() {
     SetWarningPresenter(nullptr);
     SetSoundPlayer(nullptr);
     SetChatWindowFactory(nullptr);
+    SetChatPanelProvider(nullptr);
     SetTraceSink(nullptr);
 }
 
@@ -114,7 +119,14 @@ void Simulator::Execute(const ScenarioCommand& command) {
 }
 
 void Simulator::Settle() {
-    while (m_clock.RunUntilIdle() != 0) {
+    // The windows' posted events (deferred deletions included) count as work too.
+    for (;;) {
+        QCoreApplication::sendPostedEvents();
+        QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+        if (m_clock.RunUntilIdle() != 0) continue;
+        QCoreApplication::processEvents();
+        QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+        if (m_clock.RunUntilIdle() == 0) return;
     }
 }
 
