@@ -55,17 +55,14 @@ bool ChatRoom::Select(Member& from, std::int32_t groupId, std::uint32_t node) {
     std::int32_t index =
         groupId >= 0 ? engine.GetIndexOfMenuByGroup(groupId) : engine.GetIndexOfMenuByNodeID(node);
     if (index == -1 && groupId >= 0) {
-        const CUsersGroup* group = nullptr;
-        for (std::int32_t i = 0; i < engine.GroupList().GetGroupsCount() && !group; ++i) {
-            const CUsersGroup* g = engine.GroupList().GetGroupByIndex(i);
-            if (g->GetGroupType() != 2 && g->GetGroupId() == static_cast<std::uint32_t>(groupId))
-                group = g;
-        }
         _tagChatGroupInfo info{};
         info.dwIndex = static_cast<std::uint32_t>(engine.Menu().size());
         info.dwGroupType = 1;
         info.dwGroupId = static_cast<std::uint32_t>(groupId);
-        info.cszGroupName = group && group->GetGrpName() ? group->GetGrpName() : "Group";
+        // The group's own name updates the group instead of adding one without a cache.
+        const char* name =
+            engine.GetGroupNameFromGroupCacheHandle(engine.GetCacheHandleFormGroupId(groupId));
+        info.cszGroupName = name ? name : "Audience";
         engine.AddGroup(&info, 1);
         index = engine.GetIndexOfMenuByGroup(groupId);
     } else if (index == -1) {
