@@ -13,6 +13,7 @@
 
 #include <QApplication>
 
+#include "platform/trace.h"
 #include "sim/lang/scenario.h"
 #include "sim/simulator.h"
 
@@ -81,6 +82,15 @@ int main(int argc, char** argv) {
         qputenv("XDG_RUNTIME_DIR", runtime.c_str());
     }
     QApplication application(argc, argv);
+    // Qt's own remarks (an offscreen window cannot be raised, ...) belong in the log too.
+    qInstallMessageHandler([](QtMsgType type, const QMessageLogContext&, const QString& text) {
+        const QByteArray bytes = text.toUtf8();
+        if (type == QtDebugMsg || type == QtInfoMsg) {
+            MacInfoTrace2("Qt", "%s", bytes.constData());
+        } else {
+            MacWarnTrace2("Qt", "%s", bytes.constData());
+        }
+    });
     int failures;
     {
         Simulator simulator(options);
