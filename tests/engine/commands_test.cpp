@@ -16,8 +16,6 @@
 namespace {
 
 using menutest::MenuHarness;
-using menutest::Options;
-using menutest::Person;
 
 // Reported telemetry actions, collected while the object lives.
 struct TelemetryCapture {
@@ -27,19 +25,6 @@ struct TelemetryCapture {
     ~TelemetryCapture() { SetTelemetrySink(nullptr); }
     std::vector<int> actions;
 };
-
-Options MeetingType(std::int32_t type) {
-    Options options;
-    options.meetingType = type;
-    return options;
-}
-
-int IndexOfGroup(const CChatClient& engine, std::int32_t groupId) {
-    const MenuStatusList& menu = engine.Menu();
-    for (std::size_t i = 0; i < menu.size(); ++i)
-        if (menu[i].nGroupID == groupId && menu[i].dwNodeID == 0) return static_cast<int>(i);
-    return -1;
-}
 
 std::vector<int> SelectedIndexes(const CChatClient& engine) {
     std::vector<int> selected;
@@ -56,8 +41,8 @@ void SeedGroups(MenuHarness& h) {
 TEST(Commands, SelectionChangedMarksExactlyTheReportedEntry) {
     MenuHarness h;
     SeedGroups(h);
-    const int everyone = IndexOfGroup(h.engine, GROUP_EVERYONE);
-    const int attendees = IndexOfGroup(h.engine, GROUP_ATTENDEES);
+    const int everyone = h.engine.GetIndexOfMenuByGroup(GROUP_EVERYONE);
+    const int attendees = h.engine.GetIndexOfMenuByGroup(GROUP_ATTENDEES);
     const int size = static_cast<int>(h.engine.Menu().size());
 
     const struct {
@@ -86,7 +71,7 @@ TEST(Commands, SelectionChangedMarksExactlyTheReportedEntry) {
 TEST(Commands, UnknownEventsAreRefusedAndChangeNothing) {
     MenuHarness h;
     SeedGroups(h);
-    std::int32_t everyone = IndexOfGroup(h.engine, GROUP_EVERYONE);
+    std::int32_t everyone = h.engine.GetIndexOfMenuByGroup(GROUP_EVERYONE);
     h.engine.HandleUIMessage(msg_SelectionChanged, &everyone, nullptr);
     const std::vector<std::string> titles = h.Titles();
     h.Commands();
@@ -99,7 +84,7 @@ TEST(Commands, UnknownEventsAreRefusedAndChangeNothing) {
 }
 
 TEST(Commands, ShowAttendeeListNamesOnlyPlainAttendees) {
-    MenuHarness h(MeetingType(3));
+    MenuHarness h({3});
     h.Enroll(
         {{201, "ann", 0}, {202, "bob", ROLE_PANELIST}, {203, "cy", 0}, {204, "dee", ROLE_HOST}});
     h.Commands();
@@ -116,7 +101,7 @@ TEST(Commands, ShowAttendeeListNamesOnlyPlainAttendees) {
 TEST(Commands, AttendeeSelectedWithoutChoiceReselectsTheSelectedEntry) {
     MenuHarness h;
     SeedGroups(h);
-    std::int32_t attendees = IndexOfGroup(h.engine, GROUP_ATTENDEES);
+    std::int32_t attendees = h.engine.GetIndexOfMenuByGroup(GROUP_ATTENDEES);
     h.engine.HandleUIMessage(msg_SelectionChanged, &attendees, nullptr);
     h.Commands();
     std::uint32_t none = 0;
@@ -133,9 +118,7 @@ TEST(Commands, AttendeeSelectedWithoutChoiceReselectsTheSelectedEntry) {
 
 TEST(Commands, AttendeeSelectedGivesThePickedUserAnEntryOutsidePanelMeetings) {
     // With the attendee selector an attendee gets an entry only when picked.
-    Options options = MeetingType(1);
-    options.selector = true;
-    MenuHarness h(options);
+    MenuHarness h({1, true});
     h.Enroll({{201, "ann", 0}});
     ASSERT_EQ(h.engine.GetIndexOfMenuByNodeID(201), -1);
     std::uint32_t picked = 201;
@@ -161,7 +144,7 @@ TEST(Commands, FeatureWordSetsModesAndTellsTheRecoveryManager) {
         {FEATURE_SAVE_FOR_REPORT | FEATURE_ALWAYS_RECORD, false, false, false, false},
     };
     for (const auto& c : cases) {
-        MenuHarness h(MeetingType(1));
+        MenuHarness h({1});
         h.Commands();
         TraceCapture capture;
         EXPECT_EQ(h.engine.SelectFeature(c.features, 0, 0, 0, 0, nullptr), 0);
@@ -187,7 +170,7 @@ TEST(Commands, FeatureWordSetsModesAndTellsTheRecoveryManager) {
 
 TEST(Commands, RecordingStatusesZeroAndThreeOweEveryGroupItsDescription) {
     for (const std::uint32_t status : {0u, 1u, 2u, 3u, 4u}) {
-        MenuHarness h(MeetingType(3));
+        MenuHarness h({3});
         h.engine.SetAllCacheSendGroupInfoStatus(0);
         EXPECT_EQ(h.engine.SetNBRStatus(status, 5, 6), 0);
         const bool marked = status == 0 || status == 3;
@@ -226,7 +209,7 @@ TEST(Commands, ConfigurationKindsAndTheirRefusals) {
         {7, faq, 77, false},
     };
     for (const auto& c : cases) {
-        MenuHarness h(MeetingType(1));
+        MenuHarness h({1});
         h.engine.RecoveryMgr()->SetCustomerId(77);
         EXPECT_EQ(h.engine.SetConfig(c.type, c.xml.c_str()), 0);
         EXPECT_EQ(h.engine.RecoveryMgr()->GetCustomerId(), c.customerId) << c.type << c.xml;
@@ -236,7 +219,7 @@ TEST(Commands, ConfigurationKindsAndTheirRefusals) {
 }
 
 TEST(Commands, ConfigurationHandlersReportWhetherTheyTookTheText) {
-    MenuHarness h(MeetingType(1));
+    MenuHarness h({1});
     EXPECT_EQ(h.engine.HandleCustomerIdConfig(
                   "<chat ver=\"1.0\"><mtype>11</mtype><customerid>0</customerid></chat>"),
               1);
@@ -256,7 +239,7 @@ TEST(Commands, ConfigurationHandlersReportWhetherTheyTookTheText) {
 
 TEST(Commands, ClosingThePickerWaitsForItsWarning) {
     for (const std::int32_t warning : {0, 1}) {
-        MenuHarness h(MeetingType(3));
+        MenuHarness h({3});
         h.window->warningShowing = warning;
         h.Commands();
         h.engine.CloseSeltAttDlg();
@@ -264,7 +247,7 @@ TEST(Commands, ClosingThePickerWaitsForItsWarning) {
                                         : (std::vector<std::string>{"msg_CloseAttendeeWarning",
                                                                     "msg_CloseAttendeeDialog"}));
     }
-    MenuHarness h(MeetingType(3));
+    MenuHarness h({3});
     h.Commands();
     h.engine.CloseAllDlg();
     EXPECT_EQ(h.Commands(), std::vector<std::string>{"msg_CloseAllDialogs"});
