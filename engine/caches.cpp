@@ -101,7 +101,12 @@ int CChatClient::AllocNameHandleConfirm(std::uint32_t apeHandle, std::uint32_t c
         const NameHandle& entry = handles[i];
         const std::string name = HandleName(entry);
         const std::uint32_t groupId = GetGroupIdFormCacheName(name.c_str());
-        if (groupId != 0) {
+        // A short customer id makes the customer cache's name read like a group cache's: the
+        // name the engine asked for decides first.
+        if (m_CustomerCacheHandle.name[0] != '\0' &&
+            SameHandleName(m_CustomerCacheHandle, name.c_str())) {
+            m_CustomerCacheHandle.handle_value = entry.handle_value;
+        } else if (groupId != 0) {
             for (std::int32_t g = 0; g < m_GroupList.GetGroupsCount(); ++g) {
                 CUsersGroup* group = m_GroupList.GetGroupByIndex(g);
                 if (!IsCacheGroup(group) || group->GetGroupId() != groupId) continue;
@@ -111,8 +116,6 @@ int CChatClient::AllocNameHandleConfirm(std::uint32_t apeHandle, std::uint32_t c
             }
         } else if (SameHandleName(m_UserInfoCacheHandle, name.c_str())) {
             m_UserInfoCacheHandle.handle_value = entry.handle_value;
-        } else if (SameHandleName(m_CustomerCacheHandle, name.c_str())) {
-            m_CustomerCacheHandle.handle_value = entry.handle_value;
         } else if (SameHandleName(m_ChatStatusCacheHandle, name.c_str())) {
             m_ChatStatusCacheHandle.handle_value = entry.handle_value;
         }

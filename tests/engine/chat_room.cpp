@@ -27,6 +27,7 @@ Member& ChatRoom::Join(const Person& person, IHostChatSink* hostSink) {
     m.client = conference.CreateClient(loop, person.node);
     m.engine.SetRosters(person.roles, 0);
     if (m_features != 0) m.engine.SelectFeature(m_features, 0, 0, 0, 0, nullptr);
+    if (beforeStart) beforeStart(m.engine);
     _tagChatData data{};
     data.pArmClient = m.client;
     data.pHostSink = hostSink;

@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <deque>
+#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
@@ -49,6 +50,9 @@ public:
     // Names of the members whose transcript ends with the line.
     std::vector<std::string> Holders(const std::string& line) const;
     void Run() { loop.RunUntilIdle(); }
+
+    // Runs on every member's engine before it starts (a host's configuration).
+    std::function<void(CChatClient&)> beforeStart;
 
     VirtualRunLoop loop;
     ScopedCurrentRunLoop current{&loop};

@@ -3,6 +3,7 @@
 // a shown line leaves in window, transcript and host.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdio>
 #include <optional>
 #include <string>
@@ -16,6 +17,7 @@
 #include "platform/calendar.h"
 #include "platform/sound.h"
 #include "tests/engine/chat_room.h"
+#include "tests/support/arm_recorder.h"
 #include "tests/support/trace_capture.h"
 
 namespace {
@@ -191,6 +193,69 @@ TEST_F(Receiving, CacheItemsThatAreNoChatLineAreTakenQuietlyOrDropped) {
         EXPECT_TRUE(ChatRoom::Transcript(hana).empty());
         for (const std::string& text : capture.Texts())
             EXPECT_EQ(text.find("fake"), std::string::npos);
+    }
+}
+
+TEST_F(Receiving, AnItemLargerThanAnyChatDocumentIsNotRead) {
+    Member& hana = *room.members[0];
+    ArmCacheDelivery delivery;
+    delivery.entityId = hana.engine.GetCacheHandleFormGroupId(GROUP_EVERYONE);
+    const std::vector<std::uint8_t> huge(3 * 1024 * 1024, 'x');
+    TraceCapture capture;
+    ASSERT_TRUE(hana.client->InjectCacheDelivery(delivery, huge));
+    room.Run();
+    EXPECT_TRUE(capture.Has(TraceLevel::Warn,
+                            "CChatClient::SharedDataReceivedEx, item of 3145728 bytes dropped"));
+    std::uint32_t mem = 0;
+    ASSERT_EQ(hana.client->AllocMemHandle(huge.size(), &mem), 0);
+    std::string out = "kept";
+    EXPECT_FALSE(hana.engine.AllocStringForMemoryHandle(mem, out));
+    EXPECT_EQ(out, "kept");
+    EXPECT_TRUE(ChatRoom::Transcript(hana).empty());
+}
+
+TEST(CustomerCache, ReceivedAndQMSentLinesAreCopiedOnlyWhenTheyWereShownOrSent) {
+    // A customer id short enough to read like a group id still names the customer cache.
+    ChatRoom room(1, FEATURE_QM_MODE);
+    room.beforeStart = [](CChatClient& engine) {
+        engine.SetConfig(3,
+                         "<chat ver=\"1.0\"><mtype>11</mtype><customerid>555</customerid></chat>");
+    };
+    Member& hana = room.Join({"Hana", kHost, ROLE_HOST});
+    Member& ann = room.Join({"Ann", kAttendee, 0});
+    room.SetHostAndPresenter(kHost, 0);
+    ann.client->FailNext(ArmOperation::ApeSendData, 9);
+    room.Say(ann, "refused", -1, kHost);
+    room.Say(ann, "to all", GROUP_EVERYONE);
+    room.Say(ann, "to you", -1, kHost);
+    ArmRecorder copies(hana.client);
+    hana.client->ApeRequestSharedDataEx(hana.client->ApeHandle(),
+                                        hana.engine.CustomerCacheHandle().handle_value, 0,
+                                        CACHE_REQUEST_RETRIEVE, 255, &copies);
+    room.Run();
+    Names texts;
+    for (const ArmEvent& item : copies.Named("SharedDataReceivedEx")) {
+        const std::string text(item.data.begin(), item.data.end());
+        const std::size_t at = text.find("<message><![CDATA[");
+        if (at == std::string::npos) continue;  // the cache's initial set
+        texts.push_back(text.substr(at + 18, text.find("]]>", at) - at - 18) +
+                        (text.find("<GroupCacheId>") != std::string::npos ? " #" : ""));
+    }
+    // Both receivers copy the group line with its cache id; the private line is copied by its
+    // sender (QM) and its receiver; the refused one by nobody.
+    std::sort(texts.begin(), texts.end());
+    EXPECT_EQ(texts, (Names{"to all #", "to all #", "to you", "to you"}));
+}
+
+TEST(Recovery, AJoinerFindingTheCachesInUseStartsRecoveryOnce) {
+    for (const std::uint32_t features :
+         {FEATURE_QM_MODE | FEATURE_GROUP_MSG_RECOVERY, FEATURE_QM_MODE}) {
+        ChatRoom room(1, features);
+        room.Join({"Hana", kHost, ROLE_HOST});
+        TraceCapture capture;
+        room.Join({"Ann", kAttendee, 0});
+        EXPECT_EQ(capture.Has("Start recovery customer cache data......"),
+                  features != FEATURE_QM_MODE);
     }
 }
 
