@@ -155,7 +155,7 @@ int CChatClient::OnGroupDelivery(std::uint32_t cacheId, std::uint32_t entityId,
     if (!bLive) return 1;
     CacheGroupMsg2CustomerCache(&pdu, cacheId);
     // A restored copy of this line must not show it a second time.
-    if (m_pRecoveryMgr) {
+    if (m_pRecoveryMgr && m_pRecoveryMgr->IsRecoveryRunning()) {
         const std::uint32_t groupId =
             entityId != 0 ? GetGroupIdFormCacheHandle(entityId) : pdu.GetGroupID_DWORD();
         m_pRecoveryMgr->NoteLiveGroupMessage(groupId, cacheId);
