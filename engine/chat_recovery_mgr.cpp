@@ -117,8 +117,8 @@ int ChatRecoveryMgr::HandleCustomerRecovery(std::uint32_t, std::uint32_t, std::u
 }
 
 bool ChatRecoveryMgr::CheckUpdate4GroupRecovery(std::uint32_t entityId) {
-    if (!IsRecoveryRunning() || !m_pCmdSink) return false;
-    return GetGroupIdFormCacheHandle(entityId) == m_Mediator.GetGroupId();
+    if (!IsRecoveryRunning() || !m_pCmdSink || entityId == 0) return false;
+    return entityId == m_pCmdSink->GetCacheHandleFormGroupId(m_Mediator.GetGroupId());
 }
 
 int ChatRecoveryMgr::HandleGroupRecovery(std::uint32_t cacheId, std::uint32_t entityId,

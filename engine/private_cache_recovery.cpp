@@ -13,17 +13,12 @@ constexpr std::uint32_t kEveryoneGroupId = 15;
 
 int PrivateCacheRecovery::RecoverPrivateMessages(const std::string& text) {
     if (text.empty() || !m_pCmdSink) return 0;
-    switch (CKvoChatXMLPDU().GetPDUType(text)) {
-        case XMLPDU_PRIVATE_MESSAGE:
-            return RecoverPrivateMessage(text);
-        case XMLPDU_GROUP_MESSAGE:
-            return RecoverGroupMessage(text);
-        default:
-            return 0;
-    }
-}
-
-int PrivateCacheRecovery::RecoverPrivateMessage(const std::string& text) {
+    // Most entries are copies of group lines: read as one first. A text of another kind fails
+    // the type check, which leaves the type the text names in the PDU, so no entry is parsed
+    // more than twice and none only to learn its type.
+    CGroupMessagePDU group;
+    if (group.ParseXMLPDU(text)) return ShowGroupMessage(group);
+    if (group.GetMainType_Int() != XMLPDU_PRIVATE_MESSAGE) return 0;
     CPrivateMessagePDU pdu;
     if (!pdu.ParseXMLPDU(text)) return 0;
     if (m_pFilter && !m_pFilter->FirstShowOfPrivateMessage(
@@ -33,9 +28,7 @@ int PrivateCacheRecovery::RecoverPrivateMessage(const std::string& text) {
     return 1;
 }
 
-int PrivateCacheRecovery::RecoverGroupMessage(const std::string& text) {
-    CGroupMessagePDU pdu;
-    if (!pdu.ParseXMLPDU(text)) return 0;
+int PrivateCacheRecovery::ShowGroupMessage(CGroupMessagePDU& pdu) {
     const std::uint32_t groupId = pdu.GetGroupID_DWORD();
     const std::uint32_t cacheId = pdu.GetGroupCacheId_DWORD();
     // Cache ids count per cache: only the everyone group's tell how far its own cache, read

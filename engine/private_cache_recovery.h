@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <string>
 
+class CGroupMessagePDU;
 class IChatDataCmdProcess;
 class RecoveredMessageFilter;
 
@@ -33,8 +34,8 @@ public:
     int RecoverPrivateMessages(const std::string& text);
 
 private:
-    int RecoverPrivateMessage(const std::string& text);
-    int RecoverGroupMessage(const std::string& text);
+    // Shows a group line read from the customer cache unless it was shown before; 1 when shown.
+    int ShowGroupMessage(CGroupMessagePDU& pdu);
 
     std::uint32_t m_dwCustomerId = 0;           // names the customer cache; 0 = none
     std::uint32_t m_dwCustomerCacheValue = 0;   // the customer cache handle
