@@ -149,7 +149,9 @@ void CChatClient::OnChatStatusCacheAnswer(std::uint32_t memHandle, short result,
         if (memHandle != 0 && AllocStringForMemoryHandle(memHandle, status) && !status.empty()) {
             // Somebody initialised the caches already: only join them.
             SetAllGroupCacheSetFlag();
-            if (m_pRecoveryMgr && m_pRecoveryMgr->GetCustomerId() != 0) SetCustomerCache();
+            // The customer cache is not set here: it holds everybody's history, which a set
+            // would wipe just before recovery reads it. Recovery sets it when it finds that
+            // nobody ever did.
             if (m_pRecoveryMgr &&
                 m_pRecoveryMgr->CheckUpdate4CustomRecovery(m_UserInfoCacheHandle.handle_value,
                                                            m_CustomerCacheHandle.handle_value))

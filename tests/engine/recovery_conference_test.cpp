@@ -1,0 +1,238 @@
+// Late joiners on the in-process conference, in QM mode with group-message recovery: what
+// history they see, with which titles and names, once each and in order, what they leave in
+// the customer cache for the next one, and how they fare when the service refuses a read.
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <string>
+#include <vector>
+
+#include "api/ui_protocol.h"
+#include "engine/chat_recovery_mgr.h"
+#include "pdu/private_message_pdu.h"
+#include "tests/engine/chat_room.h"
+#include "tests/support/trace_capture.h"
+
+using namespace chatroom;
+
+namespace {
+
+using Strings = std::vector<std::string>;
+
+constexpr std::uint32_t kRecover = FEATURE_QM_MODE | FEATURE_GROUP_MSG_RECOVERY;
+constexpr std::uint32_t kCustomerId = 770001;
+const Person kAnn{"Ann", 11, 0};
+const Person kBob{"Bob", 12, 0};
+const Person kCy{"Cy", 13, 0};
+const Person kDee{"Dee", 14, 0};
+constexpr const char* kStarted = "Start recovery customer cache data......";
+
+// Every participant that joins from now on is configured with the customer id (0: none).
+void GiveCustomerId(ChatRoom& room, std::uint32_t customerId) {
+    room.beforeStart = [customerId](CChatClient& engine) {
+        const std::string config = "<chat ver=\"1.0\"><mtype>11</mtype><customerid>" +
+                                   std::to_string(customerId) + "</customerid></chat>";
+        engine.SetConfig(3, config.c_str());
+    };
+}
+
+// The participant leaves: its engine is destroyed and the conference runs on.
+void Leave(ChatRoom& room, const Member& member) {
+    for (auto it = room.members.begin(); it != room.members.end(); ++it) {
+        if (it->get() != &member) continue;
+        room.members.erase(it);
+        break;
+    }
+    room.Run();
+}
+
+// A host that, when its participant shows the first line, has another participant send one
+// to everyone, without running the conference: it arrives while recovery is under way.
+class SayWhileRestoring final : public IHostChatSink {
+public:
+    SayWhileRestoring(ChatRoom& room, Member& from, std::string text)
+        : m_room(room), m_from(from), m_text(std::move(text)) {}
+    void OnIncomingChat(const char*, const char*, std::uint32_t) override {
+        if (m_bSaid) return;
+        m_bSaid = true;
+        m_room.Select(m_from, GROUP_EVERYONE);
+        m_from.window->inputText = m_text;
+        m_from.engine.HandleUIMessage(msg_SendChat, nullptr, nullptr);
+    }
+    void OnChatShown() override {}
+    void OnChatModified(bool) override {}
+    void OnChatContentChanged(bool) override {}
+
+private:
+    ChatRoom& m_room;
+    Member& m_from;
+    std::string m_text;
+    bool m_bSaid = false;
+};
+
+// Makes the nth retrieval the participant asks for (1 user info, 2 customer cache, 3 the
+// everyone group's cache) be refused by its service.
+class RefuseNthRetrieval {
+public:
+    RefuseNthRetrieval(ChatRoom& room, int nth) {
+        SetTraceSink([&room, nth, this](TraceLevel level, const char*, const char* text) {
+            lines.push_back({level, "", text});
+            if (std::string(text) == "Enter CChatClient::ChatRequestSharedDataEx" &&
+                ++m_seen == nth)
+                room.members.back()->client->FailNext(ArmOperation::ApeRequestSharedDataEx, 1104);
+        });
+    }
+    ~RefuseNthRetrieval() {
+        SetTraceSink([](TraceLevel, const char*, const char*) {});
+    }
+    bool Warned(const std::string& text) const {
+        for (const TraceLine& line : lines)
+            if (line.level == TraceLevel::Warn && line.text == text) return true;
+        return false;
+    }
+
+    std::vector<TraceLine> lines;
+
+private:
+    int m_seen = 0;
+};
+
+}  // namespace
+
+TEST(LateJoiner, SeesPrivateAndEveryoneHistoryOnceNamedAlsoForThoseWhoLeft) {
+    ChatRoom room(1, kRecover);
+    GiveCustomerId(room, kCustomerId);
+    Member& ann = room.Join(kAnn);
+    Member& bob = room.Join(kBob);
+    room.Say(ann, "hi Bob", -1, kBob.node);
+    room.Say(bob, "one", GROUP_EVERYONE);
+    room.Say(ann, "two", GROUP_EVERYONE);
+    Leave(room, bob);
+
+    TraceCapture trace;
+    Member& cy = room.Join(kCy);
+    EXPECT_TRUE(trace.Has(kStarted));
+    // Every copy of a line (sender's and receiver's) is in the customer cache; each shows once.
+    const Strings history{"from Ann to Bob (privately)|hi Bob", "from Bob to Everyone|one",
+                          "from Ann to Everyone|two"};
+    EXPECT_EQ(ChatRoom::Transcript(cy), history);
+
+    // Recovery never runs twice in one engine.
+    trace.Clear();
+    cy.engine.CheckChatStatus();
+    room.Run();
+    EXPECT_FALSE(trace.Has(kStarted));
+    room.Say(ann, "three", GROUP_EVERYONE);
+    EXPECT_EQ(ChatRoom::Transcript(cy).size(), history.size() + 1);
+}
+
+TEST(LateJoiner, AnEveryoneLineSentWhileRestoringIsShownOnceInOrder) {
+    ChatRoom room(1, kRecover);
+    GiveCustomerId(room, kCustomerId);
+    Member& ann = room.Join(kAnn);
+    room.Say(ann, "before", GROUP_EVERYONE);
+    SayWhileRestoring host(room, ann, "during");
+    Member& cy = room.Join(kCy, &host);
+    const Strings expected{"from Ann to Everyone|before", "from Ann to Everyone|during"};
+    EXPECT_EQ(ChatRoom::Transcript(cy), expected);
+    EXPECT_FALSE(cy.engine.RecoveryMgr()->IsRecoveryRunning());
+    // Ann's copy and Cy's backup of "during" are both in the customer cache: shown once.
+    EXPECT_EQ(ChatRoom::Transcript(room.Join(kDee)), expected);
+}
+
+TEST(LateJoiner, BacksUpTheEveryoneHistoryIntoACustomerCacheNobodySetBefore) {
+    ChatRoom room(1, kRecover);
+    Member& ann = room.Join(kAnn);  // no customer id: no customer cache, no copies
+    room.Say(ann, "kept in the everyone cache only", GROUP_EVERYONE);
+    GiveCustomerId(room, kCustomerId);
+    Member& cy = room.Join(kCy);  // finds the customer cache never set, sets it, backs up
+    EXPECT_EQ(ChatRoom::Transcript(cy).size(), 1u);
+    Leave(room, ann);
+
+    // Dee cannot read the everyone group's cache: the backup, named from the history roster
+    // since Ann has left, is all she has. She is told so in the log and chats on.
+    RefuseNthRetrieval refuse(room, 3);
+    Member& dee = room.Join(kDee);
+    EXPECT_EQ(ChatRoom::Transcript(dee),
+              Strings({"from Ann to Everyone|kept in the everyone cache only"}));
+    EXPECT_TRUE(refuse.Warned("ChatRecoveryMgr: cache of group 15 (handle " +
+                              std::to_string(cy.engine.GetCacheHandleFormGroupId(15)) +
+                              ") not read (result 1104); recovery ends"));
+    room.Say(cy, "still here", GROUP_EVERYONE);
+    EXPECT_EQ(ChatRoom::Transcript(dee).back(), "from Cy to Everyone|still here");
+}
+
+TEST(LateJoiner, ARefusedReadLeavesTheRestOfTheHistoryAndALiveChat) {
+    const struct {
+        int nth;
+        const char* warning;  // with %u for the cache handle
+        Strings history;
+    } cases[] = {
+        {1,
+         "ChatRecoveryMgr: user info cache %u not read (result 1104); senders who have left "
+         "stay unnamed",
+         {"from Ann to Bob (privately)|hi", "from Ann to Everyone|one"}},
+        {2,
+         "ChatRecoveryMgr: customer cache %u not read (result 1104); restoring the everyone "
+         "group only",
+         {"from Ann to Everyone|one"}},
+        {3,
+         "ChatRecoveryMgr: cache of group 15 (handle %u) not read (result 1104); recovery ends",
+         {"from Ann to Bob (privately)|hi", "from Ann to Everyone|one"}},
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.nth);
+        ChatRoom room(1, kRecover);
+        GiveCustomerId(room, kCustomerId);
+        Member& ann = room.Join(kAnn);
+        room.Join(kBob);
+        room.Say(ann, "hi", -1, kBob.node);
+        room.Say(ann, "one", GROUP_EVERYONE);
+        RefuseNthRetrieval refuse(room, c.nth);
+        Member& cy = room.Join(kCy);
+        const std::uint32_t handles[] = {cy.engine.UserInfoCacheHandle().handle_value,
+                                         cy.engine.CustomerCacheHandle().handle_value,
+                                         cy.engine.GetCacheHandleFormGroupId(15)};
+        char warning[256];
+        std::snprintf(warning, sizeof warning, c.warning, handles[c.nth - 1]);
+        EXPECT_TRUE(refuse.Warned(warning));
+        EXPECT_EQ(ChatRoom::Transcript(cy), c.history);
+        room.Say(ann, "live", GROUP_EVERYONE);
+        EXPECT_EQ(ChatRoom::Transcript(cy).back(), "from Ann to Everyone|live");
+    }
+}
+
+TEST(LateJoiner, WithoutQMModeOrGroupRecoveryNothingIsRestored) {
+    for (const std::uint32_t features : {FEATURE_QM_MODE, FEATURE_GROUP_MSG_RECOVERY}) {
+        SCOPED_TRACE(features);
+        ChatRoom room(1, features);
+        GiveCustomerId(room, kCustomerId);
+        Member& ann = room.Join(kAnn);
+        room.Say(ann, "before", GROUP_EVERYONE);
+        TraceCapture trace;
+        Member& cy = room.Join(kCy);
+        EXPECT_FALSE(trace.Has(kStarted));
+        EXPECT_TRUE(ChatRoom::Transcript(cy).empty());
+    }
+}
+
+TEST(LateJoiner, AnEngineCleanedUpMidwayIgnoresEveryCacheAndShowsNoRestoredLine) {
+    ChatRoom room(1, kRecover);
+    GiveCustomerId(room, kCustomerId);
+    Member& cy = room.Join(kCy);
+    const std::uint32_t caches[] = {
+        cy.engine.UserInfoCacheHandle().handle_value, cy.engine.CustomerCacheHandle().handle_value,
+        cy.engine.GetCacheHandleFormGroupId(15), cy.engine.ChatStatusCacheHandle().handle_value};
+    cy.engine.Cleanup();
+    ASSERT_EQ(cy.engine.RecoveryMgr(), nullptr);
+    for (const std::uint32_t cache : caches) {
+        for (const tagCacheAction action : {CACHE_APPEND, CACHE_REPLY_LAST})
+            cy.engine.SharedDataReceivedEx(1, 5, cache, 0x100001, 0, action, 0, 0, 0);
+    }
+    CPrivateMessagePDU between;
+    between.SetSendID(5u);
+    between.SetReveID(6u);
+    between.SetMessageContent("between two others");
+    EXPECT_EQ(cy.engine.ParseAndShowPrivateMessages(&between, 0), -1);
+    EXPECT_TRUE(ChatRoom::Transcript(cy).empty());
+}
