@@ -73,7 +73,7 @@ void Simulator::Join(const ScenarioCommand& c) {
     p->name = name;
     p->displayName = c.Option("name") ? c.Option("name")->value : name;
     p->nodeId = OptionNumber(c, "node", 0);
-    p->loop = std::make_unique<ParticipantLoop>(m_clock, name);
+    p->loop = std::make_unique<ParticipantLoop>(SharedLoop(), name);
     p->client = m_conference->CreateClient(*p->loop, p->nodeId);
     p->service = std::make_unique<WatchedArmClient>(p->client);
     Participant& joined = *p;

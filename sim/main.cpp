@@ -1,5 +1,5 @@
 // quintara-chat-sim: runs a conference scenario on the in-process conference.
-//   quintara-chat-sim [--print] [--out DIR] [--log FILE] SCENARIO
+//   quintara-chat-sim [--gui] [--print] [--out DIR] [--log FILE] SCENARIO
 // Exit status 0 when every expectation holds, 1 when some failed, 2 for a bad command line
 // or a scenario that does not read.
 #include <sys/stat.h>
@@ -21,7 +21,9 @@ namespace {
 
 int Usage() {
     std::fprintf(stderr,
-                 "usage: quintara-chat-sim [--print] [--out DIR] [--log FILE] SCENARIO\n"
+                 "usage: quintara-chat-sim [--gui] [--print] [--out DIR] [--log FILE] SCENARIO\n"
+                 "  --gui       on screen in real time, one command every half second; the\n"
+                 "              windows stay open for the user when the script ends\n"
                  "  --print     print every transcript and send-to list at the end\n"
                  "  --out DIR   write each transcript (and window picture) into DIR\n"
                  "  --log FILE  write every log line, with the participant's name, to FILE\n");
@@ -36,7 +38,9 @@ int main(int argc, char** argv) {
     std::string logPath;
     for (int i = 1; i < argc; ++i) {
         const bool hasValue = i + 1 < argc;
-        if (std::strcmp(argv[i], "--print") == 0) {
+        if (std::strcmp(argv[i], "--gui") == 0) {
+            options.gui = true;
+        } else if (std::strcmp(argv[i], "--print") == 0) {
             options.printAtEnd = true;
         } else if (std::strcmp(argv[i], "--out") == 0 && hasValue) {
             options.outputDir = argv[++i];
@@ -71,11 +75,12 @@ int main(int argc, char** argv) {
             std::fprintf(stderr, "%s: cannot write the log\n", logPath.c_str());
             return 2;
         }
+        setvbuf(options.log, nullptr, _IOLBF, 0);  // a killed run keeps its log
     }
 
     // The windows are real chat windows; they draw offscreen. Qt wants a private runtime
     // folder and complains on every run without one.
-    qputenv("QT_QPA_PLATFORM", "offscreen");
+    if (!options.gui) qputenv("QT_QPA_PLATFORM", "offscreen");
     if (qEnvironmentVariableIsEmpty("XDG_RUNTIME_DIR")) {
         const std::string runtime = "/tmp/runtime-" + std::to_string(getuid());
         mkdir(runtime.c_str(), 0700);
@@ -95,6 +100,11 @@ int main(int argc, char** argv) {
     {
         Simulator simulator(options);
         failures = simulator.Run(commands);
+        if (options.gui) {
+            std::printf("the script has ended; close the windows to leave\n");
+            std::fflush(stdout);
+            QApplication::exec();
+        }
     }
     if (options.log) std::fclose(options.log);
     if (failures == 0) {

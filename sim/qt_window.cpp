@@ -15,6 +15,10 @@ QtSimWindow::QtSimWindow(const QString& title)
     : m_controller(std::make_unique<MyChatController>()) {
     m_host.setWindowTitle(title);
     m_host.resize(420, 360);
+    // On screen the windows cascade, so that every participant's stays visible.
+    static int opened = 0;
+    m_host.move(40 + 36 * (opened % 12), 40 + 28 * (opened % 12));
+    ++opened;
     m_controller->SetSuperView(&m_host);
     m_host.show();
 }

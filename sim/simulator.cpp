@@ -2,6 +2,8 @@
 #include "sim/simulator.h"
 
 #include <QCoreApplication>
+#include <QEventLoop>
+#include <QTimer>
 #include "engine/chat_client.h"
 #include "platform/sound.h"
 #include "platform/trace.h"
@@ -60,6 +62,7 @@ const Simulator::CommandEntry Simulator::kCommands[] = {
 };
 
 Simulator::Simulator(SimOptions options) : m_options(std::move(options)) {
+    if (m_options.gui) m_qtLoop = std::make_unique<QtRunLoop>();
     std::FILE* log = m_options.log;
     SetTraceSink([log](TraceLevel level, const char* tag, const char* text) {
         if (!log) return;
@@ -99,14 +102,36 @@ Simulator::~Simulator() {
 }
 
 int Simulator::Run(const std::vector<ScenarioCommand>& commands) {
-    for (const ScenarioCommand& command : commands)
-        Execute(command);
+    if (m_options.gui) {
+        RunInRealTime(commands);
+    } else {
+        for (const ScenarioCommand& command : commands)
+            Execute(command);
+    }
     if (m_options.printAtEnd)
         for (const auto& p : m_participants)
             if (!p->left) PrintParticipant(*p);
     if (!m_options.outputDir.empty()) WriteOutputs();
-    CloseAll();
+    if (!m_options.gui) CloseAll();
     return m_failures;
+}
+
+void Simulator::RunInRealTime(const std::vector<ScenarioCommand>& commands) {
+    QEventLoop loop;
+    std::size_t next = 0;
+    std::function<void()> step = [&] {
+        if (next == commands.size()) return loop.quit();
+        m_realWait = 0;
+        Execute(commands[next++]);
+        QTimer::singleShot(static_cast<int>((0.5 + m_realWait) * 1000), &loop, step);
+    };
+    QTimer::singleShot(0, &loop, step);
+    loop.exec();
+}
+
+RunLoop& Simulator::SharedLoop() {
+    if (m_qtLoop) return *m_qtLoop;
+    return m_clock;
 }
 
 void Simulator::Execute(const ScenarioCommand& command) {
@@ -119,6 +144,7 @@ void Simulator::Execute(const ScenarioCommand& command) {
 }
 
 void Simulator::Settle() {
+    if (m_qtLoop) return QCoreApplication::processEvents();
     // The windows' posted events (deferred deletions included) count as work too.
     for (;;) {
         QCoreApplication::sendPostedEvents();
@@ -131,6 +157,10 @@ void Simulator::Settle() {
 }
 
 void Simulator::Tick(std::uint32_t halfSeconds) {
+    if (m_qtLoop) {
+        m_realWait += 0.5 * halfSeconds;
+        return;
+    }
     for (std::uint32_t i = 0; i < halfSeconds; ++i) {
         m_clock.AdvanceBy(0.5);
         Settle();

@@ -18,6 +18,7 @@
 #include "sim/participant_loop.h"
 #include "sim/sim_window.h"
 #include "sim/watched_arm_client.h"
+#include "ui/qt_run_loop.h"
 
 class CChatClient;
 
@@ -26,6 +27,7 @@ struct SimOptions {
     std::FILE* log = nullptr;  // every trace line with the acting participant's name
     std::string outputDir;     // when set: each window's picture and transcript at the end
     bool printAtEnd = false;   // print every transcript and send-to list at the end
+    bool gui = false;          // real time on the Qt loop, one command every half second
 };
 
 class Simulator {
@@ -35,8 +37,9 @@ public:
     Simulator(const Simulator&) = delete;
     Simulator& operator=(const Simulator&) = delete;
 
-    // Runs every command in order, then closes every component. Returns the number of
-    // expectations that did not hold plus the commands that could not be carried out.
+    // Runs every command in order, then (unless the windows are left to the user) closes
+    // every component. Returns the number of expectations that did not hold plus the
+    // commands that could not be carried out.
     int Run(const std::vector<ScenarioCommand>& commands);
 
 private:
@@ -58,6 +61,10 @@ private:
 
     // ---- Running (simulator.cpp) ----
     void Execute(const ScenarioCommand& command);
+    // The script on the Qt loop: one command every half second, ticks as real waits.
+    void RunInRealTime(const std::vector<ScenarioCommand>& commands);
+    // The loop the participants' work runs on: the virtual clock, or Qt's loop with --gui.
+    RunLoop& SharedLoop();
     // Runs posted work and due timers until nothing is left, without moving the clock.
     void Settle();
     // Moves the clock by half-seconds, settling after each.
@@ -123,6 +130,8 @@ private:
 
     SimOptions m_options;
     VirtualRunLoop m_clock;
+    std::unique_ptr<QtRunLoop> m_qtLoop;  // with --gui
+    double m_realWait = 0;                // seconds the next command waits (--gui)
     std::unique_ptr<InProcessConference> m_conference;
     std::vector<std::unique_ptr<Participant>> m_participants;  // in join order, departed kept
     int m_failures = 0;
