@@ -38,6 +38,12 @@ std::string Title(const char* key, const std::string& from, const std::string& t
     return title;
 }
 
+// A tag word as titles and the host show it: in the host's language, in parentheses; nothing
+// for no word.
+std::string TagMark(const std::string& word) {
+    return word.empty() ? word : " (" + GetLocalizedString(word) + ")";
+}
+
 // The title of a message from sender to a role audience, or null when r names a person.
 const char* RoleAudienceKey(std::uint32_t r) {
     switch (r) {
@@ -74,7 +80,7 @@ CChatClient::ChatSender CChatClient::FindChatSender(std::uint32_t sendId,
 }
 
 std::string CChatClient::SenderTagSuffix(const ChatSender& sender) const {
-    return sender.bInRoster ? GetUserExternalInternalString(sender.dwExternalTag, 2) : "";
+    return sender.bInRoster ? TagMark(GetUserExternalInternalString(sender.dwExternalTag, 0)) : "";
 }
 
 int CChatClient::ParseAndShowPrivateMessages(CPrivateMessagePDU* pdu, int) {
@@ -82,7 +88,7 @@ int CChatClient::ParseAndShowPrivateMessages(CPrivateMessagePDU* pdu, int) {
     if (!pdu) return 0;
     const std::uint32_t r = pdu->GetReveID_DWORD();
     const ChatSender sender = FindChatSender(pdu->GetSendID_DWORD(), pdu->GetSenderName());
-    const std::string myMark = GetUserExternalInternalString(m_dwUserExternalTag, 2);
+    const std::string myMark = TagMark(GetUserExternalInternalString(m_dwUserExternalTag, 0));
     const bool host = m_dwMyNodeID == m_dwHostID;
     const bool presenter = m_dwMyNodeID == m_dwPresenterID;
 

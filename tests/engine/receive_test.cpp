@@ -17,7 +17,9 @@
 #include "platform/calendar.h"
 #include "platform/sound.h"
 #include "tests/engine/chat_room.h"
+#include "tests/engine/menu_harness.h"
 #include "tests/support/arm_recorder.h"
+#include "tests/support/german_host.h"
 #include "tests/support/trace_capture.h"
 
 namespace {
@@ -346,6 +348,18 @@ TEST(Showing, TheSoundModeDecidesWhichLinesPlay) {
         EXPECT_EQ(played, row.plays) << row.mode << "/" << row.panel << row.file;
     }
     SetSoundPlayer(nullptr);
+}
+
+// A title's tag word is in the host's language, like the title around it.
+TEST_F(GermanHost, ATitleCarriesTheSendersTagWordTranslated) {
+    menutest::MenuHarness h({1, false, 1});
+    const menutest::Person hank{300, "Hank", 0, 1};
+    h.Enroll({hank});
+    const std::vector<std::uint8_t> line =
+        PrivateLine(hank.user(), "Hank", menutest::kMyUser, "hallo");
+    h.engine.ApeDataIndication(1, hank.user(), 0, 0, line.data(), line.size());
+    EXPECT_EQ(std::string(h.engine.ChatContent().GetLineAtIndex(0)),
+              "von Hank (intern) an me (privat):\r\thallo");
 }
 
 }  // namespace
