@@ -94,27 +94,6 @@ TEST(Reading, TheFirstElementOfANameAndTheFirstCdataSectionCount) {
     EXPECT_EQ(pdu.GetSendID(), "7");
 }
 
-TEST(Reading, ReceiveIdsKeepTheirMeaningInEitherDecimalForm) {
-    // 0 all participants, -1 host, -2 host and presenter, -3 presenter, -4 panelists,
-    // -5 host, presenter and panelists, -6 attendees, or a user id.
-    for (const int id : {0, -1, -2, -3, -4, -5, -6, 1001}) {
-        const uint32_t bits = static_cast<uint32_t>(id);
-        CPrivateMessagePDU sent;
-        sent.SetSendID(7u);
-        sent.SetReveID(bits);
-        sent.SetMessageContent("m");
-        sent.GenerateXMLPDU();
-        for (const std::string& text :
-             {sent.ToWireText(),
-              Chat(2, "<sendid>7</sendid><recid>" + std::to_string(id) + "</recid><message/>")}) {
-            CPrivateMessagePDU pdu;
-            ASSERT_EQ(pdu.ParseXMLPDU(text), 1) << text;
-            EXPECT_EQ(pdu.GetReveID_DWORD(), bits) << text;
-        }
-        EXPECT_EQ(sent.GetReveID(), std::to_string(bits));
-    }
-}
-
 // A group message widens its end markers only when printed (its wire bytes pin that).
 TEST(Reading, EndMarkersAreWidenedOnSetForPrivateMessagesOnly) {
     CPrivateMessagePDU privateMessage;
