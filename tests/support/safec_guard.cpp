@@ -4,6 +4,8 @@
 #include <safeclib/safe_mem_lib.h>
 #include <safeclib/safe_str_lib.h>
 
+#include <string>
+
 namespace {
 
 ExpectSafecViolation* g_pInnermost = nullptr;
@@ -18,7 +20,6 @@ void ExpectSafecViolation::OnViolation(const char* msg, void* /*ptr*/, int error
         return;
     }
     ++g_pInnermost->m_nCount;
-    g_pInnermost->m_lastMessage = text;
 }
 
 void InstallSafecGuard() {

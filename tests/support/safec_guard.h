@@ -2,8 +2,6 @@
 // violation fails the running test, unless an ExpectSafecViolation guard is alive.
 #pragma once
 
-#include <string>
-
 // Installs the failing constraint handler for both the memory and the string functions.
 void InstallSafecGuard();
 
@@ -17,8 +15,6 @@ public:
 
     // Violations seen while this guard was the innermost one.
     int Count() const { return m_nCount; }
-    // The message of the last violation counted, or empty.
-    const std::string& LastMessage() const { return m_lastMessage; }
 
 private:
     friend void InstallSafecGuard();
@@ -27,5 +23,4 @@ private:
 
     ExpectSafecViolation* m_pOuter;
     int m_nCount;
-    std::string m_lastMessage;
 };

@@ -34,12 +34,6 @@ void SpyArmClient::Record(const std::string& name, const std::string& arguments)
     m_details.push_back(name + "(" + arguments + ")");
 }
 
-std::string SpyArmClient::Last(const std::string& name) const {
-    for (std::size_t i = m_calls.size(); i-- > 0;)
-        if (m_calls[i] == name) return m_details[i];
-    return "";
-}
-
 std::size_t SpyArmClient::Count(const std::string& name) const {
     return static_cast<std::size_t>(std::count(m_calls.begin(), m_calls.end(), name));
 }

@@ -20,8 +20,6 @@ public:
     // Each call with its plain arguments, e.g. "ConferenceJoin(0, 5, 3)"; sinks are left out,
     // handles and pointers written out only where they are constants.
     const std::vector<std::string>& CallsWithArguments() const { return m_details; }
-    // The last call of that name with its arguments, or empty.
-    std::string Last(const std::string& name) const;
     std::size_t Count(const std::string& name) const;
     // The payload of every ApeEnroll, in order.
     const std::vector<std::string>& EnrollPayloads() const { return m_enrollPayloads; }
