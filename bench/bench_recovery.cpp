@@ -4,6 +4,11 @@
 // the joiner's start until the last restored line is shown, beside the floor of parsing the
 // same 10,000 documents bare with tinyxml (target: at most 3 times). Also prints the peak of
 // the memory the restore allocated on top of what the joiner held before it joined.
+//
+// On the shared 2-core development VM: restore 64-72 ms against a 20-22 ms floor, ratio 3.1
+// to 3.3, peak 8.8 MB. Every everyone line is parsed once, shown, and backed up into the
+// customer cache (built, printed and appended: about a fifth of the restore), since none of
+// them was copied there before; showing (title, transcript, host, traces) takes about as much.
 #include <time.h>
 #include <tinyxml.h>
 
@@ -76,7 +81,7 @@ constexpr int kPrivateLines = 2500;
 constexpr std::uint32_t kSessionId = 42;
 constexpr std::uint32_t kCustomerId = 9001;
 constexpr std::uint32_t kJoinerNode = 1;
-constexpr int kRounds = 5;
+constexpr int kRounds = 9;
 
 // One sender's service object: attached, writing its own lines into the caches.
 class Sender final : public ArmNullSink {

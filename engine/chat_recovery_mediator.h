@@ -86,10 +86,6 @@ public:
     }
     void ForgetShownMessages() override { m_Filter.Clear(); }
 
-    // The parts, for the manager's state reports and for tests.
-    const GroupCacheRecovery& GroupRecovery() const { return m_GroupRecovery; }
-    const HistoryUserRosterInfo& HistoryRoster() const { return m_HistoryRoster; }
-
 private:
     RecoveredMessageFilter m_Filter;  // shared by the two message parts
     GroupCacheRecovery m_GroupRecovery;

@@ -81,7 +81,6 @@ public:
     bool IsChatRecoveryRequestProcessed() const { return m_bRecoveryStarted; }
     // Started and not yet ended.
     bool IsRecoveryRunning() const { return m_bRecoveryStarted && !m_bRecoveryEnded; }
-    const ChatRecoveryMediator& Mediator() const { return m_Mediator; }
 
 private:
     // Asks for the everyone group's cache; when it cannot be read, recovery ends.

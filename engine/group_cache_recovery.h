@@ -31,8 +31,6 @@ public:
     void SetFilter(RecoveredMessageFilter* filter) { m_pFilter = filter; }
 
     std::uint32_t GetGroupId() const { return m_dwGroupId; }
-    // Messages collected and not yet shown.
-    std::size_t GetPendingCount() const { return m_Messages.size(); }
 
     // Takes one delivery of the group's cache into the sequence: a retrieved item (actions
     // 4 to 6) or a live one (set or append). Skipped: other actions, empty or unparsable

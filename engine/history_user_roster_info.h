@@ -26,7 +26,6 @@ public:
     // The engine's answer (the local participant or the live roster) first, else the first
     // history record with that user id. False, out unchanged, when neither knows the id.
     bool GetUserNameFromId(std::uint32_t userId, std::string& out) const;
-    std::size_t GetCount() const { return m_Users.size(); }
 
 private:
     // Records in arrival order, and the first record of each user id.

@@ -8,17 +8,44 @@
 #include "pdu/private_message_pdu.h"
 
 namespace {
+
 constexpr std::uint32_t kEveryoneGroupId = 15;
+
+// The type of a text that begins the way this component prints its chat lines, without
+// parsing it; 0 for any other text. The parse that follows still checks everything.
+int SniffPDUType(const std::string& text) {
+    static const std::string kPrivateStart = "<chat ver=\"1.0\"><mtype>2</mtype>";
+    static const std::string kGroupStart = "<chat ver=\"1.0\"><mtype>3</mtype>";
+    if (text.compare(0, kPrivateStart.size(), kPrivateStart) == 0) return XMLPDU_PRIVATE_MESSAGE;
+    if (text.compare(0, kGroupStart.size(), kGroupStart) == 0) return XMLPDU_GROUP_MESSAGE;
+    return 0;
+}
+
 }  // namespace
 
 int PrivateCacheRecovery::RecoverPrivateMessages(const std::string& text) {
     if (text.empty() || !m_pCmdSink) return 0;
-    // Most entries are copies of group lines: read as one first. A text of another kind fails
-    // the type check, which leaves the type the text names in the PDU, so no entry is parsed
-    // more than twice and none only to learn its type.
+    switch (SniffPDUType(text)) {
+        case XMLPDU_PRIVATE_MESSAGE:
+            return ShowPrivateMessage(text);
+        case XMLPDU_GROUP_MESSAGE: {
+            CGroupMessagePDU group;
+            return group.ParseXMLPDU(text) ? ShowGroupMessage(group) : 0;
+        }
+        default:
+            return RecoverUnsniffedMessage(text);
+    }
+}
+
+int PrivateCacheRecovery::RecoverUnsniffedMessage(const std::string& text) {
+    // A text of another kind fails the group message's type check, which leaves the type the
+    // text names in the PDU: no entry is parsed only to learn its type.
     CGroupMessagePDU group;
     if (group.ParseXMLPDU(text)) return ShowGroupMessage(group);
-    if (group.GetMainType_Int() != XMLPDU_PRIVATE_MESSAGE) return 0;
+    return group.GetMainType_Int() == XMLPDU_PRIVATE_MESSAGE ? ShowPrivateMessage(text) : 0;
+}
+
+int PrivateCacheRecovery::ShowPrivateMessage(const std::string& text) {
     CPrivateMessagePDU pdu;
     if (!pdu.ParseXMLPDU(text)) return 0;
     if (m_pFilter && !m_pFilter->FirstShowOfPrivateMessage(

@@ -34,7 +34,10 @@ public:
     int RecoverPrivateMessages(const std::string& text);
 
 private:
-    // Shows a group line read from the customer cache unless it was shown before; 1 when shown.
+    // An entry that does not begin as this component prints chat lines.
+    int RecoverUnsniffedMessage(const std::string& text);
+    // Each shows a line read from the customer cache unless it was shown before; 1 when shown.
+    int ShowPrivateMessage(const std::string& text);
     int ShowGroupMessage(CGroupMessagePDU& pdu);
 
     std::uint32_t m_dwCustomerId = 0;           // names the customer cache; 0 = none

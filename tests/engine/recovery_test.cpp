@@ -158,8 +158,7 @@ TEST(Recovery, StartsOnlyInQMModeWithGroupRecoveryAndOnlyOnce) {
     const struct {
         std::uint32_t features;
         bool starts;
-    } cases[] = {{0, false},
-                 {FEATURE_GROUP_MSG_RECOVERY, false},
+    } cases[] = {{FEATURE_GROUP_MSG_RECOVERY, false},
                  {FEATURE_QM_MODE, false},
                  {kRecovering | 0x10000, true}};
     for (const auto& c : cases) {
@@ -179,13 +178,14 @@ TEST(Recovery, PrivateHistoryIsTitledWithBothNamesWhileTheCustomerCacheIsRestore
     r.Roster(UserInfo(12, "Bob (left)"));
     r.Roster(UserInfo(12, "Bob again"));  // the first record of an id names it
     r.Roster("not a record");
-    EXPECT_EQ(r.mgr.Mediator().HistoryRoster().GetCount(), 2u);
     r.Customer(PrivateLine(11, 12, "hi Bob"));
     r.Customer(PrivateLine(12, 13, "to nobody known"));
+    r.Customer("\n" + PrivateLine(11, 12, "printed otherwise"));  // read the long way
     r.Customer(std::string(2, '\0'));  // the block the cache was initialised with
     r.Customer("", CACHE_REPLY_LAST);
     EXPECT_EQ(r.engine.shown, Strings({"from Ann to Bob (left) (privately):hi Bob",
-                                       "from Bob (left) to  (privately):to nobody known"}));
+                                       "from Bob (left) to  (privately):to nobody known",
+                                       "from Ann to Bob (left) (privately):printed otherwise"}));
     // Outside the customer cache a line between two others has no title and is not shown.
     CPrivateMessagePDU live;
     live.SetSendID(11u);
@@ -246,13 +246,11 @@ TEST(Recovery, EachLineIsShownOnceWhateverHoldsCopiesOfIt) {
 
 TEST(Recovery, PrivateCopiesAreMatchedWithinTheLastSixteenLines) {
     RecoveredMessageFilter filter;
-    EXPECT_TRUE(filter.FirstShowOfPrivateMessage(1, 2, "copied"));
-    for (std::uint32_t i = 0; i < RecoveredMessageFilter::kPrivateWindow - 1; ++i)
+    for (std::uint32_t i = 0; i <= RecoveredMessageFilter::kPrivateWindow; ++i)
         EXPECT_TRUE(filter.FirstShowOfPrivateMessage(1, 2, std::to_string(i)));
-    EXPECT_FALSE(filter.FirstShowOfPrivateMessage(1, 2, "copied"));
-    EXPECT_TRUE(filter.FirstShowOfPrivateMessage(2, 1, "0"));  // the other direction
-    EXPECT_TRUE(filter.FirstShowOfPrivateMessage(1, 2, "new"));
-    EXPECT_TRUE(filter.FirstShowOfPrivateMessage(1, 2, "0"));  // pushed out of the window
+    EXPECT_TRUE(filter.FirstShowOfPrivateMessage(1, 2, "0"));   // 17 lines back: a new line
+    EXPECT_FALSE(filter.FirstShowOfPrivateMessage(1, 2, "2"));  // 15 lines back: a copy
+    EXPECT_TRUE(filter.FirstShowOfPrivateMessage(2, 1, "3"));   // the other direction
 }
 
 TEST(Recovery, ARefusedOrMissingRetrievalEndsOnlyWhatItWouldHaveRead) {
@@ -264,20 +262,6 @@ TEST(Recovery, ARefusedOrMissingRetrievalEndsOnlyWhatItWouldHaveRead) {
         bool groupRecovery;
         const char* warning;
     } cases[] = {
-        {"user info refused",
-         {{kUserInfoCache, 1104}},
-         kEveryoneCache,
-         {"501:1:255", "502:1:255", "515:1:255"},
-         true,
-         "ChatRecoveryMgr: user info cache 501 not read (result 1104); senders who have left "
-         "stay unnamed"},
-        {"customer cache refused",
-         {{kCustomerCache, 1104}},
-         kEveryoneCache,
-         {"501:1:255", "502:1:255", "515:1:255"},
-         true,
-         "ChatRecoveryMgr: customer cache 502 not read (result 1104); restoring the everyone "
-         "group only"},
         {"everyone cache refused",
          {{kEveryoneCache, 1103}},
          kEveryoneCache,
