@@ -7,6 +7,7 @@
 
 #include <cstdint>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -454,9 +455,62 @@ public:
     // Stores the panel status and tells the window of a non-zero one.
     void SetPanelStatus(std::uint32_t status);
 
+    // Rebuilds the send-to menu of a panel-meeting attendee from the privilege flags.
+    void OnAttendeePrivilegeChange();
+    // Under QM rules: edits the role and everyone entries in place after the flags changed
+    // from oldPrivilege (masked), or unconditionally with bForce.
+    void OnAttendeePrivilegeChangeInQM(std::uint32_t oldPrivilege, int bForce);
+    // Practice menus: an attendee keeps at most "All Attendees" (bFlag: the normal attendee
+    // menu instead); panelists, presenter and host keep the audiences among themselves.
+    void RebuildAttendeeMenuInPractice(std::int8_t bFlag);
+    void RebuildPanelistMenuInPractice();
+    // Menu repairs when a role holder is not in the roster.
+    void CheckMenuSpelineWhenTPIsPresenterHost();
+    void CheckMenuStateForTPSupport(int bFlag);
+
 private:
+    // Privilege rules shared by both rule sets (privilege.cpp, privilege_qm.cpp).
     // Stores the privilege word and splits it into the flags; the everyone flag only when asked.
     void StorePrivilege(std::uint32_t privilege, bool bWithEveryone);
+    // Enables the group entries the flags and the local participant's roles allow.
+    void EnableGroupEntries(bool beforeHost);
+    // Re-creates the participant entries the flags allow, panelists in their own section.
+    void ReapplyParticipantEntries();
+    void ReinsertRosterMembers();
+    void ReinsertPanelists();
+    // Erases every participant entry, or only the non-recent ones of privileged participants.
+    void EraseParticipantEntries(bool bPrivilegedOnly);
+    // Tells the window whether the send-to list and the input are usable (normal rules).
+    void ApplyInputRules();
+    // Appends the audiences of an attendee's or panelist's rebuilt menu ("Host" to
+    // "All Participants"); bInPractice relaxes the everyone entry's panelist condition.
+    void AppendAttendeeAudiences(bool bInPractice);
+    // Appends one entry per group of the group list, leaving out the last dropLast groups.
+    void AppendGroupEntries(std::uint32_t dropLast);
+    // A copy of the selected entry, if any.
+    std::optional<MenuStatus> SelectedMenuEntry() const;
+    // Some host, presenter or panelist is there to reach, the local participant included.
+    bool PanelistsPresent() const;
+    void AllowUserInput(bool bAllow);
+    // Erases the entry (a selected one announced as a departed audience) and a separator
+    // that then stands at its index.
+    void EraseEntryAndSeparator(int index);
+    // A trailing separator goes.
+    void EraseTrailingSeparator();
+    // Another participant's roles as the roster has them; 0 for a node outside it.
+    std::uint32_t RosterRoles(std::uint32_t nodeId) const;
+    bool IsRosterPrivileged(std::uint32_t nodeId) const { return RosterRoles(nodeId) != 0; }
+    // Under QM rules: re-titles and re-arranges the role entries after a host (bHost) or
+    // presenter change, keeping the selected audience.
+    void ArrangeRoleEntriesInQM(bool bHost);
+    // Selects the entry that now reaches the audience (0: none) selected before a role change.
+    void SelectAudienceAfterRoleChange(std::uint32_t audience, bool bHost);
+    // Titles a role entry with its holder: name, " (", the role word, the holder's tag, ")".
+    // The role word goes in as it is; only a newly created entry's own title is localized.
+    void RetitleRoleEntry(int index, const std::string& name, std::uint32_t nodeId,
+                          const char* role);
+    // Takes the role bit from the node's roster item, when it has one.
+    void ClearRosterRole(std::uint32_t nodeId, std::uint32_t role);
 
 public:
     // ---- State read by tests and the component's functions ----
@@ -586,8 +640,8 @@ private:
     int m_bFileNeedSave = 0;    // transcript modified flag
     PlaySoundMode m_nSoundMode = 0;
     FSRef m_SoundFile{};
-    bool m_bFirstMessage = true;  // sound mode 2 plays for the first line only
-    std::uint32_t m_dwPrivilege = 0x10047;
+    bool m_bFirstMessage = true;            // sound mode 2 plays for the first line only
+    std::uint32_t m_dwPrivilege = 0x1004F;  // every flag set: all allowed until the host says
     std::uint32_t m_dwFeatures = 0;
     std::uint32_t m_dwNBRStatus = 1;
     std::uint32_t m_dwNBROption = 1;

@@ -8,6 +8,7 @@
 #include <string>
 
 #include "engine/chat_client.h"
+#include "engine/menu_entries.h"
 #include "platform/func_trace.h"
 #include "platform/trace.h"
 
@@ -26,20 +27,6 @@ const char* TextOrEmpty(const char* text) {
 // Titles order case-insensitively; a new title equal to an existing one goes above it.
 bool TitleBelow(const MenuStatus& entry, const char* name) {
     return strcasecmp(entry.strTitle.c_str(), name) < 0;
-}
-
-MenuStatus SeparatorEntry() {
-    MenuStatus entry;
-    entry.bSeparator = true;
-    return entry;
-}
-
-// The first entry that can be chosen: enabled and not a separator; -1 when none.
-int FirstSelectableIndex(const MenuStatusList& menu) {
-    for (std::size_t i = 0; i < menu.size(); ++i) {
-        if (menu[i].bEnabled && !menu[i].bSeparator) return static_cast<int>(i);
-    }
-    return -1;
 }
 
 // Index of the first entry from `from` on that is not in the run of entries matching
@@ -143,7 +130,7 @@ void CChatClient::InsertChatUserName(const char* name, std::uint32_t nodeId, int
     entry.dwNodeID = nodeId;
     entry.dwExternalTag = GetUserExternalInternalTag(nodeId);
 
-    if (!IsNodePrivileged(nodeId)) {
+    if (!IsRosterPrivileged(nodeId)) {
         MacInfoTrace2(kChatTag, "CChatClient::InsertChatUserName : !bPanelist");
         const int position =
             m_dwMeetingType == 3 ? PanelAttendeeInsertPosition(text) : AttendeeInsertPosition(text);
@@ -223,11 +210,12 @@ void CChatClient::InsertRecentUserName(const char* name, std::uint32_t nodeId) {
         return;
     }
     if (nodeId == 0 || m_bPractice) return;
-    const bool host = IsNodeHost(nodeId);
-    const bool presenter = IsNodePresenter(nodeId);
+    const std::uint32_t roles = RosterRoles(nodeId);
+    const bool host = (roles & ROLE_HOST) != 0;
+    const bool presenter = (roles & ROLE_PRESENTER) != 0;
     if (m_dwMeetingType == 3 &&
         ((presenter && !m_bChatPresenter) || (host && !m_bChatHost) ||
-         (IsNodePanelist(nodeId) && !host && !presenter && !m_bChatPanelists)))
+         ((roles & ROLE_PANELIST) && !host && !presenter && !m_bChatPanelists)))
         return;
 
     MenuStatus entry;

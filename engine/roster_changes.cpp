@@ -171,13 +171,7 @@ void CChatClient::TitleRoleEntryInQM(std::uint32_t nodeId, const std::string& na
         index = GetIndexOfMenuByGroup(GROUP_PRESENTER);
     }
     if (index == -1 || name.empty()) return;
-    // The role word goes into the title as it is; only a newly created entry's own title is
-    // looked up in the string table.
-    std::string& title = m_MenuStatus[index].strTitle;
-    title = name + " (" + role +
-            GetUserExternalInternalString(GetUserExternalInternalTag(nodeId), 1) + ")";
-    NotifyUI(msg_RenameMenuItem, &title,
-             reinterpret_cast<void*>(static_cast<std::intptr_t>(index)));
+    RetitleRoleEntry(index, name, nodeId, role);
 }
 
 int CChatClient::ProcessDeleteEnrollInfo(std::uint32_t count, const ARMApeRoster* first) {

@@ -131,16 +131,17 @@ TEST_F(CachesTest, ARoleChangeMovesTheSubscriptionsFromTheOldRoleToTheNew) {
         IdSet subscribed;
     };
     const ChangeCase cases[] = {
-        // Becoming host: the attendees' cache goes, host's and host-and-presenter's come.
-        {"attendee becomes host", true, kMyNode, {15, 1, 3}},
-        // Host-and-presenter was taken on becoming host, so only the presenter's is added.
-        {"host also becomes presenter", false, kMyNode, {15, 1, 2, 3}},
-        // Still presenter: host-and-presenter stays.
-        {"host role moves away", true, kOtherNode, {15, 2, 3}},
-        // Host-and-presenter goes only when both roles are lost at once.
-        {"presenter role moves away", false, kOtherNode, {15, 3, 8}},
-        {"presenter again", false, kMyNode, {15, 2, 3}},
-        {"host again", true, kMyNode, {15, 1, 2, 3}},
+        // Becoming host re-subscribes by the new role at once: the attendees' cache goes, the
+        // host's, host-and-presenter's and the panelists' come.
+        {"attendee becomes host", true, kMyNode, {15, 1, 3, 4, 7}},
+        {"host also becomes presenter", false, kMyNode, {15, 1, 2, 3, 4, 7}},
+        // Still presenter (and panelist): host-and-presenter stays.
+        {"host role moves away", true, kOtherNode, {15, 2, 3, 4, 7}},
+        // A presenter outside the chat roster changes no subscription by itself; the move
+        // from the previous role takes the presenter's cache and brings the attendees'.
+        {"presenter role moves away", false, kOtherNode, {15, 3, 4, 7, 8}},
+        {"presenter again", false, kMyNode, {15, 2, 3, 4, 7}},
+        {"host again", true, kMyNode, {15, 1, 2, 3, 4, 7}},
     };
     for (const ChangeCase& c : cases) {
         SCOPED_TRACE(c.change);
@@ -236,15 +237,15 @@ TEST_F(CachesTest, CacheActionConfirmationsDriveTheNextStep) {
         bool zeroApe;
         bool recovering;
         std::size_t writes;  // cache actions sent in answer
-        IdSet subscribed;    // the local participant became host just before
+        IdSet subscribed;    // the local participant became panelist just before
         bool resubscribed;
     };
     // The user info's set marks the status cache and writes the own info; either set then
     // subscribes by role, or only to everyone's cache while recovering.
     const ConfirmCase cases[] = {
-        {"user info set", kUserInfo, CACHE_SET, 0, false, false, 2, {15, 1, 3, 4, 7}, true},
+        {"user info set", kUserInfo, CACHE_SET, 0, false, false, 2, {15, 4, 7}, true},
         {"user info set, recovering", kUserInfo, CACHE_SET, 0, false, true, 2, {15, 8}, false},
-        {"status set", kStatus, CACHE_SET, 0, false, false, 0, {15, 1, 3, 4, 7}, false},
+        {"status set", kStatus, CACHE_SET, 0, false, false, 0, {15, 4, 7}, false},
         {"status set, recovering", kStatus, CACHE_SET, 0, false, true, 0, {15, 8}, false},
         {"an append", kUserInfo, CACHE_APPEND, 0, false, false, 0, {15, 8}, false},
         {"a refused set", kUserInfo, CACHE_SET, 3, false, false, 0, {15, 8}, false},
@@ -256,9 +257,8 @@ TEST_F(CachesTest, CacheActionConfirmationsDriveTheNextStep) {
         SCOPED_TRACE(c.confirmation);
         Participant p;
         if (c.recovering) p.engine.RecoveryMgr()->InitParameters(&p.engine, 0x400 | 0x200000);
-        // Host now, but not yet subscribed as one.
-        p.engine.OnHostChanged(kMyNode);
-        p.engine.SetRosters(ROLE_HOST | ROLE_PANELIST, 1);
+        // Panelist now, but not yet subscribed as one.
+        p.engine.SetRosters(ROLE_PANELIST, 1);
         ASSERT_EQ(p.Subscribed(), (IdSet{15, 8}));
 
         std::uint32_t entity = p.engine.GetCacheHandleFormGroupId(GROUP_HOST);

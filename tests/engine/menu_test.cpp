@@ -81,7 +81,7 @@ TEST(InsertChatUserName, PlacesAttendeesByMeetingTypeAndRules) {
 }
 
 TEST(InsertChatUserName, LocalParticipantAndPracticeAddNothing) {
-    const std::string reapplied = "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65607";
+    const std::string reapplied = "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65615";
     for (const bool host : {false, true}) {  // a privileged participant re-applies its privilege
         MenuHarness h({1});
         h.Seed({{"All Attendees", 8}});
@@ -89,14 +89,14 @@ TEST(InsertChatUserName, LocalParticipantAndPracticeAddNothing) {
         TraceCapture trace;
         h.engine.InsertChatUserName("me", kMyNode, 0);
         EXPECT_EQ(trace.Has(reapplied), host);
-        EXPECT_EQ(h.Titles(), Strings({"All Attendees"}));
+        EXPECT_EQ(h.Titles(), Strings({host ? "*All Attendees" : "All Attendees"}));
     }
     MenuHarness attendee({1});
     attendee.Seed({{"All Attendees", 8}});
     attendee.engine.SetPracticeStatus(1);
     attendee.Commands();
     attendee.engine.InsertChatUserName("bob", 201, 0);
-    EXPECT_EQ(attendee.Titles(), Strings({"All Attendees"}));
+    EXPECT_EQ(attendee.Titles(), Strings({"*All Attendees"}));
     EXPECT_EQ(attendee.Commands(), Strings());
 }
 
@@ -111,6 +111,8 @@ TEST(InsertChatUserName, SecondInsertOnlySelectsInThePanelMeeting) {
 
 TEST(InsertChatUserName, PrivateOnlyAttendeeInputFollowsParticipantEntries) {
     MenuHarness h({1});
+    h.engine.OnHostChanged(300);  // once a host is in, private chat alone is allowed
+    h.Enroll({{300, "hank", ROLE_HOST}});
     h.engine.OnPrivilegeChanged(0x8, 0);
     h.Seed({{"All Attendees", 8}});
     h.Commands();
@@ -420,8 +422,7 @@ TEST(SelectUserByNodeID, FollowsRolesEntriesAndTestOnly) {
 TEST(SelectUserByNodeID, QMCombinedHolderSelectsItsRoleEntry) {
     MenuHarness h({1, false, 0, kQM});
     h.engine.OnHostChanged(300);
-    h.engine.OnPresenterChanged(300);
-    h.Seed({{"Host & Presenter", 3}});
+    h.engine.OnPresenterChanged(300);  // the combined role entry takes the place of "Host"
     h.Enroll({{300, "hank", ROLE_HOST}});
     EXPECT_EQ(h.Titles(), Strings({"Everyone", "hank (Host & Presenter)"}));
     h.Commands();

@@ -22,7 +22,7 @@ namespace {
 using Strings = std::vector<std::string>;
 
 constexpr const char* kPrivilegeReapplied =
-    "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65607";
+    "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65615";
 
 const UserItem* Find(const MenuHarness& h, std::uint32_t node) {
     return h.engine.UserList().GetUserItemFromNodeId(node);
@@ -60,8 +60,13 @@ TEST(ApeRosterChanged, AddsThenDeletesThenModifiesInOneCallback) {
     ASSERT_NE(Find(h, 202), nullptr);
     EXPECT_EQ(Find(h, 202)->dwRoles, ROLE_PANELIST);
     EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
-    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "bob"}));
-    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "remove 1"}));
+    // bob's new panelist role re-applies the privilege: his entry is re-created as a panelist's.
+    EXPECT_EQ(h.Titles(), Strings({"*All Attendees", "bob"}));
+    EXPECT_EQ(h.Commands(),
+              Strings({"insert -1 bob", "remove 1", "remove 1", "insert -1 bob", "remove 1",
+                       "insert -1 bob", "select 0", "msg_EnableUserList", "input 1",
+                       "msg_CloseAttendeeWarning", "msg_CloseAttendeeDialog"}));
+    EXPECT_TRUE(h.engine.Menu()[1].bPanelist);
 }
 
 TEST(ProcessAddEnrollInfo, IgnoresDuplicatesAndTheRecorder) {
@@ -129,14 +134,25 @@ TEST(ProcessAddEnrollInfo, QMHostReturnsToEveryoneForEachArrivalAfterItsOwnRecor
         std::vector<ReportEntry> report;
         Strings commands;
     };
+    // The own record re-applies the privilege: everyone stays selected, and an attendee's entry
+    // is re-created below the separator that opens the participant section.
+    const Strings reapplied = {"select 0", "msg_EnableUserList",       "input 1",
+                               "select 0", "msg_CloseAttendeeWarning", "msg_CloseAttendeeDialog"};
+    const Strings bobAgain = {"remove 2", "remove 1", "insert -1 ---", "insert -1 bob"};
+    const auto join = [](Strings a, const Strings& b) {
+        a.insert(a.end(), b.begin(), b.end());
+        return a;
+    };
     const Case cases[] = {
-        {"own record alone", {own}, {"select+input 0"}},
+        {"own record alone", {own}, join({"select+input 0"}, reapplied)},
         {"an arrival after the own record",
          {own, bob},
-         {"select+input 0", "insert -1 ---", "insert -1 bob", "select+input 0"}},
+         join(
+             join({"select+input 0", "insert -1 ---", "insert -1 bob", "select+input 0"}, bobAgain),
+             reapplied)},
         {"an arrival before the own record",
          {bob, own},
-         {"insert -1 ---", "insert -1 bob", "select+input 0"}},
+         join(join({"insert -1 ---", "insert -1 bob", "select+input 0"}, bobAgain), reapplied)},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
@@ -202,15 +218,17 @@ TEST(ProcessAddEnrollInfo, QMPresenterEntryIsRetitled) {
 TEST_F(GermanHost, QMHostEntryTitleIsTranslatedButTheRoleWordIsNot) {
     ASSERT_EQ(GetLocalizedString("Host"), "Gastgeber");
     MenuHarness h({1, false, 1, FEATURE_QM_MODE});
-    h.engine.OnHostChanged(300);
     h.Commands();
+    h.engine.OnHostChanged(300);  // the role entry comes with the role, titled once known
+    EXPECT_EQ(h.Commands(), Strings({"insert -1 Gastgeber"}));
     h.Enroll({{300, "Hank", ROLE_HOST, 1}});
-    EXPECT_EQ(h.Commands(), Strings({"insert -1 Gastgeber", "rename 1 Hank (Host, internal)"}));
+    EXPECT_EQ(h.Commands(), Strings({"rename 1 Hank (Host, internal)"}));
     EXPECT_EQ(h.Titles(), Strings({"Everyone", "Hank (Host, internal)"}));
 }
 
 TEST(ProcessAddEnrollInfo, QMPrivateOnlyOpensAndClosesTheUserList) {
     MenuHarness h({2, false, 0, FEATURE_QM_MODE});
+    h.engine.OnHostChanged(300);  // once a host is known, private chat alone is allowed
     h.engine.OnPrivilegeChanged(0x8, 0);
     h.Commands();
     h.Enroll({{201, "bob"}});
@@ -286,11 +304,11 @@ TEST(ProcessDeleteEnrollInfo, ParticipantWithoutANodeIdLeavesTheMenuAsItWas) {
     };
     const Case cases[] = {
         {"normal rules", {1}, 300, false, {"All Attendees", "---", "Host"}},
-        {"QM rules",
+        {"QM rules: the role entries come with the roles",
          {1, false, 0, FEATURE_QM_MODE},
          300,
          false,
-         {"Everyone", "All Attendees", "---", "Host"}},
+         {"Everyone", "Host", "Presenter", "All Attendees", "---", "Host"}},
         {"picked by the host", {1, true}, kMyNode, true, {"All Attendees", "---", "Host"}},
     };
     for (const Case& c : cases) {
@@ -324,7 +342,9 @@ TEST(ProcessModifyEnrollInfo, UpdatesTheItemButNotTheTitle) {
     EXPECT_STREQ(ann->strName.GetData(), "anne");
     EXPECT_EQ(ann->dwRoles, ROLE_PANELIST);
     EXPECT_EQ(ann->dwExternalTag, 2u);
-    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "ann"}));
+    // The modify keeps the title, but the privilege it re-applies re-creates the entry, now a
+    // panelist's, from the roster's name.
+    EXPECT_EQ(h.Titles(), Strings({"*All Attendees", "anne"}));
     EXPECT_TRUE(trace.Has(kPrivilegeReapplied));
 
     trace.Clear();
@@ -381,12 +401,13 @@ TEST_F(ConferenceRoster, PrivateChatEntriesFollowArrivalsAndDepartures) {
     Join(13, kRecorderName, 1);
     EXPECT_EQ(alice.UserList().GetCount(), 3u);
     EXPECT_EQ(Titles(alice), Strings({"Bob", "Carl"}));
-    EXPECT_EQ(Titles(bob), Strings({"Alice", "Carl"}));
-    EXPECT_EQ(Titles(carl), Strings({"Alice", "Bob"}));
+    // The own record's privilege re-application selects the first entry there is.
+    EXPECT_EQ(Titles(bob), Strings({"*Alice", "Carl"}));
+    EXPECT_EQ(Titles(carl), Strings({"*Alice", "Bob"}));
 
     Leave(carl);
     EXPECT_EQ(Titles(alice), Strings({"Bob"}));
-    EXPECT_EQ(Titles(bob), Strings({"Alice"}));
+    EXPECT_EQ(Titles(bob), Strings({"*Alice"}));
     EXPECT_EQ(alice.UserList().GetUserItemFromNodeId(11), nullptr);
 }
 
@@ -404,11 +425,11 @@ TEST_F(ConferenceRoster, PanelistRoleReachesOthersAndLateJoiners) {
 
     CChatClient& dana = Join(13, "Dana", 3);
     EXPECT_EQ(Titles(dana),
-              Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists", "Bob"}));
+              Strings({"Host", "Presenter", "Host & Presenter", "---", "*All Panelists", "Bob"}));
     EXPECT_EQ(dana.UserList().GetCount(), 3u);
 
     Leave(bob);
     EXPECT_EQ(Titles(dana),
-              Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists"}));
+              Strings({"Host", "Presenter", "Host & Presenter", "---", "*All Panelists"}));
     EXPECT_EQ(alice.UserList().GetCount(), 2u);
 }
