@@ -161,7 +161,8 @@ void CChatClient::ReapplyParticipantEntries() {
         ReinsertRosterMembers();
         EraseParticipantEntries(true);
     }
-    if (m_bChatPanelists) ReinsertPanelists();
+    // Hosts and presenters keep the panelists' entries whatever the word says.
+    if (m_bChatPanelists || IsHostOrPresenter()) ReinsertPanelists();
     // A separator pair right above the picker entry closes up.
     const int picker = GetIndexOfMenuByGroup(GROUP_SELECT_ATTENDEE);
     if (picker >= 3 && m_MenuStatus[picker - 1].bSeparator && m_MenuStatus[picker - 2].bSeparator)

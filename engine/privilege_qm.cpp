@@ -95,7 +95,9 @@ void CChatClient::OnPrivilegeChangedInQM(std::uint32_t privilege, int bForce) {
         }
         if (again != -1) {
             SelectMenuItemByIndex(again);
-        } else {
+        } else if (!SelectedMenuEntry() || !SelectedMenuEntry()->bEnabled) {
+            // Only when the provisional choice found nothing either: an enabled audience
+            // stays usable.
             noAudience();
         }
     } else if (!selected && m_nPrivilegeCountdown != 0) {

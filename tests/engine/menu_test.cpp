@@ -264,9 +264,12 @@ TEST(RemoveChatUserNameInQM, RoleEntryGoesOnlyWhenSelectedAndTakesItsSeparatorAl
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
-        MenuHarness h({c.meetingType, false, 0, kQM});
+        // The holders are set before QM mode starts, so the seeded role entries are the only
+        // ones (under QM rules a role change brings its own).
+        MenuHarness h({c.meetingType});
         h.engine.OnHostChanged(c.host);
         h.engine.OnPresenterChanged(c.presenter);
+        h.engine.SelectFeature(kQM, 0, 0, 0, 0, nullptr);
         h.Seed(c.seed);
         h.Enroll({{300, "hank", ROLE_HOST}});
         h.engine.SelectMenuItemByIndexInQM(c.selected);

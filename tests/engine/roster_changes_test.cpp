@@ -168,7 +168,7 @@ TEST(ProcessAddEnrollInfo, QMHostReturnsToEveryoneForEachArrivalAfterItsOwnRecor
 TEST(RosterChanges, BeforeHostChangeReappliesThePrivilegeWithForce) {
     // The QM trace shows the force flag of each re-application.
     const std::string reapplied =
-        "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65607, bDefault = ";
+        "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65615, bDefault = ";
     struct Case {
         const char* scenario;
         std::int32_t meetingType;
@@ -206,8 +206,7 @@ TEST(RosterChanges, BeforeHostChangeReappliesThePrivilegeWithForce) {
 
 TEST(ProcessAddEnrollInfo, QMPresenterEntryIsRetitled) {
     MenuHarness h({2, false, 0, FEATURE_QM_MODE});
-    h.engine.OnPresenterChanged(301);
-    h.Seed({{"Presenter", 2}});
+    h.engine.OnPresenterChanged(301);  // brings the role entry, titled once pia is in
     h.Commands();
     h.Enroll({{301, "pia", ROLE_PRESENTER}});
     EXPECT_EQ(h.Commands(), Strings({"rename 0 pia (Presenter)"}));

@@ -331,7 +331,7 @@ TEST_F(SessionTest, SetRosterStatusReEnrollsOnlyOnChange) {
 }
 
 TEST_F(SessionTest, PrivilegesAreReappliedOnTheNinthTick) {
-    const std::string reapplied = "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65607";
+    const std::string reapplied = "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65615";
     CChatClient engine;
     engine.Initialize(Data(nullptr, 7, "Alice"));
     TraceCapture trace;
