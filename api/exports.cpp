@@ -5,6 +5,7 @@
 #include "api/quintarachat.h"
 #include "engine/chat_client.h"
 #include "platform/func_trace.h"
+#include "platform/run_loop.h"
 
 namespace {
 
@@ -38,6 +39,10 @@ int ChDeleteInstance(ChatHandle hComponent) {
 int ChInitialize(ChatHandle hComponent, const _tagChatData* pData) {
     CFuncTrace trace("Chinitlize, hComponent = 0x%x", Hex(hComponent));
     if (!hComponent || !pData) return -1;
+    if (!RunLoop::FindCurrent())
+        MacWarnTrace2(kChatTag,
+                      "ChInitialize: no run loop is current and no Qt application runs; the "
+                      "component runs without its half-second tick");
     Engine(hComponent)->Initialize(*pData);
     return 0;
 }

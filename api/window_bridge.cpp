@@ -7,9 +7,20 @@
 
 namespace {
 
-ChatWindowFactory& Factory() {
-    static ChatWindowFactory factory;
-    return factory;
+struct Factories {
+    ChatWindowFactory installed;
+    bool isInstalled = false;
+    ChatWindowFactory fallback;
+};
+
+Factories& Installed() {
+    static Factories factories;
+    return factories;
+}
+
+const ChatWindowFactory& Factory() {
+    const Factories& factories = Installed();
+    return factories.isInstalled ? factories.installed : factories.fallback;
 }
 
 // An address as the traces print it.
@@ -20,7 +31,12 @@ unsigned Hex(const void* address) {
 }  // namespace
 
 void SetChatWindowFactory(ChatWindowFactory factory) {
-    Factory() = std::move(factory);
+    Installed().installed = std::move(factory);
+    Installed().isInstalled = true;
+}
+
+void SetDefaultChatWindowFactory(ChatWindowFactory factory) {
+    Installed().fallback = std::move(factory);
 }
 
 int CreateUI(ChatUIHandle* retData, void* data, IChatCommSinkForChatUI* pSink) {

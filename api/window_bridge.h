@@ -34,6 +34,9 @@ using ChatWindowFactory = std::function<IChatWindow*()>;
 
 // Installs the factory CreateUI uses; an empty one means no window is made.
 void SetChatWindowFactory(ChatWindowFactory factory);
+// Installs the factory CreateUI uses until SetChatWindowFactory was called: the shared
+// library's own window.
+void SetDefaultChatWindowFactory(ChatWindowFactory factory);
 
 // Creates the window, gives it the parent view and the sink, stores it in *retData. Returns 0.
 int CreateUI(ChatUIHandle* retData, void* data, IChatCommSinkForChatUI* pSink);

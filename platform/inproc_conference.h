@@ -12,11 +12,12 @@
 #include <vector>
 
 #include "platform/conference_cache.h"
+#include "platform/host_kit.h"
 #include "platform/inproc_conference_client.h"
 
 class RunLoop;
 
-class InProcessConference {
+class QC_HOST_KIT InProcessConference {
 public:
     explicit InProcessConference(std::uint16_t conferenceId = 1);
     // Destroys the service objects not yet released, without delivering anything more.

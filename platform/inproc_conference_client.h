@@ -23,6 +23,7 @@
 #include "platform/conference_faults.h"
 #include "platform/conference_mem_handles.h"
 #include "platform/conference_roster.h"
+#include "platform/host_kit.h"
 
 class InProcessConference;
 class RunLoop;
@@ -38,7 +39,7 @@ struct ArmCacheDelivery {
     std::uint16_t flags = 0;
 };
 
-class InProcessArmClient final : public IArmClient {
+class QC_HOST_KIT InProcessArmClient final : public IArmClient {
 public:
     ~InProcessArmClient();
     InProcessArmClient(const InProcessArmClient&) = delete;

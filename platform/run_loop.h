@@ -6,8 +6,9 @@
 #include <functional>
 
 #include "platform/calendar.h"
+#include "platform/host_kit.h"
 
-class RunLoop {
+class QC_HOST_KIT RunLoop {
 public:
     using Task = std::function<void()>;
     using TimerId = std::uint64_t;  // 0 is never a valid timer
@@ -33,6 +34,11 @@ public:
     static RunLoop* Current();
     // Makes loop the calling thread's current loop (null clears it).
     static void SetCurrent(RunLoop* loop);
+    // The calling thread's loop; when none is current, the loop of the host's toolkit (a Qt
+    // application's, in the shared library) is made current and returned. Null when neither.
+    static RunLoop* FindCurrent();
+    // Installs how FindCurrent finds the toolkit's loop; an empty finder finds none.
+    static void SetToolkitLoopFinder(std::function<RunLoop*()> finder);
 
 protected:
     // Longest delay or interval a loop keeps apart (about 31 years); longer ones are cut.

@@ -1,8 +1,10 @@
 #include "ui/warning_box.h"
 
+#include <QApplication>
 #include <QMessageBox>
 #include <QPointer>
 
+#include "platform/trace.h"
 #include "platform/warning_window.h"
 
 namespace {
@@ -13,6 +15,11 @@ QList<QPointer<QMessageBox>>& Showing() {
 }
 
 void ShowBox(const char* title, const char* message) {
+    // A host without widgets gets the warning as a log line, as it would without this box.
+    if (!qobject_cast<QApplication*>(QCoreApplication::instance())) {
+        MacWarnTrace2("Chat", "warning \"%s\": %s", title, message);
+        return;
+    }
     QMessageBox box(QMessageBox::Warning, QString::fromUtf8(title), QString::fromUtf8(message),
                     QMessageBox::Ok);
     // Names in a warning come from peers: never read them as markup.

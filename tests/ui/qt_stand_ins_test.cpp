@@ -2,6 +2,8 @@
 #include <gtest/gtest.h>
 
 #include <QApplication>
+#include <QDataStream>
+#include <QDir>
 #include <QElapsedTimer>
 #include <QFileDialog>
 #include <QFileInfo>
@@ -9,10 +11,13 @@
 #include <QTimer>
 #include <thread>
 
+#include "platform/sound.h"
+#include "platform/trace.h"
 #include "platform/warning_window.h"
 #include "tests/ui/window_fixture.h"
 #include "ui/chat_panels.h"
 #include "ui/qt_run_loop.h"
+#include "ui/sound_player.h"
 #include "ui/warning_box.h"
 
 namespace {
@@ -100,6 +105,57 @@ TEST_F(WindowTest, SavePanelRunsUntilConfirmedOrAbortedByTheEngine) {
     EXPECT_EQ(title, "Save Chat As");
     EXPECT_EQ(confirmed, 1);
     EXPECT_EQ(QFileInfo(QString::fromStdString(path)).fileName(), "Chat.txt");
+}
+
+}  // namespace
+
+namespace {
+
+// A short silent mono WAV file at path.
+void WriteSilentWav(const QString& path) {
+    QFile file(path);
+    ASSERT_TRUE(file.open(QIODevice::WriteOnly));
+    const quint32 samples = 800;
+    QByteArray data;
+    QDataStream out(&data, QIODevice::WriteOnly);
+    out.setByteOrder(QDataStream::LittleEndian);
+    out.writeRawData("RIFF", 4);
+    out << quint32(36 + samples * 2);
+    out.writeRawData("WAVEfmt ", 8);
+    out << quint32(16) << quint16(1) << quint16(1) << quint32(8000) << quint32(16000) << quint16(2)
+        << quint16(16);
+    out.writeRawData("data", 4);
+    out << quint32(samples * 2);
+    for (quint32 i = 0; i < samples; ++i)
+        out << qint16(0);
+    file.write(data);
+}
+
+TEST(QtSound, PlaysWavFilesAndRefusesTheRestWithALogLine) {
+    std::vector<std::string> warnings;
+    SetTraceSink([&warnings](TraceLevel level, const char*, const char* text) {
+        if (level == TraceLevel::Warn) warnings.push_back(text);
+    });
+    const QString dir = QDir::tempPath() + "/quintara-sound-test";
+    QDir().mkpath(dir);
+    WriteSilentWav(dir + "/ding.wav");
+    QFile text(dir + "/notes.txt");
+    ASSERT_TRUE(text.open(QIODevice::WriteOnly));
+    text.write("not a sound");
+    text.close();
+
+    // No audio device is needed: playing is asked for and nothing fails.
+    InstallQtSoundPlayer();
+    KVOPlaySoundFile((dir + "/ding.wav").toUtf8().constData());
+    QApplication::processEvents();
+    EXPECT_TRUE(warnings.empty());
+    EXPECT_FALSE(PlayWavFile((dir + "/missing.wav").toUtf8().constData()));
+    EXPECT_FALSE(PlayWavFile((dir + "/notes.txt").toUtf8().constData()));
+    EXPECT_FALSE(PlayWavFile(nullptr));
+    EXPECT_EQ(warnings.size(), 3u);
+    SetSoundPlayer(nullptr);
+    SetTraceSink([](TraceLevel, const char*, const char*) {});
+    QDir(dir).removeRecursively();
 }
 
 }  // namespace
