@@ -14,10 +14,24 @@ void LoopQueue::CancelTimer(RunLoop::TimerId id) {
     m_timers.erase(it);
 }
 
+void LoopQueue::Post(RunLoop::Task task) {
+    const std::lock_guard<std::mutex> lock(m_postedMutex);
+    m_posted.push_back(std::move(task));
+}
+
+std::size_t LoopQueue::PostedCount() const {
+    const std::lock_guard<std::mutex> lock(m_postedMutex);
+    return m_posted.size();
+}
+
 bool LoopQueue::RunOnePosted() {
-    if (m_posted.empty()) return false;
-    const RunLoop::Task task = std::move(m_posted.front());
-    m_posted.pop_front();
+    RunLoop::Task task;
+    {
+        const std::lock_guard<std::mutex> lock(m_postedMutex);
+        if (m_posted.empty()) return false;
+        task = std::move(m_posted.front());
+        m_posted.pop_front();
+    }
     task();
     return true;
 }

@@ -1,5 +1,7 @@
 // The posted work and timers of a single-threaded run loop, on a clock counted in whole
 // nanoseconds. Both loops keep their work here; each decides what "now" is and how to wait.
+// Posting is safe from any thread (network services answer from their own threads); timers
+// belong to the loop's thread.
 #pragma once
 
 #include <cstddef>
@@ -8,6 +10,7 @@
 #include <functional>
 #include <limits>
 #include <map>
+#include <mutex>
 #include <set>
 #include <utility>
 
@@ -23,7 +26,7 @@ public:
         return t > kEndOfTime - delay ? kEndOfTime : t + delay;
     }
 
-    void Post(RunLoop::Task task) { m_posted.push_back(std::move(task)); }
+    void Post(RunLoop::Task task);
     // A timer first due at due, then every interval ticks (0: once).
     RunLoop::TimerId AddTimer(Ticks due, Ticks interval, RunLoop::Task task);
     // Unknown or already cancelled ids do nothing; safe inside the timer's own task.
@@ -41,7 +44,7 @@ public:
     bool FireOneDueTimer(Ticks now, const NextDue& next);
     void ResetFiringCounts();
 
-    std::size_t PostedCount() const { return m_posted.size(); }
+    std::size_t PostedCount() const;
     bool HasTimers() const { return !m_schedule.empty(); }
     // The instant the earliest waiting timer is due; only when HasTimers().
     Ticks EarliestDue() const { return m_schedule.begin()->first; }
@@ -54,9 +57,10 @@ private:
         std::size_t fired;   // since ResetFiringCounts
     };
 
-    // Posted tasks in order; timers by id (ids grow, so id order is the order added) and
-    // the timers waiting to fire ordered by (due, id). A timer whose firing runs is in
-    // m_timers only.
+    // Posted tasks in order, guarded by m_postedMutex; timers by id (ids grow, so id order is the
+    // order added) and the timers waiting to fire ordered by (due, id). A timer whose firing runs
+    // is in m_timers only.
+    mutable std::mutex m_postedMutex;
     std::deque<RunLoop::Task> m_posted;
     std::map<RunLoop::TimerId, Timer> m_timers;
     std::set<std::pair<Ticks, RunLoop::TimerId>> m_schedule;

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <chrono>
-#include <thread>
 
 PollRunLoop::Ticks PollRunLoop::Now() {
     return std::chrono::duration_cast<std::chrono::nanoseconds>(
@@ -24,6 +23,9 @@ void PollRunLoop::Quit() {
 
 void PollRunLoop::Post(Task task) {
     m_queue.Post(std::move(task));
+    // Taking the lock orders this wake-up after a waiter's check of the queue.
+    { const std::lock_guard<std::mutex> lock(m_wakeMutex); }
+    m_wake.notify_all();
 }
 
 RunLoop::TimerId PollRunLoop::AddTimer(double firstDelay, double interval, Task task) {
@@ -61,8 +63,7 @@ bool PollRunLoop::RunUntil(Ticks deadline) {
         if (m_quit || now >= deadline) break;
         if (m_queue.PostedCount() > 0) continue;
         if (!m_queue.HasTimers()) break;  // nothing left that could run, or call Quit
-        const Ticks wake = std::min(m_queue.EarliestDue(), deadline);
-        std::this_thread::sleep_for(std::chrono::nanoseconds(wake - Now()));
+        WaitUntil(std::min(m_queue.EarliestDue(), deadline));
     }
     const bool quit = m_quit;
     --m_runDepth;
@@ -78,4 +79,10 @@ bool PollRunLoop::FireOneDueTimer(Ticks now) {
         if (next <= now) next = LoopQueue::Later(next, ((now - next) / interval + 1) * interval);
         return next;
     });
+}
+
+void PollRunLoop::WaitUntil(Ticks wake) {
+    const std::chrono::steady_clock::time_point until{std::chrono::nanoseconds(wake)};
+    std::unique_lock<std::mutex> lock(m_wakeMutex);
+    m_wake.wait_until(lock, until, [this] { return m_queue.PostedCount() > 0; });
 }

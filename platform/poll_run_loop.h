@@ -2,7 +2,9 @@
 // A window host runs its toolkit's existing event loop behind the same operations instead.
 #pragma once
 
+#include <condition_variable>
 #include <cstddef>
+#include <mutex>
 
 #include "platform/loop_queue.h"
 #include "platform/run_loop.h"
@@ -41,8 +43,13 @@ private:
     bool RunUntil(Ticks deadline);
     // Fires the earliest timer due at now; false when none is due.
     bool FireOneDueTimer(Ticks now);
+    // Waits until wake on the monotonic clock, or until another thread posts work.
+    void WaitUntil(Ticks wake);
 
     LoopQueue m_queue;
+    // Lets Post from another thread wake a loop that waits for its next timer.
+    std::mutex m_wakeMutex;
+    std::condition_variable m_wake;
 
     // Nesting of Run and RunFor (a modal dialog runs one inside a task), and whether the
     // innermost was asked to return.

@@ -1,5 +1,6 @@
 // The host's main run loop as the component sees it: work posted for later, repeating
-// timers, and the loop that belongs to the calling thread. Everything runs on one thread.
+// timers, and the loop that belongs to the calling thread. Everything runs on one thread;
+// only Post may be called from other threads too.
 #pragma once
 
 #include <cstdint>
@@ -16,6 +17,7 @@ public:
     virtual ~RunLoop() = default;
 
     // Runs the task later on this loop, after the work already queued; never inside Post.
+    // Safe from any thread: a loop waiting for its next timer wakes up for the task.
     virtual void Post(Task task) = 0;
 
     // Calls the task first after firstDelay seconds, then every interval seconds

@@ -83,6 +83,11 @@ protected:
     void SetUp() override { m_harness = GetParam().make(); }
 };
 
+// Connect accepts with 0 or with 1202; either way ConnectConfirm follows.
+inline bool ConnectAccepted(int result) {
+    return result == kArmOk || result == kArmConnectPending;
+}
+
 std::vector<std::uint8_t> ContractBytes(const std::string& text);
 // "+7[11:1001:alpha] -7[...] ~7[...]": a roster change in one line.
 std::string DescribeRoster(const RosterChange& change);

@@ -1,7 +1,9 @@
 #include <gtest/gtest.h>
 
+#include <chrono>
 #include <functional>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "platform/poll_run_loop.h"
@@ -196,3 +198,27 @@ TEST(PollRunLoop, ATaskThatKeepsPostingItselfStarvesNeitherTimersNorQuit) {
 }
 
 }  // namespace
+
+TEST(PollRunLoop, WorkPostedFromOtherThreadsWakesALoopWaitingForALateTimer) {
+    PollRunLoop loop;
+    int ran = 0;  // only the loop's thread touches it
+    const RunLoop::TimerId far = loop.AddTimer(3600, 0, [] {});
+    std::thread quitter([&loop, &ran] {
+        std::vector<std::thread> posters;
+        for (int t = 0; t < 4; ++t) {
+            posters.emplace_back([&loop, &ran] {
+                for (int i = 0; i < 250; ++i)
+                    loop.Post([&ran] { ++ran; });
+            });
+        }
+        for (std::thread& poster : posters)
+            poster.join();
+        loop.Post([&loop] { loop.Quit(); });
+    });
+    const auto start = std::chrono::steady_clock::now();
+    EXPECT_TRUE(loop.RunFor(3600));
+    quitter.join();
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::minutes(1));
+    EXPECT_EQ(1000, ran);
+    loop.CancelTimer(far);
+}

@@ -1,0 +1,359 @@
+// The connection of one participant's service object: connecting, the conference's streams,
+// the numbers granted once per conference, stored publishing and the consumers that feed it.
+#include <chrono>
+#include <map>
+#include <utility>
+
+#include "netconf/nats_arm_client.h"
+#include "netconf/netconf_results.h"
+#include "platform/conference_results.h"
+
+namespace {
+
+constexpr std::int64_t kConnectTimeoutMs = 2000;
+constexpr std::int64_t kRequestTimeoutMs = 5000;
+constexpr std::int64_t kReconnectWaitMs = 250;
+constexpr std::int64_t kPingIntervalMs = 2000;
+constexpr int kMaxPingsOut = 2;
+// How long a stored publish keeps retrying while the servers fail over.
+constexpr auto kPublishPatience = std::chrono::seconds(30);
+// Private data waits at most this long in a mailbox for its receiver.
+constexpr std::int64_t kMailboxMaxAgeNanos = 24LL * 3600 * 1000000000LL;
+
+// Connection callbacks find their object here by number; an object unregisters before it
+// goes, under the same lock the callbacks hold.
+std::mutex g_registryMutex;
+std::map<std::uintptr_t, NatsArmClient*> g_registry;
+
+}  // namespace
+
+void NatsArmClient::ConnectTask(IArmNodeControllerSink* sink, std::uint32_t epoch) {
+    natsOptions* rawOptions = nullptr;
+    natsStatus status = natsOptions_Create(&rawOptions);
+    NatsPtr<natsOptions> options(rawOptions);
+    std::vector<const char*> urls;
+    for (const std::string& url : m_options.serverUrls)
+        urls.push_back(url.c_str());
+    const std::string inbox = ConferenceSubjects::InboxPrefix(m_options.user);
+    const void* const closure = reinterpret_cast<void*>(m_registryId);
+    if (status == NATS_OK) {
+        status = natsOptions_SetServers(rawOptions, urls.data(), static_cast<int>(urls.size()));
+    }
+    if (status == NATS_OK) {
+        status =
+            natsOptions_SetUserInfo(rawOptions, m_options.user.c_str(), m_options.password.c_str());
+    }
+    if (status == NATS_OK) status = natsOptions_SetCustomInboxPrefix(rawOptions, inbox.c_str());
+    if (status == NATS_OK) status = natsOptions_SetName(rawOptions, m_options.user.c_str());
+    if (status == NATS_OK) status = natsOptions_SetTimeout(rawOptions, kConnectTimeoutMs);
+    if (status == NATS_OK) status = natsOptions_SetMaxReconnect(rawOptions, -1);
+    if (status == NATS_OK) status = natsOptions_SetReconnectWait(rawOptions, kReconnectWaitMs);
+    if (status == NATS_OK) status = natsOptions_SetPingInterval(rawOptions, kPingIntervalMs);
+    if (status == NATS_OK) status = natsOptions_SetMaxPingsOut(rawOptions, kMaxPingsOut);
+    if (status == NATS_OK) {
+        status = natsOptions_SetErrorHandler(rawOptions, &NatsArmClient::OnAsyncError,
+                                             const_cast<void*>(closure));
+    }
+    if (status == NATS_OK) {
+        status = natsOptions_SetDisconnectedCB(rawOptions, &NatsArmClient::OnDisconnected,
+                                               const_cast<void*>(closure));
+    }
+    if (status == NATS_OK) {
+        status = natsOptions_SetReconnectedCB(rawOptions, &NatsArmClient::OnReconnected,
+                                              const_cast<void*>(closure));
+    }
+    {
+        const std::lock_guard<std::mutex> lock(g_registryMutex);
+        g_registry[m_registryId] = this;
+    }
+
+    std::string reason;
+    short result = kArmServerUnreachable;
+    natsConnection* rawConnection = nullptr;
+    if (status == NATS_OK) status = natsConnection_Connect(&rawConnection, rawOptions);
+    if (status != NATS_OK) {
+        reason = NatsErrorText(status);
+    } else {
+        m_connection.reset(rawConnection);
+        result = kArmServerRefused;
+        jsOptions jsOpts;
+        jsOptions_Init(&jsOpts);
+        jsOpts.Wait = kRequestTimeoutMs;
+        jsCtx* rawJs = nullptr;
+        status = natsConnection_JetStream(&rawJs, rawConnection, &jsOpts);
+        m_js.reset(rawJs);
+        if (status != NATS_OK) {
+            reason = NatsErrorText(status);
+        } else if (EnsureStream(m_subjects.CacheStream(), "", false, &reason)) {
+            natsSubscription* rawSub = nullptr;
+            const std::string presence = m_subjects.AllPresence();
+            status = natsConnection_Subscribe(&rawSub, rawConnection, presence.c_str(),
+                                              &NatsArmClient::OnPresence, this);
+            m_presenceSub.reset(rawSub);
+            if (status == NATS_OK)
+                status = natsConnection_FlushTimeout(rawConnection, kRequestTimeoutMs);
+            if (status == NATS_OK) {
+                result = 0;
+            } else {
+                reason = NatsErrorText(status);
+            }
+        }
+    }
+    if (result != 0) {
+        m_presenceSub.reset();
+        m_js.reset();
+        if (m_connection) natsConnection_Close(m_connection.get());
+        m_connection.reset();
+    }
+    const std::lock_guard<std::mutex> lock(m_mutex);
+    m_phase = result == 0 ? Phase::Connected : Phase::Idle;
+    const std::uint32_t nodeId = m_options.nodeId;
+    std::string where;
+    for (const std::string& url : m_options.serverUrls)
+        where += (where.empty() ? "" : ", ") + url;
+    if (result != 0) {
+        PostLog(2, "NatsArmClient: no conference at " + where + " for " + m_options.user + ": " +
+                       reason);
+    } else {
+        PostLog(0, "NatsArmClient: " + m_options.user + " connected to " + where);
+    }
+    PostAt(Stage::Node, epoch, [sink, result, nodeId] { sink->ConnectConfirm(result, nodeId); });
+}
+
+void NatsArmClient::AttachTask(IArmApeSink* sink, std::uint32_t ape, std::uint32_t epoch) {
+    std::string reason;
+    short result = 0;
+    std::string holder;
+    if (!m_connection) {
+        result = kArmNotConnected;
+        reason = "not connected";
+    } else if (!EnsureStream(m_subjects.MailboxStream(m_options.user),
+                             m_subjects.Mailbox(m_options.user), true, &reason)) {
+        result = kArmServerRefused;
+    } else if (GrantNumber(m_subjects.UserIdClaim(m_userId), m_options.user, &holder) == 0) {
+        result = kArmServerRefused;
+        reason = "user id claim not answered";
+    } else if (holder != m_options.user) {
+        result = kArmUserIdTaken;
+        reason = "user id " + std::to_string(m_userId) + " is held by " + holder;
+    } else {
+        auto mailbox = std::make_unique<Feed>();
+        mailbox->owner = this;
+        if (SubscribeFeed(*mailbox, m_subjects.MailboxStream(m_options.user),
+                          m_subjects.Mailbox(m_options.user), true, 0, &reason)) {
+            m_mailbox = std::move(mailbox);
+        } else {
+            result = kArmServerRefused;
+        }
+    }
+    const std::lock_guard<std::mutex> lock(m_mutex);
+    if (result != 0) {
+        PostLog(2, "NatsArmClient: attach of " + m_options.user + " failed: " + reason);
+        if (m_apeHandle == ape) {
+            m_apeHandle = 0;
+            m_pApeSink = nullptr;
+        }
+        PostAt(Stage::Ape, epoch, [sink, result] { sink->ApeAttachConfirm(0, result, 0); });
+        return;
+    }
+    m_netAttached = true;
+    m_session = 0;
+    AnnounceLocked(true);
+    const std::uint32_t userId = m_userId;
+    PostAt(Stage::Ape, epoch, [sink, ape, userId] { sink->ApeAttachConfirm(ape, 0, userId); });
+}
+
+void NatsArmClient::DetachTask() {
+    std::map<std::uint32_t, std::unique_ptr<Feed>> feeds;
+    {
+        const std::lock_guard<std::mutex> lock(m_mutex);
+        if (m_netAttached && m_connection) {
+            m_netAttached = false;
+            AnnounceLocked(false);
+        }
+        m_netAttached = false;
+        m_session = 0;
+        m_enrollInfo.clear();
+        m_presence.Clear();
+        feeds.swap(m_cacheFeeds);
+    }
+    for (auto& entry : feeds)
+        DropFeed(std::move(entry.second));
+    DropFeed(std::move(m_mailbox));
+}
+
+void NatsArmClient::DisconnectTask() {
+    DetachTask();
+    {
+        const std::lock_guard<std::mutex> lock(m_mutex);
+        m_phase = Phase::Idle;
+    }
+    if (m_presenceSub) {
+        natsSubscription_Drain(m_presenceSub.get());
+        natsSubscription_WaitForDrainCompletion(m_presenceSub.get(), kRequestTimeoutMs);
+        m_presenceSub.reset();
+    }
+    m_js.reset();
+    if (m_connection) {
+        natsConnection_FlushTimeout(m_connection.get(), kRequestTimeoutMs);
+        natsConnection_Close(m_connection.get());
+        m_connection.reset();
+    }
+    const std::lock_guard<std::mutex> lock(g_registryMutex);
+    g_registry.erase(m_registryId);
+}
+
+bool NatsArmClient::EnsureStream(const std::string& name, const std::string& subjects, bool mailbox,
+                                 std::string* reason) {
+    jsErrCode error = static_cast<jsErrCode>(0);
+    jsStreamInfo* rawInfo = nullptr;
+    natsStatus status = js_GetStreamInfo(&rawInfo, m_js.get(), name.c_str(), nullptr, &error);
+    NatsPtr<jsStreamInfo> info(rawInfo);
+    if (status == NATS_OK) return true;
+    if (status != NATS_NOT_FOUND) {
+        *reason = "stream " + name + ": " + NatsErrorText(status);
+        return false;
+    }
+    const std::string caches = m_subjects.AllCaches();
+    const std::string numbers = m_subjects.AllNumbers();
+    const char* list[2] = {caches.c_str(), numbers.c_str()};
+    const char* mailboxList[1] = {subjects.c_str()};
+    jsStreamConfig config;
+    jsStreamConfig_Init(&config);
+    config.Name = name.c_str();
+    config.Subjects = mailbox ? mailboxList : list;
+    config.SubjectsLen = mailbox ? 1 : 2;
+    config.Storage = js_FileStorage;
+    config.Replicas = m_options.replicas;
+    if (mailbox) config.MaxAge = kMailboxMaxAgeNanos;
+    rawInfo = nullptr;
+    status = js_AddStream(&rawInfo, m_js.get(), &config, nullptr, &error);
+    info.reset(rawInfo);
+    // Somebody else may have made it meanwhile.
+    if (status != NATS_OK && error != JSStreamNameExistErr) {
+        *reason = "stream " + name + ": " + NatsErrorText(status);
+        return false;
+    }
+    return true;
+}
+
+std::uint64_t NatsArmClient::GrantNumber(const std::string& subject, const std::string& claim,
+                                         std::string* holder) {
+    if (!m_js) return 0;
+    jsPubOptions options;
+    jsPubOptions_Init(&options);
+    options.ExpectNoMessage = true;
+    jsErrCode error = static_cast<jsErrCode>(0);
+    jsPubAck* rawAck = nullptr;
+    natsStatus status = js_Publish(&rawAck, m_js.get(), subject.c_str(), claim.data(),
+                                   static_cast<int>(claim.size()), &options, &error);
+    NatsPtr<jsPubAck> ack(rawAck);
+    if (status == NATS_OK) {
+        *holder = claim;
+        return ack->Sequence;
+    }
+    // Granted before: the first message there holds the number.
+    natsMsg* rawMsg = nullptr;
+    status = js_GetLastMsg(&rawMsg, m_js.get(), m_subjects.CacheStream().c_str(), subject.c_str(),
+                           nullptr, &error);
+    NatsPtr<natsMsg> first(rawMsg);
+    if (status != NATS_OK) return 0;
+    holder->assign(natsMsg_GetData(rawMsg), natsMsg_GetDataLength(rawMsg));
+    return natsMsg_GetSequence(rawMsg);
+}
+
+std::uint64_t NatsArmClient::PublishStored(natsMsg* msg, const std::string& msgId,
+                                           std::string* reason) {
+    if (!m_js) {
+        *reason = "not connected";
+        return 0;
+    }
+    jsPubOptions options;
+    jsPubOptions_Init(&options);
+    options.MsgId = msgId.c_str();
+    const auto giveUp = std::chrono::steady_clock::now() + kPublishPatience;
+    for (;;) {
+        jsErrCode error = static_cast<jsErrCode>(0);
+        jsPubAck* rawAck = nullptr;
+        const natsStatus status = js_PublishMsg(&rawAck, m_js.get(), msg, &options, &error);
+        NatsPtr<jsPubAck> ack(rawAck);
+        if (status == NATS_OK) return ack->Sequence;
+        // The same message id again is stored once, however many tries reach the server.
+        const bool transient = status == NATS_TIMEOUT || status == NATS_NO_RESPONDERS ||
+                               status == NATS_CONNECTION_DISCONNECTED ||
+                               status == NATS_CONNECTION_CLOSED;
+        if (!transient || status == NATS_CONNECTION_CLOSED ||
+            std::chrono::steady_clock::now() >= giveUp) {
+            *reason = NatsErrorText(status);
+            return 0;
+        }
+    }
+}
+
+bool NatsArmClient::SubscribeFeed(Feed& feed, const std::string& stream, const std::string& filter,
+                                  bool fromNow, std::int64_t startNanos, std::string* reason) {
+    jsSubOptions options;
+    jsSubOptions_Init(&options);
+    options.Stream = stream.c_str();
+    options.Ordered = true;
+    options.Config.DeliverPolicy = fromNow ? js_DeliverNew : js_DeliverByStartTime;
+    if (!fromNow) options.Config.OptStartTime = startNanos;
+    jsErrCode error = static_cast<jsErrCode>(0);
+    natsSubscription* raw = nullptr;
+    const natsStatus status = js_Subscribe(&raw, m_js.get(), filter.c_str(), &NatsArmClient::OnFeed,
+                                           &feed, nullptr, &options, &error);
+    feed.sub.reset(raw);
+    if (status != NATS_OK) {
+        *reason = "consumer on " + filter + ": " + NatsErrorText(status);
+        feed.sub.reset();
+        return false;
+    }
+    return true;
+}
+
+void NatsArmClient::DropFeed(std::unique_ptr<Feed> feed) {
+    if (!feed || !feed->sub) return;
+    // Drained, its handler has run for the last time when the wait returns.
+    if (natsSubscription_Drain(feed->sub.get()) == NATS_OK) {
+        natsSubscription_WaitForDrainCompletion(feed->sub.get(), kRequestTimeoutMs);
+    } else {
+        natsSubscription_Unsubscribe(feed->sub.get());
+    }
+}
+
+void NatsArmClient::Tick() {
+    const std::lock_guard<std::mutex> lock(m_mutex);
+    if (!m_connection) return;
+    const std::int64_t now = NowMillis();
+    if (m_netAttached && now - m_lastAnnounce >= PresenceTable::kSilenceLimit / 3) {
+        AnnounceLocked(false);
+    }
+    DeliverRosterLocked(m_presence.Expire(now, m_session));
+}
+
+void NatsArmClient::OnAsyncError(natsConnection*, natsSubscription*, natsStatus status,
+                                 void* closure) {
+    const std::lock_guard<std::mutex> lock(g_registryMutex);
+    const auto it = g_registry.find(reinterpret_cast<std::uintptr_t>(closure));
+    if (it == g_registry.end()) return;
+    it->second->PostLog(1, "NatsArmClient: the server reports: " + NatsErrorText(status));
+}
+
+void NatsArmClient::OnDisconnected(natsConnection*, void* closure) {
+    const std::lock_guard<std::mutex> lock(g_registryMutex);
+    const auto it = g_registry.find(reinterpret_cast<std::uintptr_t>(closure));
+    if (it == g_registry.end()) return;
+    it->second->PostLog(
+        1, "NatsArmClient: connection of " + it->second->m_options.user + " lost, reconnecting");
+}
+
+void NatsArmClient::OnReconnected(natsConnection*, void* closure) {
+    const std::lock_guard<std::mutex> lock(g_registryMutex);
+    const auto it = g_registry.find(reinterpret_cast<std::uintptr_t>(closure));
+    if (it == g_registry.end()) return;
+    NatsArmClient& client = *it->second;
+    client.PostLog(0, "NatsArmClient: connection of " + client.m_options.user + " restored");
+    // Whoever forgot this participant meanwhile learns of it again, and it of them.
+    const std::lock_guard<std::mutex> own(client.m_mutex);
+    if (client.m_netAttached) client.AnnounceLocked(true);
+}
