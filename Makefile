@@ -2,8 +2,9 @@
 BUILD ?= build
 JOBS  ?= 2
 CMAKE_FLAGS ?= -DCMAKE_BUILD_TYPE=RelWithDebInfo
+SANITIZE_BUILD ?= build-sanitize
 
-.PHONY: all deps configure build test demo bench fuzz install clean
+.PHONY: all deps configure build test sanitize demo bench fuzz install clean
 
 all: build
 
@@ -18,6 +19,12 @@ build: configure
 
 test: build
 	@cd $(BUILD) && ctest --output-on-failure -j$(JOBS)
+
+# The whole suite again, built with the address, undefined-behaviour and leak sanitizers.
+sanitize: deps
+	@cmake -S . -B $(SANITIZE_BUILD) $(CMAKE_FLAGS) -DQC_SANITIZE=ON >/dev/null
+	@cmake --build $(SANITIZE_BUILD) -j$(JOBS)
+	@scripts/run-sanitized $(SANITIZE_BUILD) $(JOBS)
 
 # The demo builds quietly (the build's output shows only when it fails), then runs a training
 # session and leaves each participant's transcript (and window picture) under $(BUILD)/demo.
@@ -39,4 +46,4 @@ install: build
 	@cmake --install $(BUILD)
 
 clean:
-	@rm -rf $(BUILD) build-fuzz
+	@rm -rf $(BUILD) $(SANITIZE_BUILD) build-fuzz
