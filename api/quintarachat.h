@@ -12,6 +12,7 @@
 #define QC_EXPORT
 #endif
 
+#ifdef __cplusplus
 class IArmClient;
 
 /* The host's notification object; the component calls it on the host's main thread. */
@@ -30,16 +31,25 @@ protected:
     ~IHostChatSink() = default;
 };
 
+typedef void* ChatHandle;
+#else
+/* A C host sees the service, the notification object and the instance only by pointer; it
+ * has no way to implement the notification object and passes a null one. */
+typedef struct IArmClient IArmClient;
+typedef struct IHostChatSink IHostChatSink;
+typedef struct ChatInstance* ChatHandle;
+#endif
+
 /* The start-up record ChInitialize copies. */
 typedef struct _tagChatData {
-    IHostChatSink* pHostSink;     /* notifications; may be null */
-    void* hParentView;            /* the host view the chat window lives in */
-    IArmClient* pArmClient;       /* the conference service; a second ChInitialize keeps the first */
+    IHostChatSink* pHostSink; /* notifications; may be null */
+    void* hParentView;        /* the host view the chat window lives in */
+    IArmClient* pArmClient;   /* the conference service; a second ChInitialize keeps the first */
     uint16_t wConferenceID;
-    uint32_t dwSessionID;         /* the chat application session */
-    const char* lpszUserName;     /* the local participant's display name; may be null */
-    const char* lpszReserved;     /* may be null */
-    uint32_t dwNodeID;            /* the local participant's conference node id */
+    uint32_t dwSessionID;     /* the chat application session */
+    const char* lpszUserName; /* the local participant's display name; may be null */
+    const char* lpszReserved; /* may be null */
+    uint32_t dwNodeID;        /* the local participant's conference node id */
     uint32_t dwReserved;
     int32_t lMeetingType;         /* 1, 2 or 3 */
     uint8_t bUseAttendeeSelector; /* non-zero: attendees are picked through the attendee picker */
@@ -49,9 +59,9 @@ typedef struct _tagChatData {
 
 /* A send-to group the host adds with ChAddGroup. */
 typedef struct _tagChatGroupInfo {
-    uint32_t dwIndex;      /* position in the group list and the send-to menu */
-    uint32_t dwGroupType;  /* 1 role group, 2 separator, 3 id group */
-    uint32_t dwGroupId;    /* role mask; 0 for a separator */
+    uint32_t dwIndex;     /* position in the group list and the send-to menu */
+    uint32_t dwGroupType; /* 1 role group, 2 separator, 3 id group */
+    uint32_t dwGroupId;   /* role mask; 0 for a separator */
     const char* cszGroupName;
     uint8_t bFlag1;
     uint8_t bFlag2;
@@ -65,13 +75,13 @@ typedef struct FSRef {
     char path[1024]; /* NUL-terminated; empty = no file */
 } FSRef;
 
-typedef void* ChatHandle;
-
+#ifdef __cplusplus
 extern "C" {
+#endif
 
 QC_EXPORT ChatHandle ChNewInstance(void);
 QC_EXPORT int ChDeleteInstance(ChatHandle hComponent);
-QC_EXPORT int ChInitialize(ChatHandle hComponent, const _tagChatData* pData);
+QC_EXPORT int ChInitialize(ChatHandle hComponent, const ChatData* pData);
 QC_EXPORT int ChSetRosterStatus(ChatHandle hComponent, uint32_t inNeedRosterInfo,
                                 uint32_t inBroadcastRosterInfo);
 QC_EXPORT int ChSetRosters(ChatHandle hComponent, uint32_t lRosters);
@@ -81,7 +91,7 @@ QC_EXPORT int ChSetPresenter(ChatHandle hComponent, uint32_t inpresenterID);
 QC_EXPORT int ChSetBeforeHostStatus(ChatHandle hComponent, int inStatus);
 QC_EXPORT int ChSetPanelStatus(ChatHandle hComponent, uint32_t inStatus);
 QC_EXPORT int ChSetPracticeStatus(ChatHandle hComponent, signed char inStatus);
-QC_EXPORT int ChAddGroup(ChatHandle hComponent, _tagChatGroupInfo* pGroupInfo);
+QC_EXPORT int ChAddGroup(ChatHandle hComponent, ChatGroupInfo* pGroupInfo);
 QC_EXPORT int ChSelectUserByNodeId(ChatHandle hComponent, uint32_t dwNodeID);
 QC_EXPORT int ChCanChatWith(ChatHandle hComponent, uint32_t dwNodeID, signed char bMenuOnly);
 QC_EXPORT int ChSwitchTarget(ChatHandle hComponent);
@@ -104,6 +114,8 @@ QC_EXPORT int ChSetConfig(ChatHandle hComponent, uint32_t dwConfigType, const ch
 QC_EXPORT int ChAllowUserInput(ChatHandle hComponent, int bAllow);
 QC_EXPORT int ChShowUserList(ChatHandle hComponent, int bShow);
 
-}  // extern "C"
+#ifdef __cplusplus
+} /* extern "C" */
+#endif
 
 #endif /* QUINTARACHAT_H */
