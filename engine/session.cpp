@@ -81,8 +81,12 @@ int CChatClient::Initialize(_tagChatData data) {
     m_nStartupTicks = 1;
     m_bPrivilegePending = 1;
 
-    // A repeated start must not leave a second window behind the first.
-    if (!m_hChatUI) CreateUI(&m_hChatUI, m_hParentView, this);
+    // A repeated start keeps the first window, moved into the view the new record names.
+    if (!m_hChatUI) {
+        CreateUI(&m_hChatUI, m_hParentView, this);
+    } else {
+        m_hChatUI->SetSuperView(m_hParentView);
+    }
     // A feature word set before the start found no window to hide the send-to list in.
     if (m_bEveryoneOnly) NotifyUI(msg_NoSendToItems);
     SetMeetingType(m_dwMeetingType);

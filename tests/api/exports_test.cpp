@@ -113,6 +113,13 @@ TEST(Exports, WholeLifeThroughTheExportedFunctions) {
 
     RecordingWindow* window = RecordingWindow::Latest();
     ASSERT_NE(window, nullptr);
+    // A second start keeps the window and moves it into the view the new record names.
+    int otherView = 0;
+    data.hParentView = &otherView;
+    EXPECT_EQ(ChInitialize(handle, &data), 0);
+    loop.RunUntilIdle();
+    EXPECT_EQ(RecordingWindow::Latest(), window);
+    EXPECT_EQ(window->SuperView(), &otherView);
     window->Clear();
     EXPECT_EQ(ChSwitchTarget(handle), 0);
     EXPECT_EQ(ChCloseAllDlg(handle), 0);
