@@ -10,6 +10,7 @@
 
 #include "engine/chat_client.h"
 #include "pdu/roster_info_pdu.h"
+#include "pdu/xml_limits.h"
 #include "platform/func_trace.h"
 #include "platform/string_table.h"
 #include "platform/trace.h"
@@ -74,6 +75,9 @@ int CChatClient::ExtractEnrollInfoAndReturnLen(std::uint32_t index, UserItem* it
     item->dwNodeID = user.dwNodeID;
     const std::int32_t length = user.nEnrollInfoLen;
     if (length < 0 || !user.pEnrollInfo) return -1;
+    // A length beyond any document the parser takes is not copied: it says nothing about the
+    // participant and may say more than the service holds.
+    if (static_cast<std::size_t>(length) > kMaxXmlBytes) return 0;
 
     auto pdu = std::make_unique<CRosterInfoPDU>();
     const std::string text(reinterpret_cast<const char*>(user.pEnrollInfo),

@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "pdu/xml_limits.h"
 #include "platform/inproc_conference.h"
 #include "platform/string_table.h"
 #include "platform/virtual_run_loop.h"
@@ -261,6 +262,8 @@ TEST(ExtractEnrollInfo, HostileEnrollDataCannotHurt) {
          static_cast<std::int32_t>(valid.size()), true, 0, "ann", ROLE_PANELIST},
         {"no data", valid, -2, false, -1, "", 0},
         {"negative length", valid, -1, true, -1, "", 0},
+        {"longer than any document: not copied", valid, static_cast<std::int32_t>(kMaxXmlBytes + 1),
+         true, 0, "", 0},
         {"control characters",
          EnrollBytes({201,
                       "ev\til\x01"
