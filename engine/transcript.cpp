@@ -2,10 +2,7 @@
 // into a folder), opening such files back into the transcript and the window, the modified
 // flag and the tick's watch over the saved file.
 #include <cstdint>
-#include <memory>
-#include <new>
 #include <string>
-#include <string_view>
 #include <utility>
 
 #include "engine/chat_client.h"
@@ -46,12 +43,7 @@ std::string FillFileName(const std::string& format, const std::string& name) {
     std::string message = format;
     const std::size_t at = message.find("%s");
     if (at != std::string::npos) message.replace(at, 2, name);
-    if (message.size() > kMaxWarningBytes) {
-        std::size_t keep = kMaxWarningBytes;
-        while (keep > 0 && (static_cast<unsigned char>(message[keep]) & 0xC0) == 0x80)
-            --keep;
-        message.resize(keep);
-    }
+    message.resize(Utf8FittingSize(message, kMaxWarningBytes));
     return message;
 }
 
@@ -59,55 +51,62 @@ void ShowChatWarning(const std::string& message) {
     ShowWarningWindow2(GetLocalizedString(kWarningTitleKey).c_str(), message.c_str());
 }
 
-// Reads the whole file at path into bytes, with one spare byte after it; false when any step
-// fails.
-bool ReadWholeFile(FileServices& files, const std::string& path, std::unique_ptr<char[]>* bytes,
-                   std::size_t* size) {
+// Reads the whole file at path into bytes; false when any step fails.
+bool ReadWholeFile(FileServices& files, const std::string& path, std::string* bytes) {
     OpenFile file(files);
     std::uint64_t fileSize = 0;
     if (file.Open(path, kFileRead) != kFileOk) return false;
     if (files.GetSize(file.Id(), &fileSize) != kFileOk) return false;
-    if (fileSize >= SIZE_MAX) return false;
-    std::unique_ptr<char[]> buffer(new (std::nothrow) char[fileSize + 1]);
-    if (!buffer) return false;
-    if (files.Read(file.Id(), buffer.get(), fileSize) != kFileOk) return false;
+    if (fileSize > bytes->max_size()) return false;
+    std::string buffer(static_cast<std::size_t>(fileSize), '\0');
+    if (files.Read(file.Id(), buffer.data(), buffer.size()) != kFileOk) return false;
     if (file.Close() != kFileOk) return false;
     *bytes = std::move(buffer);
-    *size = static_cast<std::size_t>(fileSize);
     return true;
 }
 
-// The name of the file a save writes before renaming it over name: hidden, marked as an
-// unfinished save, and no longer than the longest name a folder takes, which is also as long
-// as name may be. A long name lends only its beginning, cut at a character boundary.
-std::string SavingNameFor(const std::string& name) {
+// The start of the name of the file a save writes before renaming it over name: hidden and
+// marked as an unfinished save. With the characters that make it unique it is no longer than
+// the longest name a folder takes; a long name lends only its beginning, cut at a character
+// boundary.
+std::string SavingStemFor(const std::string& name) {
     constexpr std::size_t kMaxNameBytes = 255;
+    constexpr std::size_t kUniqueBytes = 6;
     const std::string prefix = ".";
-    const std::string suffix = ".saving";
+    const std::string suffix = ".saving-";
     const std::size_t keep =
-        Utf8FittingSize(name.data(), name.size(), kMaxNameBytes - prefix.size() - suffix.size());
+        Utf8FittingSize(name, kMaxNameBytes - prefix.size() - suffix.size() - kUniqueBytes);
     return prefix + name.substr(0, keep) + suffix;
 }
 
-// Creates name in folder afresh and writes the whole transcript into it. kFileOk only when
-// every byte was written and the file closed cleanly.
-FileResult WriteNewTranscriptFile(FileServices& files, const std::string& folder,
-                                  const std::string& name, const std::string& path,
-                                  const CChatContentStorage& content) {
-    FileResult result = files.Delete(path);  // what an interrupted save left behind
-    if (result != kFileOk && result != kFileNotFound) return result;
-    result = files.Create(folder, name, FileTag("TEXT"), FileTag("ttxt"));
+// Writes the whole transcript into a new file in folder and makes it the file at path: the
+// bytes reach the disk before the rename, and the rename before the result is known, so a
+// power loss leaves either the old file or the new one whole. The new file takes the mode of
+// the one it replaces. kFileOk only when every step succeeded; no other file is touched.
+FileResult ReplaceWithTranscript(FileServices& files, const std::string& folder,
+                                 const std::string& name, const CChatContentStorage& content) {
+    const std::string path = PathInFolder(folder, name);
+    FileInfo old;
+    const std::uint32_t mode = files.GetInfo(path, &old) == kFileOk ? old.mode : kDefaultFileMode;
+    std::string tempName;
+    FileId id = -1;
+    FileResult result = files.CreateUnique(folder, SavingStemFor(name), mode, &tempName, &id);
     if (result != kFileOk) return result;
+    const std::string tempPath = PathInFolder(folder, tempName);
     OpenFile file(files);
-    result = file.Open(path, kFileWrite);
-    if (result != kFileOk) return result;
+    file.Adopt(id);
 
-    WriteTranscript(content, [&files, &file, &result](const char* data, std::size_t size) {
-        result = files.Write(file.Id(), data, size);
-        return result == kFileOk;
-    });
-    if (result != kFileOk) return result;
-    return file.Close();
+    const std::string bytes = FormatTranscript(content);
+    result = files.Write(file.Id(), bytes.data(), bytes.size());
+    if (result == kFileOk) result = files.Sync(file.Id());
+    const FileResult closed = file.Close();
+    if (result == kFileOk) result = closed;
+    if (result == kFileOk) result = files.Rename(tempPath, path);
+    if (result != kFileOk) {
+        files.Delete(tempPath);
+        return result;
+    }
+    return files.SyncFolder(folder);
 }
 
 }  // namespace
@@ -169,17 +168,16 @@ void CChatClient::PopChatFileOpenDialog() {
 
 void CChatClient::OpenChatFile() {
     const bool hadEntries = IsChatHaveContent();
-    std::unique_ptr<char[]> bytes;
-    std::size_t size = 0;
-    ContentBlock content;
+    std::string bytes;
+    CChatContentStorage content;
     // The file is read whole first, and whether it opens is settled by its first entry,
     // before anything is shown; a file that fails leaves the transcript and the window as
     // they were.
-    const auto show = [this](bool bTitle, std::string_view text) {
-        NotifyUI(bTitle ? msg_ShowTitle : msg_ShowText, const_cast<char*>(text.data()));
+    const auto show = [this](bool bTitle, const std::string& text) {
+        NotifyUI(bTitle ? msg_ShowTitle : msg_ShowText, const_cast<char*>(text.c_str()));
     };
-    if (!ReadWholeFile(CurrentFileServices(), m_strFilePath, &bytes, &size) ||
-        !ParseTranscript(std::move(bytes), size, &content, show)) {
+    if (!ReadWholeFile(CurrentFileServices(), m_strFilePath, &bytes) ||
+        !ParseTranscript(bytes, &content, show)) {
         MacWarnTrace2(kChatTag, "CChatClient::OpenChatFile failed, path = %s",
                       m_strFilePath.c_str());
         ShowChatWarning(GetLocalizedString(kOpenFailedKey));
@@ -192,19 +190,11 @@ void CChatClient::OpenChatFile() {
 }
 
 bool CChatClient::WriteChatFileToFolder(const std::string& path) {
-    // The new file is written beside the old one and then renamed over it, so the old file
-    // stays whole until the new one is complete.
     const std::size_t slash = path.rfind('/');
     const std::size_t nameAt = slash == std::string::npos ? 0 : slash + 1;
-    const std::string folder = path.substr(0, nameAt);
-    const std::string tempName = SavingNameFor(path.substr(nameAt));
-    const std::string tempPath = folder + tempName;
-
-    FileServices& files = CurrentFileServices();
-    FileResult result = WriteNewTranscriptFile(files, folder, tempName, tempPath, m_ChatContent);
-    if (result == kFileOk) result = files.Rename(tempPath, path);
+    const FileResult result = ReplaceWithTranscript(CurrentFileServices(), path.substr(0, nameAt),
+                                                    path.substr(nameAt), m_ChatContent);
     if (result != kFileOk) {
-        files.Delete(tempPath);
         MacErrorTrace2(kChatTag, "CChatClient::WriteChatFileToFolder failed, result = %d",
                        static_cast<int>(result));
         return false;

@@ -6,6 +6,7 @@
 
 #include <cerrno>
 #include <cstdio>
+#include <random>
 
 namespace {
 
@@ -37,6 +38,20 @@ int OpenFlags(FilePermission permission) {
     return O_RDONLY;
 }
 
+// Tries this many names before CreateUnique gives up.
+constexpr int kUniqueNameTries = 100;
+
+// Six characters that make a name unlikely to be in use.
+std::string RandomSuffix() {
+    static const char kChars[] = "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789";
+    static std::mt19937 generator{std::random_device{}()};
+    std::uniform_int_distribution<std::size_t> pick(0, sizeof kChars - 2);
+    std::string suffix(6, ' ');
+    for (char& c : suffix)
+        c = kChars[pick(generator)];
+    return suffix;
+}
+
 FileServices*& Installed() {
     static FileServices* services = nullptr;
     return services;
@@ -55,6 +70,7 @@ FileResult PosixFileServices::GetInfo(const std::string& path, FileInfo* info) {
     info->size = static_cast<std::uint64_t>(st.st_size);
     info->isFolder = S_ISDIR(st.st_mode);
     info->modifiedSeconds = st.st_mtime;
+    info->mode = st.st_mode & 07777;
     return kFileOk;
 }
 
@@ -106,6 +122,20 @@ FileResult PosixFileServices::Truncate(FileId file, std::uint64_t size) {
     return ::ftruncate(file, static_cast<off_t>(size)) == 0 ? kFileOk : FromErrno(errno);
 }
 
+FileResult PosixFileServices::Sync(FileId file) {
+    return ::fsync(file) == 0 ? kFileOk : FromErrno(errno);
+}
+
+FileResult PosixFileServices::SyncFolder(const std::string& folder) {
+    const int fd =
+        ::open(folder.empty() ? "." : folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    if (fd < 0) return FromErrno(errno);
+    const bool synced = ::fsync(fd) == 0;
+    const int error = errno;
+    ::close(fd);
+    return synced ? kFileOk : FromErrno(error);
+}
+
 FileResult PosixFileServices::Close(FileId file) {
     return ::close(file) == 0 ? kFileOk : FromErrno(errno);
 }
@@ -120,12 +150,39 @@ FileResult PosixFileServices::Rename(const std::string& from, const std::string&
 
 FileResult PosixFileServices::Create(const std::string& folder, const std::string& name,
                                      std::uint32_t, std::uint32_t) {
-    std::string path = folder;
-    if (!path.empty() && path.back() != '/') path += '/';
-    path += name;
-    const int fd = ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
+    const int fd =
+        ::open(PathInFolder(folder, name).c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
     if (fd < 0) return FromErrno(errno);
     return ::close(fd) == 0 ? kFileOk : FromErrno(errno);
+}
+
+FileResult PosixFileServices::CreateUnique(const std::string& folder, const std::string& stem,
+                                           std::uint32_t mode, std::string* name, FileId* file) {
+    for (int i = 0; i < kUniqueNameTries; ++i) {
+        const std::string candidate = stem + RandomSuffix();
+        // Created with 0666, so the umask applies as to any new file.
+        const int fd = ::open(PathInFolder(folder, candidate).c_str(),
+                              O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
+        if (fd < 0) {
+            if (errno == EEXIST) continue;
+            return FromErrno(errno);
+        }
+        if (mode != kDefaultFileMode && ::fchmod(fd, static_cast<mode_t>(mode)) != 0) {
+            const int error = errno;
+            ::close(fd);
+            ::unlink(PathInFolder(folder, candidate).c_str());
+            return FromErrno(error);
+        }
+        *name = candidate;
+        *file = fd;
+        return kFileOk;
+    }
+    return kFileExists;
+}
+
+std::string PathInFolder(const std::string& folder, const std::string& name) {
+    if (folder.empty() || folder.back() == '/') return folder + name;
+    return folder + "/" + name;
 }
 
 FileServices& CurrentFileServices() {
@@ -146,6 +203,12 @@ FileResult OpenFile::Open(const std::string& path, FilePermission permission) {
     m_id = id;
     m_bOpen = true;
     return kFileOk;
+}
+
+void OpenFile::Adopt(FileId id) {
+    Close();
+    m_id = id;
+    m_bOpen = true;
 }
 
 FileResult OpenFile::Close() {

@@ -1,5 +1,5 @@
 // The desktop's file services as the engine sees them: resolve a path, open, read, write,
-// truncate, delete, rename, create and examine files. "Not found" is told apart from other
+// truncate, sync, delete, rename, create and examine files. "Not found" is told apart from other
 // failures because callers treat a missing file as a normal case.
 #pragma once
 
@@ -27,7 +27,11 @@ struct FileInfo {
     std::uint64_t size = 0;
     bool isFolder = false;
     std::int64_t modifiedSeconds = 0;  // since the epoch
+    std::uint32_t mode = 0;            // permission bits (0644 and the like)
 };
+
+// CreateUnique's mode for a file no other file lends its mode: 0666 less the umask.
+constexpr std::uint32_t kDefaultFileMode = 0xFFFFFFFF;
 
 // An open file, valid between a successful Open and its Close.
 using FileId = int;
@@ -50,6 +54,10 @@ public:
     virtual FileResult GetSize(FileId file, std::uint64_t* size) = 0;
     // Cuts or extends the file to size bytes.
     virtual FileResult Truncate(FileId file, std::uint64_t size) = 0;
+    // Waits until the file's data has reached the disk.
+    virtual FileResult Sync(FileId file) = 0;
+    // Waits until the folder's entries (a file renamed into it, say) have reached the disk.
+    virtual FileResult SyncFolder(const std::string& folder) = 0;
     // Closes the file; a failure means earlier writes may not have reached the disk.
     virtual FileResult Close(FileId file) = 0;
     // Removes a file.
@@ -60,6 +68,11 @@ public:
     // creator are desktop file tags ('TEXT', 'ttxt'); volumes without them ignore them.
     virtual FileResult Create(const std::string& folder, const std::string& name,
                               std::uint32_t type, std::uint32_t creator) = 0;
+    // Creates a new empty file in folder whose name is stem followed by characters that make
+    // it unused there, and opens it for writing. Its permission bits are mode, or 0666 less
+    // the umask for kDefaultFileMode. *name receives the name; no existing file is touched.
+    virtual FileResult CreateUnique(const std::string& folder, const std::string& stem,
+                                    std::uint32_t mode, std::string* name, FileId* file) = 0;
 };
 
 // The services of an ordinary POSIX file system.
@@ -72,12 +85,19 @@ public:
     FileResult Write(FileId file, const void* data, std::size_t size) override;
     FileResult GetSize(FileId file, std::uint64_t* size) override;
     FileResult Truncate(FileId file, std::uint64_t size) override;
+    FileResult Sync(FileId file) override;
+    FileResult SyncFolder(const std::string& folder) override;
     FileResult Close(FileId file) override;
     FileResult Delete(const std::string& path) override;
     FileResult Rename(const std::string& from, const std::string& to) override;
     FileResult Create(const std::string& folder, const std::string& name, std::uint32_t type,
                       std::uint32_t creator) override;
+    FileResult CreateUnique(const std::string& folder, const std::string& stem, std::uint32_t mode,
+                            std::string* name, FileId* file) override;
 };
+
+// The path of name inside folder ("" is the current folder).
+std::string PathInFolder(const std::string& folder, const std::string& name);
 
 // The services in use: the POSIX ones unless others were installed.
 FileServices& CurrentFileServices();
@@ -95,6 +115,8 @@ public:
 
     // Opens path; any file open before is closed first.
     FileResult Open(const std::string& path, FilePermission permission);
+    // Takes over a file opened elsewhere (by CreateUnique); any file open before is closed.
+    void Adopt(FileId id);
     // Closes the file; kFileOk when none was open.
     FileResult Close();
     FileId Id() const { return m_id; }

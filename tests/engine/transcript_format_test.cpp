@@ -2,10 +2,7 @@
 
 #include <gtest/gtest.h>
 
-#include <memory>
 #include <string>
-#include <string_view>
-#include <utility>
 #include <vector>
 
 namespace {
@@ -26,20 +23,15 @@ struct Parsed {
     std::size_t times;
 };
 
-// Parses a heap copy of bytes with only the spare byte after it, so reading further is
-// reading past the allocation.
 Parsed Parse(const std::string& bytes) {
-    std::unique_ptr<char[]> copy(new char[bytes.size() + 1]);
-    bytes.copy(copy.get(), bytes.size());
     Parsed parsed{};
-    ContentBlock content;
-    parsed.ok = ParseTranscript(
-        std::move(copy), bytes.size(), &content, [&parsed](bool bTitle, std::string_view text) {
-            EXPECT_EQ(text.data()[text.size()], '\0');
-            parsed.shown.push_back((bTitle ? "T:" : "M:") + std::string(text));
-        });
-    parsed.lines.assign(content.lines.begin(), content.lines.end());
-    parsed.times = content.times.size();
+    CChatContentStorage content;
+    parsed.ok = ParseTranscript(bytes, &content, [&parsed](bool bTitle, const std::string& text) {
+        parsed.shown.push_back((bTitle ? "T:" : "M:") + text);
+    });
+    for (std::size_t i = 0; i < content.GetLineCount(); ++i)
+        parsed.lines.emplace_back(content.GetLineAtIndex(i));
+    parsed.times = content.GetTimeCount();
     return parsed;
 }
 
@@ -49,7 +41,8 @@ const std::string kSecond = "12/31/2010    14:05:09 PM    ";
 TEST(TranscriptFormat, FileIsMarkThenPrefixLineAndLfPerTime) {
     CChatContentStorage content;
     const DateTimeRec times[] = {At(2009, 3, 5, 9, 3, 7), At(2009, 3, 5, 0, 15, 0),
-                                 At(2009, 3, 5, 12, 0, 0), At(987, 12, 31, 14, 5, 9)};
+                                 At(2009, 3, 5, 12, 0, 0), At(987, 12, 31, 14, 5, 9),
+                                 At(2009, 3, 5, 99, 0, 0)};  // an hour an opened file kept
     for (const DateTimeRec& time : times) {
         content.InsertTime(time);
         content.InsertNewLine("from Ann:\r");
@@ -62,54 +55,30 @@ TEST(TranscriptFormat, FileIsMarkThenPrefixLineAndLfPerTime) {
               "03/05/2009    00:15:00 AM    from Ann:\r\thi\n"
               "03/05/2009    12:00:00 PM    from Ann:\r\thi\n"
               "12/31/0987    14:05:09 PM    from Ann:\r\thi\n"
+              "03/05/2009    99:00:00 PM    from Ann:\r\thi\n"
               "01/02/2010    03:04:05 AM    \n");
 }
 
-TEST(TranscriptFormat, WritingComesInBoundedChunksAndStopsWhenRefused) {
-    // A line longer than a chunk between two short ones, and enough short ones to fill
-    // more chunks.
-    CChatContentStorage content;
-    std::string expected = kBom;
-    const std::string big(kTranscriptChunkBytes + 10, 'b');
-    const std::string bigLine = "from Ann:\r\t" + big;
-    for (int i = 0; i < 40000; ++i) {
-        content.InsertTime(At(2009, 3, 5, 9, 3, 7));
-        content.InsertNewLine("from Ann:\r");
-        content.ModifyLatestLineByAdd(i == 3 ? big : std::to_string(i));
-        expected += "03/05/2009    09:03:07 AM    from Ann:\r\t" +
-                    (i == 3 ? big : std::to_string(i)) + "\n";
-    }
-    std::string written;
-    int calls = 0;
-    EXPECT_TRUE(WriteTranscript(content, [&](const char* data, std::size_t size) {
-        EXPECT_TRUE(size <= kTranscriptChunkBytes || std::string_view(data, size) == bigLine);
-        written.append(data, size);
-        ++calls;
-        return true;
-    }));
-    EXPECT_EQ(written, expected);
-
-    // Refused at the second chunk: nothing more is asked for.
-    int refusedAt = 0;
-    EXPECT_FALSE(WriteTranscript(
-        content, [&refusedAt](const char*, std::size_t) { return ++refusedAt < 2; }));
-    EXPECT_EQ(refusedAt, 2);
-    EXPECT_GE(calls, 5);
-}
-
-TEST(TranscriptFormat, PrefixChecksDateMinuteAndSecondButNotTheHour) {
-    const std::pair<const char*, bool> cases[] = {
-        {"12/31/0001    99:59:59 PM    ", true},  // the hour is not examined
-        {"03-05-2009xxxx09x03x07xxxxxxx", true},  // nor separators and letters
-        {"13/05/2009    09:03:07 AM    ", false}, {"00/05/2009    09:03:07 AM    ", false},
-        {"03/32/2009    09:03:07 AM    ", false}, {"03/05/0000    09:03:07 AM    ", false},
-        {"03/05/2009    09:60:07 AM    ", false}, {"03/05/2009    09:03:60 AM    ", false},
-        {"0a/05/2009    09:03:07 AM    ", false}, {"03/05/2009    09:03:07 AM   ", false},
+TEST(TranscriptFormat, PrefixChecksDateMinuteAndSecondAndKeepsADigitHour) {
+    struct Case {
+        const char* prefix;
+        bool valid;
+        int hour;
     };
-    for (const auto& c : cases) {
+    const Case cases[] = {
+        {"12/31/0001    99:59:59 PM    ", true, 99},  // the hour is not examined
+        {"03/05/2009    x7:03:07 AM    ", true, 0},   // and kept only when it is two digits
+        {"03-05-2009xxxx09x03x07xxxxxxx", true, 9},   // nor separators and letters
+        {"13/05/2009    09:03:07 AM    ", false, 0}, {"00/05/2009    09:03:07 AM    ", false, 0},
+        {"03/32/2009    09:03:07 AM    ", false, 0}, {"03/05/0000    09:03:07 AM    ", false, 0},
+        {"03/05/2009    09:60:07 AM    ", false, 0}, {"03/05/2009    09:03:60 AM    ", false, 0},
+        {"0a/05/2009    09:03:07 AM    ", false, 0}, {"03/05/2009    09:03:07 AM   ", false, 0},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.prefix);
         DateTimeRec time{};
-        const std::string text = c.first;
-        EXPECT_EQ(ParseTimePrefix(text.data(), text.size(), &time), c.second) << text;
+        EXPECT_EQ(ParseTimePrefix(c.prefix, &time), c.valid);
+        EXPECT_EQ(time.hour, c.hour);
     }
 }
 

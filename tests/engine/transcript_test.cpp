@@ -3,6 +3,8 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
+#include <algorithm>
+#include <filesystem>
 #include <optional>
 #include <string>
 #include <vector>
@@ -29,6 +31,21 @@ std::string SaveFailed(const std::string& name) {
     return "Can't save this file \"" + name +
            "\". Make sure that the disk or folder you want to save is not full, "
            "write-protected, or damaged.";
+}
+
+// The names in folder, sorted.
+std::vector<std::string> Names(const std::string& folder) {
+    std::vector<std::string> names;
+    for (const auto& entry : std::filesystem::directory_iterator(folder))
+        names.push_back(entry.path().filename().string());
+    std::sort(names.begin(), names.end());
+    return names;
+}
+
+mode_t ModeOf(const std::string& path) {
+    struct stat st {};
+    ::stat(path.c_str(), &st);
+    return st.st_mode & 07777;
 }
 
 class HostSink final : public IHostChatSink {
@@ -119,12 +136,21 @@ TEST_F(TranscriptTest, OpeningShowsEveryEntryAndMarksOnlyATranscriptThatHadEntri
 
 TEST_F(TranscriptTest, SavedFileHoldsExactlyTheTranscriptAndOpensBackTheSame) {
     LoadThree();
+    // A file of the user's that looks like an unfinished save is none of the save's business.
+    ASSERT_TRUE(PutFile(dir.File(".saved.txt.saving"), "mine"));
+    const mode_t umask = ::umask(027);
     SaveAs(dir.File("saved.txt"));
+    ::umask(umask);
     const std::string expected = kTwoEntries + kThird;  // one mark, then the entries as read
     EXPECT_EQ(FileBytes(dir.File("saved.txt")), expected);
+    EXPECT_EQ(ModeOf(dir.File("saved.txt")), 0640u);  // a new file: 0666 less the umask
     EXPECT_EQ(host.events, std::vector<std::string>{"modified 0"});
     EXPECT_EQ(engine.ChatFilePath(), dir.File("saved.txt"));
-    EXPECT_FALSE(FileExists(dir.File(".saved.txt.saving")));
+    EXPECT_EQ(FileBytes(dir.File(".saved.txt.saving")), "mine");
+    EXPECT_EQ(Names(dir.Path()),
+              (std::vector<std::string>{".saved.txt.saving", "a.txt", "c.txt", "saved.txt"}));
+    // A file replaced keeps its mode.
+    ASSERT_EQ(::chmod(dir.File("saved.txt").c_str(), 0604), 0);
 
     // Opened into a fresh engine and saved again, the file keeps its bytes.
     CChatClient reader;
@@ -134,6 +160,7 @@ TEST_F(TranscriptTest, SavedFileHoldsExactlyTheTranscriptAndOpensBackTheSame) {
     reader.PopChatFileOpenDialog();
     reader.SaveChatFile(1);
     EXPECT_EQ(FileBytes(dir.File("saved.txt")), expected);
+    EXPECT_EQ(ModeOf(dir.File("saved.txt")), 0604u);
     EXPECT_TRUE(warnings.empty());
 }
 
@@ -188,24 +215,32 @@ TEST_F(TranscriptTest, AnyNameAFolderTakesCanBeSavedTo) {
 }
 
 TEST_F(TranscriptTest, AFailedSaveKeepsTheOldFileAndTheFlagAndWarns) {
-    const std::pair<FileOp, const char*> cases[] = {
-        {FileOp::Delete, ".saving"},  // a stale half-written file stays
-        {FileOp::Create, ".saving"}, {FileOp::Open, ".saving"},
-        {FileOp::Write, ".saving"},  // the disk is full
-        {FileOp::Close, ".saving"},  // the last bytes never reached the disk
-        {FileOp::Rename, "/c.txt"},
+    struct Case {
+        FileOp op;
+        const char* pathPart;
+        bool replaced;  // the step failed after the new file took the old one's place
+    };
+    const Case cases[] = {
+        {FileOp::CreateUnique, "/.c.txt.saving-", false},
+        {FileOp::Write, ".saving-", false},  // the disk is full
+        {FileOp::Sync, ".saving-", false},   // the bytes never reached the disk
+        {FileOp::Close, ".saving-", false},
+        {FileOp::Rename, "/c.txt", false},
+        {FileOp::SyncFolder, "", true},  // the rename may not have reached the disk
     };
     LoadThree();
-    for (const auto& c : cases) {
-        SCOPED_TRACE(static_cast<int>(c.first));
+    for (const Case& c : cases) {
+        SCOPED_TRACE(static_cast<int>(c.op));
+        ASSERT_TRUE(PutFile(dir.File("c.txt"), "\xEF\xBB\xBF" + kThird));
         FailingFileServices files;
-        files.Fail(c.first, kFileError, c.second);
+        files.Fail(c.op, kFileError, c.pathPart);
         warnings.clear();
         engine.SaveChatFile(1);
-        EXPECT_EQ(FileBytes(dir.File("c.txt")), "\xEF\xBB\xBF" + kThird);
+        EXPECT_EQ(FileBytes(dir.File("c.txt")),
+                  c.replaced ? kTwoEntries + kThird : "\xEF\xBB\xBF" + kThird);
         EXPECT_EQ(engine.FileNeedSave(), 1);
         EXPECT_EQ(warnings, std::vector<std::string>{"Korvo Chat: " + SaveFailed("c.txt")});
-        EXPECT_FALSE(FileExists(dir.File(".c.txt.saving")));
+        EXPECT_EQ(Names(dir.Path()), (std::vector<std::string>{"a.txt", "c.txt"}));
     }
     EXPECT_TRUE(host.events.empty());
 }

@@ -1,6 +1,7 @@
 #include "platform/file_services.h"
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include "tests/support/temp_dir.h"
 
@@ -19,6 +20,10 @@ TEST(PosixFiles, MissingFilesAreToldApartFromOtherFailures) {
         EXPECT_EQ(files.Delete(path), kFileNotFound) << path;
     }
     EXPECT_EQ(files.Create(dir.File("missing"), "name", 0, 0), kFileNotFound);
+    std::string name;
+    EXPECT_EQ(files.CreateUnique(dir.File("missing"), "n", kDefaultFileMode, &name, &id),
+              kFileNotFound);
+    EXPECT_EQ(files.SyncFolder(dir.File("missing")), kFileNotFound);
     EXPECT_EQ(files.Create(dir.Path(), "plain", 0, 0), kFileExists);
     // A folder where a file is expected is a failure of another kind.
     EXPECT_EQ(files.Open(dir.Path(), kFileWrite, &id), kFileError);
@@ -41,6 +46,36 @@ TEST(PosixFiles, AnOpenFileIsWrittenCutAndReadExactly) {
     EXPECT_EQ(files.Read(file.Id(), buffer, 4), kFileOk);
     EXPECT_EQ(files.Read(file.Id(), buffer, 4), kFileError);  // one byte was left
     EXPECT_EQ(file.Close(), kFileOk);
+}
+
+TEST(PosixFiles, UniqueFilesAreNewOpenForWritingAndTakeTheModeAsked) {
+    PosixFileServices files;
+    TempDir dir;
+    const mode_t umask = ::umask(022);
+    struct Made {
+        std::string name;
+        FileId id = -1;
+    } made[3];
+    ASSERT_EQ(files.CreateUnique(dir.Path(), ".f.", kDefaultFileMode, &made[0].name, &made[0].id),
+              kFileOk);
+    ASSERT_EQ(files.CreateUnique(dir.Path(), ".f.", kDefaultFileMode, &made[1].name, &made[1].id),
+              kFileOk);
+    ASSERT_EQ(files.CreateUnique(dir.Path() + "/", ".f.", 0604, &made[2].name, &made[2].id),
+              kFileOk);
+    ::umask(umask);
+    EXPECT_NE(made[0].name, made[1].name);
+    const mode_t modes[] = {0644, 0644, 0604};
+    for (int i = 0; i < 3; ++i) {
+        EXPECT_EQ(made[i].name.rfind(".f.", 0), 0u);
+        EXPECT_EQ(files.Write(made[i].id, "x", 1), kFileOk);
+        EXPECT_EQ(files.Sync(made[i].id), kFileOk);
+        EXPECT_EQ(files.Close(made[i].id), kFileOk);
+        FileInfo info;
+        ASSERT_EQ(files.GetInfo(dir.File(made[i].name), &info), kFileOk);
+        EXPECT_EQ(info.mode, modes[i]);
+        EXPECT_EQ(FileBytes(dir.File(made[i].name)), "x");
+    }
+    EXPECT_EQ(files.SyncFolder(dir.Path()), kFileOk);
 }
 
 }  // namespace

@@ -63,6 +63,16 @@ FileResult FailingFileServices::Truncate(FileId file, std::uint64_t size) {
     return injected != kFileOk ? injected : m_posix.Truncate(file, size);
 }
 
+FileResult FailingFileServices::Sync(FileId file) {
+    const FileResult injected = Injected(FileOp::Sync, PathOf(file));
+    return injected != kFileOk ? injected : m_posix.Sync(file);
+}
+
+FileResult FailingFileServices::SyncFolder(const std::string& folder) {
+    const FileResult injected = Injected(FileOp::SyncFolder, folder);
+    return injected != kFileOk ? injected : m_posix.SyncFolder(folder);
+}
+
 FileResult FailingFileServices::Close(FileId file) {
     const FileResult injected = Injected(FileOp::Close, PathOf(file));
     m_openPaths.erase(file);
@@ -83,6 +93,15 @@ FileResult FailingFileServices::Rename(const std::string& from, const std::strin
 
 FileResult FailingFileServices::Create(const std::string& folder, const std::string& name,
                                        std::uint32_t type, std::uint32_t creator) {
-    const FileResult injected = Injected(FileOp::Create, folder + name);
+    const FileResult injected = Injected(FileOp::Create, PathInFolder(folder, name));
     return injected != kFileOk ? injected : m_posix.Create(folder, name, type, creator);
+}
+
+FileResult FailingFileServices::CreateUnique(const std::string& folder, const std::string& stem,
+                                             std::uint32_t mode, std::string* name, FileId* file) {
+    const FileResult injected = Injected(FileOp::CreateUnique, PathInFolder(folder, stem));
+    if (injected != kFileOk) return injected;
+    const FileResult result = m_posix.CreateUnique(folder, stem, mode, name, file);
+    if (result == kFileOk) m_openPaths[*file] = PathInFolder(folder, *name);
+    return result;
 }

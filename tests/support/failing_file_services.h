@@ -18,10 +18,13 @@ enum class FileOp {
     Write,
     GetSize,
     Truncate,
+    Sync,
+    SyncFolder,
     Close,
     Delete,
     Rename,
-    Create
+    Create,
+    CreateUnique
 };
 
 class FailingFileServices final : public FileServices {
@@ -32,9 +35,9 @@ public:
     FailingFileServices& operator=(const FailingFileServices&) = delete;
 
     // Makes op fail with result on paths containing pathPart (every path when empty). For
-    // Rename the path is the destination; for calls on an open file it is the path it was
-    // opened with. A failed call does nothing, except that a failed Close still releases the
-    // file, as a real one does.
+    // Rename the path is the destination, for CreateUnique the folder and stem; for calls on
+    // an open file it is the path it was opened or created with. A failed call does nothing, except
+    // that a failed Close still releases the file, as a real one does.
     void Fail(FileOp op, FileResult result, const std::string& pathPart = "");
 
     FileResult Resolve(const std::string& path) override;
@@ -44,11 +47,15 @@ public:
     FileResult Write(FileId file, const void* data, std::size_t size) override;
     FileResult GetSize(FileId file, std::uint64_t* size) override;
     FileResult Truncate(FileId file, std::uint64_t size) override;
+    FileResult Sync(FileId file) override;
+    FileResult SyncFolder(const std::string& folder) override;
     FileResult Close(FileId file) override;
     FileResult Delete(const std::string& path) override;
     FileResult Rename(const std::string& from, const std::string& to) override;
     FileResult Create(const std::string& folder, const std::string& name, std::uint32_t type,
                       std::uint32_t creator) override;
+    FileResult CreateUnique(const std::string& folder, const std::string& stem, std::uint32_t mode,
+                            std::string* name, FileId* file) override;
 
 private:
     struct Rule {
