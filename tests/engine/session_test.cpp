@@ -431,17 +431,22 @@ TEST_F(SessionTest, SecondInitializeKeepsTheFirstServiceWindowAndTimer) {
     EXPECT_EQ(engine.PrivilegeCountdown(), 3);
 }
 
-TEST_F(SessionTest, DeletingWithCallbacksInFlightDeliversNothingMore) {
+TEST_F(SessionTest, DeletingWithAnswersInFlightDeliversNothingMore) {
     InProcessArmClient* client = conference.CreateClient(loop, 7);
     auto engine = std::make_unique<CChatClient>();
     engine->Initialize(Data(client, 7, "Alice"));
     loop.RunUntilIdle();
     // A change that makes the engine write to the service, then delete it before answers come.
     engine->SetRosterStatus(0, 0);
-    EXPECT_GT(loop.PendingTasks(), 0u);
+    ASSERT_GT(loop.PendingTasks(), 0u);
     engine.reset();
+    host.events.clear();
+    // Answers and ticks still due find no way to the engine: under the sanitizer a touch of
+    // the deleted engine fails the run, and no entry point traces, nor does the host hear.
+    TraceCapture trace;
     loop.AdvanceBy(5.0);
-    EXPECT_EQ(conference.ClientCount(), 0u);
+    EXPECT_TRUE(trace.Lines().empty());
+    EXPECT_TRUE(host.events.empty());
 }
 
 TEST_F(SessionTest, NullNamesLeaveStringsEmptyAndTagModeZeroKeepsTag) {
