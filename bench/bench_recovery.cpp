@@ -5,8 +5,8 @@
 // same 10,000 documents bare with tinyxml (target: at most 3 times). Also prints the peak of
 // the memory the restore allocated on top of what the joiner held before it joined.
 //
-// On the shared 2-core development VM: restore 64-72 ms against a 20-22 ms floor, ratio 3.1
-// to 3.3, peak 8.8 MB. Every everyone line is parsed once, shown, and backed up into the
+// On the 2-core development VM at rest: restore 59-60 ms against a 20.7-21 ms floor, ratio
+// 2.8 to 2.9, peak 9.5 MB (under load from other work the ratio drifts above 3). Every everyone line is parsed once, shown, and backed up into the
 // customer cache (built, printed and appended: about a fifth of the restore), since none of
 // them was copied there before; showing (title, transcript, host, traces) takes about as much.
 #include <time.h>
