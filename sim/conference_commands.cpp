@@ -54,7 +54,11 @@ void Simulator::Conference(const ScenarioCommand& c) {
         if (fields != 6 || !m_clock.SetCalendarOrigin(origin))
             Fail(c, "start= takes a time such as \"2009-03-05 09:03:00\", not " + start->value);
     }
-    m_conference = std::make_unique<InProcessConference>();
+    if (m_options.server) {
+        m_nats = std::make_unique<NatsParticipants>(*m_options.server);
+    } else {
+        m_conference = std::make_unique<InProcessConference>();
+    }
     Settle();
 }
 
@@ -74,8 +78,16 @@ void Simulator::Join(const ScenarioCommand& c) {
     p->displayName = c.Option("name") ? c.Option("name")->value : name;
     p->nodeId = OptionNumber(c, "node", 0);
     p->loop = std::make_unique<ParticipantLoop>(SharedLoop(), name);
-    p->client = m_conference->CreateClient(*p->loop, p->nodeId);
-    p->service = std::make_unique<WatchedArmClient>(p->client);
+    IArmClient* service = nullptr;
+    if (m_nats) {
+        std::string error;
+        service = m_nats->Create(name, p->nodeId, *p->loop, &error);
+        if (!service) return Fail(c, error);
+    } else {
+        p->client = m_conference->CreateClient(*p->loop, p->nodeId);
+        service = p->client;
+    }
+    p->service = std::make_unique<WatchedArmClient>(service);
     Participant& joined = *p;
     m_participants.push_back(std::move(p));
 
@@ -84,7 +96,7 @@ void Simulator::Join(const ScenarioCommand& c) {
     joined.handle = ChNewInstance();
     _tagChatData data{};
     data.pArmClient = joined.service.get();
-    data.wConferenceID = m_conference->ConferenceId();
+    data.wConferenceID = m_nats ? m_nats->ConferenceId() : m_conference->ConferenceId();
     data.dwSessionID = m_sessionId;
     data.lpszUserName = joined.displayName.c_str();
     data.dwNodeID = joined.nodeId;

@@ -64,9 +64,17 @@ const Simulator::CommandEntry Simulator::kCommands[] = {
 Simulator::Simulator(SimOptions options) : m_options(std::move(options)) {
     if (m_options.gui) m_qtLoop = std::make_unique<QtRunLoop>();
     std::FILE* log = m_options.log;
-    SetTraceSink([log](TraceLevel level, const char* tag, const char* text) {
-        if (!log) return;
+    const bool networked = m_options.server.has_value();
+    SetTraceSink([this, log, networked](TraceLevel level, const char* tag, const char* text) {
         const std::string& acting = ParticipantLoop::Acting();
+        // A server that cannot be reached or refuses a participant says so only here; a run
+        // in which nobody could talk must not pass for one in which all went well.
+        if (networked && level == TraceLevel::Error) {
+            ++m_failures;
+            std::fprintf(m_options.out, "[%s] error: %s\n", acting.empty() ? "-" : acting.c_str(),
+                         text);
+        }
+        if (!log) return;
         std::fprintf(log, "%-5s %s [%s] %s\n", LevelName(level), tag ? tag : "",
                      acting.empty() ? "-" : acting.c_str(), text);
     });
@@ -145,15 +153,45 @@ void Simulator::Execute(const ScenarioCommand& command) {
 
 void Simulator::Settle() {
     if (m_qtLoop) return QCoreApplication::processEvents();
+    SettleHere();
+    // Only a request sets the networked conference moving: with none since it was last quiet,
+    // nothing is on its way (the clock's ticks mostly ask nothing).
+    if (!m_nats || ServiceCalls() == m_callsSettled) return;
+    // The server goes quiet before anything here runs: what one request sets off (a newcomer's
+    // call for everybody's presence, say) has then reached every participant before the
+    // callbacks that answer it run, whatever order the connections took.
+    for (;;) {
+        std::uint64_t heard = 0;
+        while (const std::uint64_t more = m_nats->Settle())
+            heard += more;
+        const std::size_t ran = SettleHere();
+        if (heard == 0 && ran == 0) break;
+    }
+    m_callsSettled = ServiceCalls();
+}
+
+std::size_t Simulator::SettleHere() {
     // The windows' posted events (deferred deletions included) count as work too.
+    std::size_t total = 0;
     for (;;) {
         QCoreApplication::sendPostedEvents();
         QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
-        if (m_clock.RunUntilIdle() != 0) continue;
+        std::size_t ran = m_clock.RunUntilIdle();
+        total += ran;
+        if (ran != 0) continue;
         QCoreApplication::processEvents();
         QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
-        if (m_clock.RunUntilIdle() == 0) return;
+        ran = m_clock.RunUntilIdle();
+        total += ran;
+        if (ran == 0) return total;
     }
+}
+
+std::uint64_t Simulator::ServiceCalls() const {
+    std::uint64_t calls = 0;
+    for (const auto& p : m_participants)
+        calls += p->service->Calls();
+    return calls;
 }
 
 void Simulator::Tick(std::uint32_t halfSeconds) {

@@ -15,6 +15,7 @@
 #include "platform/inproc_conference.h"
 #include "platform/virtual_run_loop.h"
 #include "sim/lang/scenario.h"
+#include "sim/nats_participants.h"
 #include "sim/participant_loop.h"
 #include "sim/sim_window.h"
 #include "sim/watched_arm_client.h"
@@ -28,6 +29,8 @@ struct SimOptions {
     std::string outputDir;     // when set: each window's picture and transcript at the end
     bool printAtEnd = false;   // print every transcript and send-to list at the end
     bool gui = false;          // real time on the Qt loop, one command every half second
+    // Every participant on the networked conference of this server instead of in-process.
+    std::optional<NatsSimOptions> server;
 };
 
 class Simulator {
@@ -48,7 +51,7 @@ private:
         std::string displayName;
         std::uint32_t nodeId = 0;
         std::unique_ptr<ParticipantLoop> loop;
-        InProcessArmClient* client = nullptr;
+        InProcessArmClient* client = nullptr;       // null on a server
         std::unique_ptr<WatchedArmClient> service;  // what the component holds
         ChatHandle handle = nullptr;
         SimWindow* window = nullptr;
@@ -65,8 +68,13 @@ private:
     void RunInRealTime(const std::vector<ScenarioCommand>& commands);
     // The loop the participants' work runs on: the virtual clock, or Qt's loop with --gui.
     RunLoop& SharedLoop();
-    // Runs posted work and due timers until nothing is left, without moving the clock.
+    // Runs posted work and due timers until nothing is left, without moving the clock; on a
+    // server also until every request is answered and everything it caused has arrived.
     void Settle();
+    // Runs what is due in this process until nothing is left; how many tasks ran.
+    std::size_t SettleHere();
+    // Requests the components made of their services so far.
+    std::uint64_t ServiceCalls() const;
     // Moves the clock by half-seconds, settling after each.
     void Tick(std::uint32_t halfSeconds);
     void Fail(const ScenarioCommand& command, const std::string& message);
@@ -134,6 +142,9 @@ private:
     double m_realWait = 0;                // seconds the next command waits (--gui)
     std::unique_ptr<InProcessConference> m_conference;
     std::vector<std::unique_ptr<Participant>> m_participants;  // in join order, departed kept
+    // With a server, instead of m_conference; gone before the participants' loops it posts to.
+    std::unique_ptr<NatsParticipants> m_nats;
+    std::uint64_t m_callsSettled = 0;  // ServiceCalls() when the server was last quiet
     int m_failures = 0;
 
     // The conference line.

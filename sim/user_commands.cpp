@@ -146,6 +146,7 @@ void Simulator::Leave(const ScenarioCommand& c) {
 void Simulator::FailOperation(const ScenarioCommand& c) {
     Participant* p = Find(c, c.Positional()[0]->value);
     if (!p) return;
+    if (!p->client) return Fail(c, "only the in-process conference fails on request");
     const std::string& name = c.Positional()[1]->value;
     const int result = static_cast<int>(*ParseScenarioNumber(c.Positional()[2]->value));
     const ScenarioArg* times = c.Option("times");
@@ -162,6 +163,7 @@ void Simulator::Inject(const ScenarioCommand& c) {
     const auto args = c.Positional();
     Participant* p = Find(c, args[0]->value);
     if (!p) return;
+    if (!p->client) return Fail(c, "only the in-process conference takes crafted deliveries");
     const std::string& kind = args[1]->value;
     const ScenarioArg* sender = c.Option("sender");
     bool delivered = false;

@@ -1,5 +1,6 @@
 // A participant's service object as the simulator hands it to the component: every request
-// goes to the real service object, and the flags of the newest cache write are remembered.
+// goes to the real service object, counted, and the flags of the newest cache write are
+// remembered.
 #pragma once
 
 #include <cstdint>
@@ -16,6 +17,8 @@ public:
 
     // The flags of the newest set or append to a cache; nullopt before the first.
     std::optional<std::uint32_t> LastCacheWriteFlags() const { return m_lastFlags; }
+    // Requests made so far; a conference that nobody asked anything of has nothing on its way.
+    std::uint64_t Calls() const { return m_calls; }
 
     int Release() override;
     int Connect(IArmNodeControllerSink* sink, const char* userName, std::uint32_t a,
@@ -53,6 +56,12 @@ public:
                       std::uint32_t* size) override;
 
 private:
+    IArmClient& Inner() {
+        ++m_calls;
+        return *m_pInner;
+    }
+
     IArmClient* m_pInner;
+    std::uint64_t m_calls = 0;
     std::optional<std::uint32_t> m_lastFlags;
 };

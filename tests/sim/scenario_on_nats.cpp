@@ -1,0 +1,94 @@
+// Runs a scenario in the simulator with every participant on a nats-server of its own: the
+// server, on a free loopback port with a temporary store, knows each participant the scenario
+// joins by its short name and a password of its own, and stops when the run ends.
+// Usage: scenario_on_nats SIMULATOR SCENARIO [SIMULATOR OPTIONS...]
+// Exit status: the simulator's (77: the scenario needs the in-process conference), or 1 when
+// the server does not start.
+#include <spawn.h>
+#include <sys/wait.h>
+
+#include <cstdio>
+#include <fstream>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include "sim/lang/scenario.h"
+#include "tests/netconf/nats_server.h"
+
+extern char** environ;
+
+namespace {
+
+constexpr std::uint16_t kConference = 9;
+
+std::string Password(const std::string& name) {
+    return "pw-" + name;
+}
+
+// The short names the scenario joins; false when it does not read (the simulator says why).
+bool Participants(const std::string& path, std::vector<std::string>* names) {
+    std::ifstream file(path, std::ios::binary);
+    std::stringstream text;
+    text << file.rdbuf();
+    std::vector<ScenarioCommand> commands;
+    ScenarioError error;
+    if (!file || !ParseScenario(text.str(), &commands, &error)) return false;
+    for (const ScenarioCommand& command : commands)
+        if (command.verb == "join") names->push_back(command.Positional()[0]->value);
+    return true;
+}
+
+int Run(std::vector<std::string> args) {
+    std::vector<char*> argv;
+    for (std::string& arg : args)
+        argv.push_back(arg.data());
+    argv.push_back(nullptr);
+    pid_t pid = -1;
+    if (posix_spawn(&pid, argv[0], nullptr, nullptr, argv.data(), environ) != 0) {
+        std::fprintf(stderr, "cannot start %s\n", argv[0]);
+        return 1;
+    }
+    int status = 0;
+    waitpid(pid, &status, 0);
+    return WIFEXITED(status) ? WEXITSTATUS(status) : 1;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    if (argc < 3) {
+        std::fprintf(stderr, "usage: %s SIMULATOR SCENARIO [SIMULATOR OPTIONS...]\n", argv[0]);
+        return 2;
+    }
+    const std::string simulator = argv[1];
+    const std::string scenario = argv[2];
+    std::vector<std::string> names;
+    if (!Participants(scenario, &names)) return Run({simulator, scenario});
+
+    ConferenceServerOptions options;
+    options.conferenceId = kConference;
+    options.port = 0;
+    std::string creds;
+    for (const std::string& name : names) {
+        options.participants.push_back({name, Password(name)});
+        creds += name + " " + Password(name) + "\n";
+    }
+    NatsServer server(options);
+    TempDir dir;
+    const std::string credsPath = dir.File("participants.creds");
+    if (!PutFile(credsPath, creds) || !server.Start()) {
+        std::fprintf(stderr, "the nats-server did not start:\n%s\n", server.Log().c_str());
+        return 1;
+    }
+    std::vector<std::string> args = {simulator,
+                                     "--server",
+                                     server.Url(),
+                                     "--creds",
+                                     credsPath,
+                                     "--conference",
+                                     std::to_string(kConference)};
+    args.insert(args.end(), argv + 3, argv + argc);
+    args.push_back(scenario);
+    return Run(args);
+}
