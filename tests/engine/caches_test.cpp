@@ -394,23 +394,15 @@ TEST_F(CachesTest, HandlesAndGroupIdsMapBothWays) {
 
 TEST(CacheNames, GroupIdIsTheNumberAfterTheLastUnderscore) {
     CChatClient engine;
+    // Only eight characters after the underscore count.
     const struct {
         const char* name;
         std::uint32_t groupId;
     } cases[] = {
-        {"123_chat_cache_15", 15},
-        {"123_Chat_User_Info", 0},
-        {"123_chat_status", 0},
-        {"123_chat_cache_4096", 4096},
-        {"123_chat_cache_4097", 0},
-        {"switch_cache_5000", 0},
-        {"switch_cache_12", 12},
-        {"x_00000015", 15},
-        {"x_000000159", 15},  // only eight characters count
-        {"123_chat_cache_", 0},
-        {"nounderscore15", 0},
-        {nullptr, 0},
-    };
+        {"123_chat_cache_15", 15},     {"123_Chat_User_Info", 0},  {"123_chat_status", 0},
+        {"123_chat_cache_4096", 4096}, {"123_chat_cache_4097", 0}, {"switch_cache_5000", 0},
+        {"switch_cache_12", 12},       {"x_00000015", 15},         {"x_000000159", 15},
+        {"123_chat_cache_", 0},        {"nounderscore15", 0},      {nullptr, 0}};
     for (const auto& c : cases)
         EXPECT_EQ(engine.GetGroupIdFormCacheName(c.name), c.groupId) << (c.name ? c.name : "null");
 }

@@ -252,18 +252,6 @@ TEST(CustomerCache, ReceivedAndQMSentLinesAreCopiedOnlyWhenTheyWereShownOrSent) 
     EXPECT_EQ(texts, (Names{"to all #", "to all #", "to all #", "to you", "to you"}));
 }
 
-TEST(Recovery, AJoinerFindingTheCachesInUseStartsRecoveryOnce) {
-    for (const std::uint32_t features :
-         {FEATURE_QM_MODE | FEATURE_GROUP_MSG_RECOVERY, FEATURE_QM_MODE}) {
-        ChatRoom room(1, features);
-        room.Join({"Hana", kHost, ROLE_HOST});
-        TraceCapture capture;
-        room.Join({"Ann", kAttendee, 0});
-        EXPECT_EQ(capture.Has("Start recovery customer cache data......"),
-                  features != FEATURE_QM_MODE);
-    }
-}
-
 // What the host hears, in order.
 struct HostRecorder final : IHostChatSink {
     void OnIncomingChat(const char* sender, const char* message, uint32_t nodeId) override {

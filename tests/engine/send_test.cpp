@@ -55,24 +55,6 @@ std::vector<ArmEvent> CacheItems(ChatRoom& room, Member& m, std::uint32_t groupI
     return recorder.Named("SharedDataReceivedEx");
 }
 
-TEST(Sending, TheFirstToJoinInitialisesTheCachesTheOthersOnlySubscribe) {
-    ChatRoom room(3);
-    for (const chatroom::Person& person :
-         {chatroom::Person{"Hana", kHana, ROLE_HOST}, chatroom::Person{"Ann", kAnn, 0},
-          chatroom::Person{"Al", kAl, 0}}) {
-        TraceCapture capture;
-        room.Join(person);
-        const bool first = person.node == kHana;
-        EXPECT_EQ(capture.Has("Enter CChatClient::SetAllCaches"), first) << person.name;
-        EXPECT_TRUE(capture.Has("Enter CChatClient::SubscribeAllGroupCaches")) << person.name;
-    }
-    room.SetHostAndPresenter(kHana, 0);
-    // Nothing written before the later joins was lost to a second initialisation.
-    room.Say(*room.members[1], "first words", GROUP_EVERYONE);
-    EXPECT_EQ(room.Holders("from Ann to All Participants|first words"),
-              (Names{"Hana", "Ann", "Al"}));
-}
-
 TEST(Sending, EveryAudienceOfAPanelMeetingReachesExactlyItsParticipants) {
     ChatRoom room(3);
     JoinPanel(room);

@@ -115,29 +115,6 @@ TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
     EXPECT_EQ(window->Sink(), static_cast<IChatCommSinkForChatUI*>(&engine));
 }
 
-TEST_F(SessionTest, LaterJoinerFindsTheCachesInitialisedAndOnlySubscribes) {
-    InProcessArmClient* firstClient = conference.CreateClient(loop, 7);
-    CChatClient first;
-    first.Initialize(Data(firstClient, 7, "Alice", 3));
-    loop.RunUntilIdle();
-
-    InProcessArmClient* client = conference.CreateClient(loop, 8);
-    SpyArmClient spy(client);
-    TraceCapture capture;
-    CChatClient second;
-    second.Initialize(Data(&spy, 8, "Bob", 3));
-    loop.RunUntilIdle();
-    EXPECT_EQ(second.SessionValue(), first.SessionValue());
-    EXPECT_EQ(second.ChatStatusCacheHandle().handle_value,
-              first.ChatStatusCacheHandle().handle_value);
-    EXPECT_FALSE(capture.Has("Enter CChatClient::SetAllCaches"));
-    EXPECT_TRUE(capture.Has("CChatClient::SetAllGroupCacheSetFlag()"));
-    int subscribed = 0, requestType = 0, cacheSet = 0;
-    ASSERT_TRUE(second.GetGroupCacheStatus(GROUP_EVERYONE, subscribed, requestType, cacheSet));
-    EXPECT_EQ(subscribed, 1);
-    EXPECT_EQ(cacheSet, 1);
-}
-
 TEST_F(SessionTest, RosterInfoIsPinned) {
     InProcessArmClient* client = conference.CreateClient(loop, 7);
     SpyArmClient spy(client);
@@ -185,16 +162,20 @@ TEST_F(SessionTest, RosterInfoCarriesFaqFieldsTagAndCustomerId) {
 
 TEST_F(SessionTest, ConnectResultDecidesWhetherTheChainGoesOn) {
     std::uint32_t node = 7;
-    for (const int result : {1202, 1, 19, -5}) {  // -5: the confirmation carries 5
+    // Negative: the confirmation carries the value; -19 twice: two retries, then it connects.
+    for (const int result : {1202, 1, 19, -5, -19}) {
         SCOPED_TRACE(result);
         InProcessArmClient* client = conference.CreateClient(loop, node);
         SpyArmClient spy(client);
         if (result > 0) client->FailNext(ArmOperation::Connect, result);
-        if (result < 0) client->ConfirmNextWith(ArmConfirmation::ConnectConfirm, -result);
+        if (result < 0)
+            client->ConfirmNextWith(ArmConfirmation::ConnectConfirm, -result,
+                                    result == -19 ? 2 : 1);
         CChatClient engine;
         engine.Initialize(Data(&spy, node++, "Alice"));
         loop.RunUntilIdle();
-        const bool joins = result == 1202;
+        const bool joins = result == 1202 || result == -19;
+        EXPECT_EQ(spy.Count("Connect"), result == -19 ? 3u : 1u);
         EXPECT_EQ(spy.Count("ConferenceJoin"), joins ? 1u : 0u);
         if (joins) {
             EXPECT_EQ(engine.State(), kStateEnrolled);
@@ -236,17 +217,6 @@ TEST_F(SessionTest, AlreadyConnectedOrJoinedGoesOnWithinTheSameCall) {
         loop.RunUntilIdle();
         EXPECT_EQ(engine.State(), kStateEnrolled);
     }
-}
-
-TEST_F(SessionTest, ConnectConfirmRetryConnectsAgainBoundedByTheService) {
-    InProcessArmClient* client = conference.CreateClient(loop, 7);
-    SpyArmClient spy(client);
-    client->ConfirmNextWith(ArmConfirmation::ConnectConfirm, kArmRetry, 2);
-    CChatClient engine;
-    engine.Initialize(Data(&spy, 7, "Alice"));
-    loop.RunUntilIdle();
-    EXPECT_EQ(spy.Count("Connect"), 3u);
-    EXPECT_EQ(engine.State(), kStateEnrolled);
 }
 
 TEST_F(SessionTest, AttachAndEnrollFailuresEndInIdle) {

@@ -90,43 +90,6 @@ TEST_F(InProcessConferenceTest, FailedCallsReturnTheChosenResultAndDoNothing) {
     EXPECT_EQ(0u, b.sink->Count("ConnectConfirm"));
 }
 
-TEST_F(InProcessConferenceTest, InjectedResultsThatTellTheStateMakeItSo) {
-    ContractParticipant& pending = Fresh(11);
-    Ctl(pending)->FailNext(ArmOperation::Connect, kArmConnectPending);
-    EXPECT_EQ(kArmConnectPending, pending.client->Connect(pending.sink.get(), "p", 0, 0, 0));
-    Run();
-    EXPECT_EQ(std::vector<std::string>({"ConnectConfirm"}), pending.sink->Names());
-
-    // Told "already connected" and "already joined", a caller goes on to attach at once.
-    ContractParticipant& m = Fresh(12);
-    Ctl(m)->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
-    Ctl(m)->FailNext(ArmOperation::ConferenceJoin, kArmAlreadyJoined);
-    EXPECT_EQ(kArmAlreadyConnected, m.client->Connect(m.sink.get(), "m", 0, 0, 0));
-    EXPECT_EQ(kArmAlreadyJoined, m.client->ConferenceJoin(0, kConference, m.sink.get(), 3));
-    ASSERT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &m.ape));
-    Run();
-    EXPECT_EQ(std::vector<std::string>({"ApeAttachConfirm"}), m.sink->Names());
-    EXPECT_EQ(kArmAlreadyConnected, m.client->Connect(m.sink.get(), "m", 0, 0, 0));
-}
-
-TEST_F(InProcessConferenceTest, ConnectRetriesEndWhenTheInjectedResultsRunOut) {
-    ContractParticipant& m = Fresh(11);
-    // Like the component: connect again whenever the confirmation says 19.
-    m.sink->SetHook([&m](const ArmEvent& event) {
-        if (event.name == "ConnectConfirm" && event.result == kArmRetry) {
-            EXPECT_EQ(0, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
-        }
-    });
-    Ctl(m)->ConfirmNextWith(ArmConfirmation::ConnectConfirm, kArmRetry, 2);
-    ASSERT_EQ(0, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
-    Run();
-    std::vector<short> results;
-    for (const ArmEvent& event : m.sink->Named("ConnectConfirm"))
-        results.push_back(event.result);
-    EXPECT_EQ(std::vector<short>({kArmRetry, kArmRetry, 0}), results);
-    EXPECT_EQ(kArmAlreadyConnected, m.client->Connect(m.sink.get(), "user", 0, 0, 0));
-}
-
 TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect) {
     ContractParticipant& a = Attached(11);
     ContractParticipant& b = Attached(12);
