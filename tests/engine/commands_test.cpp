@@ -68,21 +68,6 @@ TEST(Commands, SelectionChangedMarksExactlyTheReportedEntry) {
     }
 }
 
-TEST(Commands, UnknownEventsAreRefusedAndChangeNothing) {
-    MenuHarness h;
-    SeedGroups(h);
-    std::int32_t everyone = h.engine.GetIndexOfMenuByGroup(GROUP_EVERYONE);
-    h.engine.HandleUIMessage(msg_SelectionChanged, &everyone, nullptr);
-    const std::vector<std::string> titles = h.Titles();
-    h.Commands();
-    for (const int message : {0, 2000, 4999, 5004, 6000}) {
-        std::int32_t value = 0;
-        EXPECT_EQ(h.engine.HandleUIMessage(message, &value, &value), 1) << message;
-    }
-    EXPECT_EQ(h.Titles(), titles);
-    EXPECT_TRUE(h.Commands().empty());
-}
-
 TEST(Commands, ShowAttendeeListNamesOnlyPlainAttendees) {
     MenuHarness h({3});
     h.Enroll(

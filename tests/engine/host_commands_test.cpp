@@ -1,5 +1,6 @@
 // Host commands around chat: the everyone-only mode from the window's first command to the
-// send, QM mode turning on after the start, and events or configuration that name nothing.
+// send, QM mode turning on after the start, and events or configuration that name nothing
+// or that no window sends.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -81,6 +82,11 @@ TEST(HostCommands, EventsAndConfigurationThatNameNothingChangeNothing) {
         // A participant who left between the pick and the event.
         std::uint32_t gone = 299;
         EXPECT_EQ(h.engine.HandleUIMessage(msg_AttendeeSelected, &gone, nullptr), 1);
+        // Events no window sends are refused.
+        for (const int message : {0, 2000, 4999, 5004, 6000}) {
+            std::int32_t value = 0;
+            EXPECT_EQ(h.engine.HandleUIMessage(message, &value, &value), 1) << message;
+        }
         EXPECT_EQ(h.engine.SetConfig(2, nullptr), 0);
         EXPECT_EQ(h.engine.SetConfig(3, nullptr), 0);
         EXPECT_EQ(h.Titles(), titles) << type;
