@@ -106,6 +106,9 @@ private:
         bool active = true;                  // false once unsubscribed (under m_mutex)
         NatsPtr<natsSubscription> sub;
         std::atomic<std::uint64_t> handled{0};  // consumer sequence handed on so far
+        // Stream sequence handed on last (under m_mutex): a consumer the client recreates
+        // after a failover may deliver again what came just before it.
+        std::uint64_t lastStream = 0;
     };
     // A cache item as delivered from the stream.
     struct StoredAction {
@@ -149,6 +152,10 @@ private:
     std::uint64_t PublishStored(natsMsg* msg, const std::string& msgId, std::string* reason);
     bool SubscribeFeed(Feed& feed, const std::string& stream, const std::string& filter,
                        bool fromNow, std::int64_t startNanos, std::string* reason);
+    // The stream sequence of the first message on filter stored at or after startNanos (the
+    // next one to come when there is none yet).
+    bool FirstSequenceSince(const std::string& stream, const std::string& filter,
+                            std::int64_t startNanos, std::uint64_t* sequence, std::string* reason);
     void DropFeed(std::unique_ptr<Feed> feed);
 
     // Presence and roster (nats_arm_client_roster.cpp); m_mutex held.

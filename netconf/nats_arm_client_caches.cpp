@@ -195,7 +195,11 @@ void NatsArmClient::HandleFeed(Feed& feed, natsMsg* msg) {
     if (natsMsg_GetMetaData(&rawMeta, msg) != NATS_OK) return;
     NatsPtr<jsMsgMetaData> meta(rawMeta);
     std::unique_lock<std::mutex> lock(m_mutex);
-    if (feed.handle == 0) {
+    const bool again = meta->Sequence.Stream <= feed.lastStream;
+    if (!again) feed.lastStream = meta->Sequence.Stream;
+    if (again) {
+        // Handed on before the consumer was recreated.
+    } else if (feed.handle == 0) {
         // Private data: the sender is the subject's last token, which only it may publish.
         const std::string sender = ConferenceSubjects::LastToken(natsMsg_GetSubject(msg));
         std::uint64_t flags = 0;

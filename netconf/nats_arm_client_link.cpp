@@ -2,6 +2,7 @@
 // the numbers granted once per conference, stored publishing and the consumers that feed it.
 #include <chrono>
 #include <map>
+#include <thread>
 #include <utility>
 
 #include "netconf/nats_arm_client.h"
@@ -17,6 +18,8 @@ constexpr std::int64_t kPingIntervalMs = 2000;
 constexpr int kMaxPingsOut = 2;
 // How long a stored publish keeps retrying while the servers fail over.
 constexpr auto kPublishPatience = std::chrono::seconds(30);
+// How long making or finding a stream waits for a cluster that is not ready yet.
+constexpr auto kStreamPatience = std::chrono::seconds(15);
 // Private data waits at most this long in a mailbox for its receiver.
 constexpr std::int64_t kMailboxMaxAgeNanos = 24LL * 3600 * 1000000000LL;
 
@@ -24,6 +27,13 @@ constexpr std::int64_t kMailboxMaxAgeNanos = 24LL * 3600 * 1000000000LL;
 // goes, under the same lock the callbacks hold.
 std::mutex g_registryMutex;
 std::map<std::uintptr_t, NatsArmClient*> g_registry;
+
+// Whether a failed request may well succeed when tried again in a moment: the server did not
+// answer, or its cluster is between leaders.
+bool IsPassing(natsStatus status, jsErrCode error) {
+    return status == NATS_TIMEOUT || status == NATS_NO_RESPONDERS ||
+           error == JSClusterNotAvailErr || error == JSClusterNoPeersErr;
+}
 
 }  // namespace
 
@@ -205,15 +215,6 @@ void NatsArmClient::DisconnectTask() {
 
 bool NatsArmClient::EnsureStream(const std::string& name, const std::string& subjects, bool mailbox,
                                  std::string* reason) {
-    jsErrCode error = static_cast<jsErrCode>(0);
-    jsStreamInfo* rawInfo = nullptr;
-    natsStatus status = js_GetStreamInfo(&rawInfo, m_js.get(), name.c_str(), nullptr, &error);
-    NatsPtr<jsStreamInfo> info(rawInfo);
-    if (status == NATS_OK) return true;
-    if (status != NATS_NOT_FOUND) {
-        *reason = "stream " + name + ": " + NatsErrorText(status);
-        return false;
-    }
     const std::string caches = m_subjects.AllCaches();
     const std::string numbers = m_subjects.AllNumbers();
     const char* list[2] = {caches.c_str(), numbers.c_str()};
@@ -226,15 +227,29 @@ bool NatsArmClient::EnsureStream(const std::string& name, const std::string& sub
     config.Storage = js_FileStorage;
     config.Replicas = m_options.replicas;
     if (mailbox) config.MaxAge = kMailboxMaxAgeNanos;
-    rawInfo = nullptr;
-    status = js_AddStream(&rawInfo, m_js.get(), &config, nullptr, &error);
-    info.reset(rawInfo);
-    // Somebody else may have made it meanwhile.
-    if (status != NATS_OK && error != JSStreamNameExistErr) {
-        *reason = "stream " + name + ": " + NatsErrorText(status);
-        return false;
+    // A cluster that is still forming or electing a leader answers late or not at all for a
+    // moment; that is worth waiting for, a refusal is not.
+    const auto giveUp = std::chrono::steady_clock::now() + kStreamPatience;
+    for (;;) {
+        jsErrCode error = static_cast<jsErrCode>(0);
+        jsStreamInfo* rawInfo = nullptr;
+        natsStatus status = js_GetStreamInfo(&rawInfo, m_js.get(), name.c_str(), nullptr, &error);
+        NatsPtr<jsStreamInfo> info(rawInfo);
+        if (status == NATS_OK) return true;
+        if (status == NATS_NOT_FOUND) {
+            error = static_cast<jsErrCode>(0);
+            rawInfo = nullptr;
+            status = js_AddStream(&rawInfo, m_js.get(), &config, nullptr, &error);
+            info.reset(rawInfo);
+            // Somebody else may have made it meanwhile.
+            if (status == NATS_OK || error == JSStreamNameExistErr) return true;
+        }
+        if (!IsPassing(status, error) || std::chrono::steady_clock::now() >= giveUp) {
+            *reason = "stream " + name + ": " + NatsErrorText(status);
+            return false;
+        }
+        std::this_thread::sleep_for(std::chrono::milliseconds(kReconnectWaitMs));
     }
-    return true;
 }
 
 std::uint64_t NatsArmClient::GrantNumber(const std::string& subject, const std::string& claim,
@@ -243,23 +258,32 @@ std::uint64_t NatsArmClient::GrantNumber(const std::string& subject, const std::
     jsPubOptions options;
     jsPubOptions_Init(&options);
     options.ExpectNoMessage = true;
-    jsErrCode error = static_cast<jsErrCode>(0);
-    jsPubAck* rawAck = nullptr;
-    natsStatus status = js_Publish(&rawAck, m_js.get(), subject.c_str(), claim.data(),
-                                   static_cast<int>(claim.size()), &options, &error);
-    NatsPtr<jsPubAck> ack(rawAck);
-    if (status == NATS_OK) {
-        *holder = claim;
-        return ack->Sequence;
+    // A stream whose copies are still electing a leader answers nothing for a moment.
+    const auto giveUp = std::chrono::steady_clock::now() + kStreamPatience;
+    for (;;) {
+        jsErrCode error = static_cast<jsErrCode>(0);
+        jsPubAck* rawAck = nullptr;
+        natsStatus status = js_Publish(&rawAck, m_js.get(), subject.c_str(), claim.data(),
+                                       static_cast<int>(claim.size()), &options, &error);
+        NatsPtr<jsPubAck> ack(rawAck);
+        if (status == NATS_OK) {
+            *holder = claim;
+            return ack->Sequence;
+        }
+        if (error == JSStreamWrongLastSequenceErr) {
+            // Granted before: the first message there holds the number.
+            natsMsg* rawMsg = nullptr;
+            status = js_GetLastMsg(&rawMsg, m_js.get(), m_subjects.CacheStream().c_str(),
+                                   subject.c_str(), nullptr, &error);
+            NatsPtr<natsMsg> first(rawMsg);
+            if (status == NATS_OK) {
+                holder->assign(natsMsg_GetData(rawMsg), natsMsg_GetDataLength(rawMsg));
+                return natsMsg_GetSequence(rawMsg);
+            }
+        }
+        if (!IsPassing(status, error) || std::chrono::steady_clock::now() >= giveUp) return 0;
+        std::this_thread::sleep_for(std::chrono::milliseconds(kReconnectWaitMs));
     }
-    // Granted before: the first message there holds the number.
-    natsMsg* rawMsg = nullptr;
-    status = js_GetLastMsg(&rawMsg, m_js.get(), m_subjects.CacheStream().c_str(), subject.c_str(),
-                           nullptr, &error);
-    NatsPtr<natsMsg> first(rawMsg);
-    if (status != NATS_OK) return 0;
-    holder->assign(natsMsg_GetData(rawMsg), natsMsg_GetDataLength(rawMsg));
-    return natsMsg_GetSequence(rawMsg);
 }
 
 std::uint64_t NatsArmClient::PublishStored(natsMsg* msg, const std::string& msgId,
@@ -292,12 +316,18 @@ std::uint64_t NatsArmClient::PublishStored(natsMsg* msg, const std::string& msgI
 
 bool NatsArmClient::SubscribeFeed(Feed& feed, const std::string& stream, const std::string& filter,
                                   bool fromNow, std::int64_t startNanos, std::string* reason) {
+    std::uint64_t startSequence = 0;
+    if (!fromNow && !FirstSequenceSince(stream, filter, startNanos, &startSequence, reason)) {
+        return false;
+    }
     jsSubOptions options;
     jsSubOptions_Init(&options);
     options.Stream = stream.c_str();
     options.Ordered = true;
-    options.Config.DeliverPolicy = fromNow ? js_DeliverNew : js_DeliverByStartTime;
-    if (!fromNow) options.Config.OptStartTime = startNanos;
+    // By sequence, not by time: a consumer the client recreates after a failover resumes by
+    // sequence, and the server refuses one that carries a start time as well.
+    options.Config.DeliverPolicy = fromNow ? js_DeliverNew : js_DeliverByStartSequence;
+    if (!fromNow) options.Config.OptStartSeq = startSequence;
     jsErrCode error = static_cast<jsErrCode>(0);
     natsSubscription* raw = nullptr;
     const natsStatus status = js_Subscribe(&raw, m_js.get(), filter.c_str(), &NatsArmClient::OnFeed,
@@ -306,6 +336,45 @@ bool NatsArmClient::SubscribeFeed(Feed& feed, const std::string& stream, const s
     if (status != NATS_OK) {
         *reason = "consumer on " + filter + ": " + NatsErrorText(status);
         feed.sub.reset();
+        return false;
+    }
+    return true;
+}
+
+bool NatsArmClient::FirstSequenceSince(const std::string& stream, const std::string& filter,
+                                       std::int64_t startNanos, std::uint64_t* sequence,
+                                       std::string* reason) {
+    // A consumer by start time that nothing has been delivered by yet stands right before
+    // the first action stored since; one that already delivered names it in that message.
+    jsSubOptions options;
+    jsSubOptions_Init(&options);
+    options.Stream = stream.c_str();
+    options.Ordered = true;
+    options.Config.DeliverPolicy = js_DeliverByStartTime;
+    options.Config.OptStartTime = startNanos;
+    jsErrCode error = static_cast<jsErrCode>(0);
+    natsSubscription* raw = nullptr;
+    natsStatus status =
+        js_SubscribeSync(&raw, m_js.get(), filter.c_str(), nullptr, &options, &error);
+    NatsPtr<natsSubscription> sub(raw);
+    jsConsumerInfo* rawInfo = nullptr;
+    if (status == NATS_OK)
+        status = natsSubscription_GetConsumerInfo(&rawInfo, raw, nullptr, &error);
+    NatsPtr<jsConsumerInfo> info(rawInfo);
+    if (status == NATS_OK && info->Delivered.Consumer == 0) {
+        *sequence = info->Delivered.Stream + 1;
+    } else if (status == NATS_OK) {
+        natsMsg* rawMsg = nullptr;
+        jsMsgMetaData* rawMeta = nullptr;
+        status = natsSubscription_NextMsg(&rawMsg, raw, kRequestTimeoutMs);
+        NatsPtr<natsMsg> msg(rawMsg);
+        if (status == NATS_OK) status = natsMsg_GetMetaData(&rawMeta, rawMsg);
+        NatsPtr<jsMsgMetaData> meta(rawMeta);
+        if (status == NATS_OK) *sequence = meta->Sequence.Stream;
+    }
+    if (sub) natsSubscription_Unsubscribe(raw);
+    if (status != NATS_OK) {
+        *reason = "start of " + filter + ": " + NatsErrorText(status);
         return false;
     }
     return true;
