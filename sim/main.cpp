@@ -143,7 +143,9 @@ int main(int argc, char** argv) {
         Simulator simulator(options);
         failures = simulator.Run(commands);
         if (options.gui) {
-            std::printf("the script has ended; close the windows to leave\n");
+            HostPanel panel(simulator.PanelHooks());
+            panel.show();
+            std::printf("the script has ended; the host panel and the windows are yours\n");
             std::fflush(stdout);
             QApplication::exec();
         }

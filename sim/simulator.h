@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "api/quintarachat.h"
+#include "hostpanel/host_panel.h"
 #include "platform/inproc_conference.h"
 #include "platform/virtual_run_loop.h"
 #include "sim/lang/scenario.h"
@@ -44,6 +45,8 @@ public:
     // every component. Returns the number of expectations that did not hold plus the
     // commands that could not be carried out.
     int Run(const std::vector<ScenarioCommand>& commands);
+    // How the host panel reaches the participants once the script has ended (--gui).
+    HostPanel::Hooks PanelHooks();
 
 private:
     struct Participant {
