@@ -6,6 +6,8 @@
 #include <fstream>
 #include <sstream>
 
+#include "netconf/conference_subjects.h"
+
 namespace {
 
 // A whole decimal number within limit.
@@ -17,13 +19,6 @@ bool Number(const char* text, std::uint64_t limit, std::uint64_t* out) {
     if (errno != 0 || *end != '\0' || value > limit) return false;
     *out = value;
     return true;
-}
-
-std::string Trimmed(const std::string& text) {
-    const std::size_t first = text.find_first_not_of(" \t\r");
-    if (first == std::string::npos) return "";
-    const std::size_t last = text.find_last_not_of(" \t\r");
-    return text.substr(first, last - first + 1);
 }
 
 }  // namespace
@@ -74,6 +69,11 @@ bool ParseDesktopOptions(int argc, const char* const* argv, DesktopOptions* out,
             options.meetingType = static_cast<std::int32_t>(number);
             options.meetingTypeGiven = true;
             ++i;
+        } else if (arg == "--wait") {
+            if (!Number(value, 3600, &number) || number == 0)
+                return needs("a number of seconds from 1 to 3600");
+            options.waitSeconds = static_cast<double>(number);
+            ++i;
         } else {
             *error = "unknown argument " + arg;
             return false;
@@ -98,19 +98,23 @@ bool ParseCredentials(const std::string& text, DesktopCredentials* out, std::str
     std::istringstream lines(text);
     std::string line;
     for (int number = 1; std::getline(lines, line); ++number) {
-        line = Trimmed(line);
-        if (line.empty() || line[0] == '#') continue;
-        const std::size_t equals = line.find('=');
-        const std::string key = Trimmed(line.substr(0, equals));
-        if (equals == std::string::npos || (key != "user" && key != "password")) {
-            *error =
-                "line " + std::to_string(number) + ": expected user = NAME or password = SECRET";
+        const std::size_t comment = line.find('#');
+        if (comment != std::string::npos) line.erase(comment);
+        std::istringstream words(line);
+        std::string user, password, extra;
+        if (!(words >> user)) continue;
+        if (!(words >> password) || (words >> extra) || !IsValidConferenceUser(user)) {
+            *error = "line " + std::to_string(number) + ": a line takes a user name and a password";
             return false;
         }
-        (key == "user" ? creds.user : creds.password) = Trimmed(line.substr(equals + 1));
+        if (!creds.user.empty()) {
+            *error = "line " + std::to_string(number) + ": one participant, one user";
+            return false;
+        }
+        creds = {user, password};
     }
-    if (creds.user.empty() || creds.password.empty()) {
-        *error = creds.user.empty() ? "no user name" : "no password";
+    if (creds.user.empty()) {
+        *error = "no user name and password";
         return false;
     }
     *out = creds;

@@ -15,6 +15,7 @@ struct DesktopOptions {
     bool meetingTypeGiven = false;
     bool offscreen = false;
     std::string scriptPath;
+    double waitSeconds = 10;  // how long a script waits for what others do
 };
 
 // Reads the command line; false with a message for anything missing, unknown or malformed.
@@ -26,9 +27,9 @@ struct DesktopCredentials {
     std::string password;
 };
 
-// Reads a credentials file: "user = NAME" and "password = SECRET" lines, blank lines and
-// lines starting with '#' ignored. False with a message when the file cannot be read, a line
-// is not understood or either value is missing.
+// Reads a credentials file as the simulator's: "NAME PASSWORD" on a line, '#' starting a
+// comment; here it holds one user. False with a message when the file cannot be read, a line
+// is not a usable user name and a password, or there is not exactly one.
 bool ReadCredentials(const std::string& path, DesktopCredentials* out, std::string* error);
 // The same, from the file's text.
 bool ParseCredentials(const std::string& text, DesktopCredentials* out, std::string* error);

@@ -197,7 +197,8 @@ void DesktopScript::Execute(const ScenarioCommand& c) {
         DesktopParticipant::RunUntil([] { return false; }, seconds);
     } else if (verb == "startup") {
         // On a server the start-up is over once the component is enrolled.
-        if (!m_me.WaitEnrolled(kWaitSeconds)) Fail(c, "timed out: me is not enrolled");
+        if (!m_me.WaitEnrolled(m_me.Options().waitSeconds))
+            Fail(c, "timed out: me is not enrolled");
     } else {
         Fail(c, "unknown command " + verb);
     }
@@ -216,7 +217,7 @@ std::string DesktopScript::WaitFor(const ScenarioCommand& c, Check check) {
             complaint = m_me.In() ? (this->*check)(c) : "me has left the conference";
             return complaint.empty();
         },
-        kWaitSeconds);
+        m_me.Options().waitSeconds);
     return complaint;
 }
 
@@ -274,7 +275,7 @@ void DesktopScript::Pick(const ScenarioCommand& c) {
             }
             return false;
         },
-        kWaitSeconds);
+        m_me.Options().waitSeconds);
     if (!known) return Fail(c, "timed out: nobody on node " + c.Positional()[1]->value + " joined");
     MyChatController* window = m_me.Window();
     ChatPopUpButton* button = window->userlist();

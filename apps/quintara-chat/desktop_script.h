@@ -16,9 +16,6 @@ struct PopupItem;
 
 class DesktopScript {
 public:
-    // How long a command waits for what another participant does.
-    static constexpr double kWaitSeconds = 10;
-
     DesktopScript(DesktopParticipant& me, std::FILE* out);
     ~DesktopScript();
     DesktopScript(const DesktopScript&) = delete;

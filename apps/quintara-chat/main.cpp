@@ -2,7 +2,7 @@
 // the host panel, so people on several machines chat through one server.
 //   quintara-chat --server nats://HOST:PORT --creds FILE --conference N --name "Display Name"
 //                 --node N [--host] [--presenter] [--panelist] [--meeting-type N]
-//                 [--offscreen] [--script FILE]
+//                 [--offscreen] [--script FILE [--wait SECONDS]]
 // Exit status 0 when the script's expectations all hold (or the user closed the window),
 // 1 when some failed, 2 for a bad command line, credentials file or script, 3 when the
 // conference could not be joined.
@@ -34,9 +34,10 @@ int Usage(const std::string& error) {
                  "usage: quintara-chat --server nats://HOST:PORT --creds FILE --conference N\n"
                  "                     --name \"Display Name\" --node N\n"
                  "                     [--host] [--presenter] [--panelist] [--meeting-type N]\n"
-                 "                     [--offscreen] [--script FILE]\n"
-                 "  --creds FILE   lines \"user = NAME\" and \"password = SECRET\"\n"
-                 "  --script FILE  runs a scenario as the participant `me`\n",
+                 "                     [--offscreen] [--script FILE [--wait SECONDS]]\n"
+                 "  --creds FILE   the participant's user on the server: \"NAME PASSWORD\"\n"
+                 "  --script FILE  runs a scenario as the participant `me`\n"
+                 "  --wait SECONDS how long the script waits for others (10)\n",
                  error.c_str());
     return 2;
 }
