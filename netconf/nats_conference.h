@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "platform/arm_service.h"
+#include "platform/host_kit.h"
 
 class RunLoop;
 
@@ -31,4 +32,4 @@ struct NatsConferenceOptions {
 // A new participant's service object, answering on loop (which must outlive it) from the time
 // its Connect is answered until its Release(). Null when the options cannot work: no server
 // address, a user name that is not usable, or a replica count outside 1 to 5.
-IArmClient* CreateNatsArmClient(const NatsConferenceOptions& options, RunLoop& loop);
+QC_HOST_KIT IArmClient* CreateNatsArmClient(const NatsConferenceOptions& options, RunLoop& loop);
