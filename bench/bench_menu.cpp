@@ -1,5 +1,5 @@
 // Send-to menu growth: a meeting-type-1 participant allowed private chat watches 10,000
-// participants enroll and then leave. Each arrival scans the menu once for its place, so the
+// participants enroll and then leave. Each arrival looks up its place in the menu, so the
 // cost of one arrival may grow with the menu's size, but no faster; this prints the cost per
 // arrival and per departure near 1,000, 5,000 and 10,000 entries and how it grew.
 #include <chrono>

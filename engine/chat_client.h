@@ -15,6 +15,7 @@
 #include "api/window_bridge.h"
 #include "engine/chat_content_storage.h"
 #include "engine/chat_data_cmd_process.h"
+#include "engine/menu_model.h"
 #include "engine/menu_status.h"
 #include "engine/user_list_manager.h"
 #include "engine/users_group_list.h"
@@ -409,6 +410,9 @@ private:
     int IndexOfParticipantEntry(std::uint32_t nodeId, bool bRecent) const;
     // True when some entry belongs to a participant.
     bool HasParticipantEntry() const;
+    // Tell the window of the entry at index as it now stands / of the whole menu.
+    void AnnounceUpdatedEntry(int index);
+    void AnnounceRebuiltMenu();
     // True when, of the privilege flags, private chat alone is allowed.
     bool OnlyChatPrivately() const;
     // Another participant's roles: host and presenter by the holder ids, panelist by the roster.
@@ -516,7 +520,8 @@ public:
     // ---- State read by tests and the component's functions ----
     const CUserListManager& UserList() const { return m_UserList; }
     const CUsersGroupList& GroupList() const { return m_GroupList; }
-    const MenuStatusList& Menu() const { return m_MenuStatus; }
+    // A copy of the send-to menu model's entries.
+    MenuStatusList Menu() const { return m_MenuStatus.ToList(); }
     const CChatContentStorage& ChatContent() const { return m_ChatContent; }
     ChatRecoveryMgr* RecoveryMgr() const { return m_pRecoveryMgr.get(); }
     IArmClient* ArmClient() const { return m_pArmClient; }
@@ -645,7 +650,7 @@ private:
     std::uint32_t m_dwFeatures = 0;
     std::uint32_t m_dwNBRStatus = 1;
     std::uint32_t m_dwNBROption = 1;
-    MenuStatusList m_MenuStatus;
+    MenuModel m_MenuStatus;
     RunLoop* m_pTimerLoop = nullptr;  // the loop the tick timer runs on
     RunLoop::TimerId m_pTimer = 0;
     ChatUIHandle m_hChatUI = nullptr;

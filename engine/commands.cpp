@@ -101,7 +101,7 @@ int CChatClient::HandleUIMessage(int message, void* iParam, void*) {
             if (valid && m_MenuStatus[index].nGroupID == static_cast<int>(GROUP_EVERYONE))
                 SendTelemetryActionByID(kTelemetryEveryoneSelected);
             for (std::size_t i = 0; i < m_MenuStatus.size(); ++i)
-                m_MenuStatus[i].bSelected = static_cast<int>(i) == index;
+                m_MenuStatus.SetSelected(i, static_cast<int>(i) == index);
             return 0;
         }
         case msg_ShowAttendeeList:

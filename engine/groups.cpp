@@ -108,9 +108,9 @@ void CChatClient::AddGroup(const _tagChatGroupInfo* info, int bAddToMenu) {
         }
         // The index is compared as it is: adding 1 to it would wrap at the top of the range.
         if (info->dwIndex < m_MenuStatus.size()) {
-            m_MenuStatus.insert(m_MenuStatus.begin() + info->dwIndex, entry);
+            m_MenuStatus.Insert(info->dwIndex, entry);
         } else {
-            m_MenuStatus.push_back(entry);
+            m_MenuStatus.PushBack(entry);
         }
     }
 
@@ -120,7 +120,7 @@ void CChatClient::AddGroup(const _tagChatGroupInfo* info, int bAddToMenu) {
     values.dwGroupId = info->dwGroupId;
     values.lpszGroupName = info->cszGroupName;
     AddGroup(values);
-    NotifyUI(msg_RebuildMenu, &m_MenuStatus);
+    AnnounceRebuiltMenu();
 }
 
 void CChatClient::SetMeetingType(std::int32_t meetingType) {

@@ -24,30 +24,10 @@ const char* TextOrEmpty(const char* text) {
     return text ? text : "";
 }
 
-// Titles order case-insensitively; a new title equal to an existing one goes above it.
-bool TitleBelow(const MenuStatus& entry, const char* name) {
-    return strcasecmp(entry.strTitle.c_str(), name) < 0;
-}
-
-// Index of the first entry from `from` on that is not in the run of entries matching
-// `inRun` whose titles sort below name; the menu's size when the run reaches the end.
-template <typename InRun>
-int EndOfSortedRun(const MenuStatusList& menu, int from, const char* name, InRun inRun) {
-    const int count = static_cast<int>(menu.size());
-    int i = std::max(from, 0);
-    while (i < count && inRun(menu[i]) && TitleBelow(menu[i], name))
-        ++i;
-    return std::min(i, count);
-}
-
 }  // namespace
 
 int CChatClient::GetIndexOfMenuByGroup(std::int32_t groupId) const {
-    for (std::size_t i = 0; i < m_MenuStatus.size(); ++i) {
-        const MenuStatus& entry = m_MenuStatus[i];
-        if (entry.nGroupID == groupId && entry.dwNodeID == 0) return static_cast<int>(i);
-    }
-    return -1;
+    return m_MenuStatus.IndexOfGroup(groupId);
 }
 
 const MenuStatus* CChatClient::GetMenuByGroupID(std::int32_t groupId) const {
@@ -56,12 +36,7 @@ const MenuStatus* CChatClient::GetMenuByGroupID(std::int32_t groupId) const {
 }
 
 int CChatClient::GetIndexOfMenuByNodeID(std::uint32_t nodeId) const {
-    if (nodeId == 0) return -1;  // separators carry node 0 too
-    for (std::size_t i = 0; i < m_MenuStatus.size(); ++i) {
-        const MenuStatus& entry = m_MenuStatus[i];
-        if (entry.nGroupID == -1 && entry.dwNodeID == nodeId) return static_cast<int>(i);
-    }
-    return -1;
+    return m_MenuStatus.IndexOfNode(nodeId);
 }
 
 void CChatClient::SelectMenuItemByIndex(int index) {
@@ -80,17 +55,16 @@ bool CChatClient::MarkMenuItemSelected(int& index) {
     if (m_bEveryoneOnly) index = GetIndexOfMenuByGroup(GROUP_EVERYONE);
     if (index < 0 || index >= static_cast<int>(m_MenuStatus.size())) return false;
     for (std::size_t i = 0; i < m_MenuStatus.size(); ++i)
-        m_MenuStatus[i].bSelected = static_cast<int>(i) == index;
+        m_MenuStatus.SetSelected(i, static_cast<int>(i) == index);
     return true;
 }
 
 void CChatClient::SetGroupMenuEnable(std::int32_t groupId, bool bEnable) {
     const int index = GetIndexOfMenuByGroup(groupId);
     if (index == -1 || m_MenuStatus[index].bEnabled == bEnable) return;
-    m_MenuStatus[index].bEnabled = bEnable;
+    m_MenuStatus.SetEnabled(index, bEnable);
     MacInfoTrace2(kChatTag, "SetGroupMenuEnable inGroupID:%d, bEnable:%d.", groupId, bEnable);
-    NotifyUI(msg_UpdateMenuItem, &m_MenuStatus[index],
-             reinterpret_cast<void*>(static_cast<std::intptr_t>(index)));
+    AnnounceUpdatedEntry(index);
 }
 
 void CChatClient::InsertExternalInternalChatUserName(const char* name, std::uint32_t nodeId,
@@ -121,9 +95,7 @@ void CChatClient::InsertChatUserName(const char* name, std::uint32_t nodeId, int
         MacInfoTrace2(kChatTag, "CChatClient::InsertChatUserName : %s all ready in list", text);
         return;
     }
-    const bool selectedWasDisabled =
-        std::any_of(m_MenuStatus.begin(), m_MenuStatus.end(),
-                    [](const MenuStatus& entry) { return entry.bSelected && !entry.bEnabled; });
+    const bool selectedWasDisabled = m_MenuStatus.HasSelectedDisabledEntry();
 
     MenuStatus entry;
     entry.strTitle = title;
@@ -139,10 +111,10 @@ void CChatClient::InsertChatUserName(const char* name, std::uint32_t nodeId, int
         MacInfoTrace2(kChatTag, "CChatClient::InsertChatUserName : bPanelist");
         entry.bPanelist = true;
         const int panelists = GetIndexOfMenuByGroup(GROUP_PANELISTS);
-        const int position = panelists == -1
-                                 ? kAppend
-                                 : EndOfSortedRun(m_MenuStatus, panelists + 1, text,
-                                                  [](const MenuStatus& e) { return e.bPanelist; });
+        const int position =
+            panelists == -1
+                ? kAppend
+                : m_MenuStatus.EndOfSortedRun(panelists + 1, text, MenuModel::Section::kPanelist);
         AnnounceInsertedUser(entry, position, bSelect, selectedWasDisabled);
     }
 
@@ -165,19 +137,21 @@ void CChatClient::AnnounceInsertedUser(const MenuStatus& entry, int position, in
 int CChatClient::AttendeeInsertPosition(const char* name) {
     // Outside QM rules attendees follow "All Attendees" up to the next non-attendee entry;
     // under them they join the participant entries wherever those stand.
-    const int start = m_bQMMode ? -1 : GetIndexOfMenuByGroup(GROUP_ATTENDEES);
-    if (!m_bQMMode && start == -1) return kAppend;
+    if (!m_bQMMode) {
+        const int start = GetIndexOfMenuByGroup(GROUP_ATTENDEES);
+        if (start == -1) return kAppend;
+        const int end = m_MenuStatus.EndOfSortedRun(start + 1, name, MenuModel::Section::kPlain);
+        return end == static_cast<int>(m_MenuStatus.size()) ? kAppend : end;
+    }
     bool passedParticipant = false;
-    for (int i = start + 1; i < static_cast<int>(m_MenuStatus.size()); ++i) {
+    for (int i = 0; i < static_cast<int>(m_MenuStatus.size()); ++i) {
         const MenuStatus& entry = m_MenuStatus[i];
         if (entry.IsPlainParticipantEntry()) {
-            if (!TitleBelow(entry, name)) return i;
+            if (!MenuModel::TitleBelow(entry, name)) return i;
             passedParticipant = true;
-        } else if (!m_bQMMode) {
-            return i;
         }
     }
-    if (m_bQMMode && !passedParticipant && !m_MenuStatus.empty() && !m_MenuStatus.back().bSeparator)
+    if (!passedParticipant && !m_MenuStatus.empty() && !m_MenuStatus.back().bSeparator)
         InsertMenuEntry(SeparatorEntry(), kAppend);
     return kAppend;
 }
@@ -194,9 +168,7 @@ int CChatClient::PanelAttendeeInsertPosition(const char* name) {
         InsertMenuEntry(SeparatorEntry(), lastTwo);
         MacInfoTrace2(kChatTag, "CChatClient::InsertChatUserName : add sep");
     }
-    const int position = EndOfSortedRun(m_MenuStatus, group + 2, name, [](const MenuStatus& e) {
-        return e.IsPlainParticipantEntry();
-    });
+    const int position = m_MenuStatus.EndOfSortedRun(group + 2, name, MenuModel::Section::kPlain);
     MacInfoTrace2(kChatTag, "CChatClient::InsertChatUserName at i=%d, index=%d", position, group);
     return position;
 }
@@ -436,15 +408,17 @@ int CChatClient::InsertMenuEntry(const MenuStatus& entry, int position) {
     const int count = static_cast<int>(m_MenuStatus.size());
     if (position > count) position = kAppend;
     const int index = position < 0 ? count : position;
-    m_MenuStatus.insert(m_MenuStatus.begin() + index, entry);
+    m_MenuStatus.Insert(index, entry);
+    // The window gets its own copy: the model's entries are not the window's to touch.
+    MenuStatus copy = entry;
     std::int32_t payload = position < 0 ? kAppend : index;
-    NotifyUI(msg_InsertMenuItem, &m_MenuStatus[index], &payload);
+    NotifyUI(msg_InsertMenuItem, &copy, &payload);
     return index;
 }
 
 void CChatClient::EraseMenuEntry(int index) {
     if (index < 0 || index >= static_cast<int>(m_MenuStatus.size())) return;
-    m_MenuStatus.erase(m_MenuStatus.begin() + index);
+    m_MenuStatus.Erase(index);
     std::int32_t payload = index;
     NotifyUI(msg_RemoveMenuItem, &payload);
 }
@@ -455,7 +429,7 @@ void CChatClient::EraseSelectedAware(int index) {
         EraseMenuEntry(index);
         return;
     }
-    m_MenuStatus.erase(m_MenuStatus.begin() + index);
+    m_MenuStatus.Erase(index);
     std::int32_t payload = index;
     NotifyUI(msg_SelectedUserLeft, &payload);
     std::int32_t allow = 0;
@@ -480,18 +454,21 @@ void CChatClient::SelectFallbackMenuItem() {
 }
 
 int CChatClient::IndexOfParticipantEntry(std::uint32_t nodeId, bool bRecent) const {
-    for (std::size_t i = 0; i < m_MenuStatus.size(); ++i) {
-        const MenuStatus& entry = m_MenuStatus[i];
-        if (entry.nGroupID == -1 && entry.dwNodeID == nodeId && entry.dwNodeID != 0 &&
-            entry.bRecent == bRecent)
-            return static_cast<int>(i);
-    }
-    return -1;
+    return m_MenuStatus.IndexOfParticipant(nodeId, bRecent);
 }
 
 bool CChatClient::HasParticipantEntry() const {
-    return std::any_of(m_MenuStatus.begin(), m_MenuStatus.end(),
-                       [](const MenuStatus& entry) { return entry.dwNodeID != 0; });
+    return m_MenuStatus.HasParticipantEntry();
+}
+
+void CChatClient::AnnounceUpdatedEntry(int index) {
+    MenuStatus copy = m_MenuStatus[index];
+    NotifyUI(msg_UpdateMenuItem, &copy, reinterpret_cast<void*>(static_cast<std::intptr_t>(index)));
+}
+
+void CChatClient::AnnounceRebuiltMenu() {
+    MenuStatusList entries = m_MenuStatus.ToList();
+    NotifyUI(msg_RebuildMenu, &entries);
 }
 
 bool CChatClient::OnlyChatPrivately() const {

@@ -4,6 +4,7 @@
 
 #include <string>
 
+#include "engine/menu_model.h"
 #include "engine/menu_status.h"
 
 // A separator line.
@@ -22,7 +23,7 @@ inline MenuStatus GroupEntry(const std::string& title, std::int32_t groupId) {
 }
 
 // The first entry that can be chosen: enabled and not a separator; -1 when none.
-inline int FirstSelectableIndex(const MenuStatusList& menu) {
+inline int FirstSelectableIndex(const MenuModel& menu) {
     for (std::size_t i = 0; i < menu.size(); ++i) {
         if (menu[i].bEnabled && !menu[i].bSeparator) return static_cast<int>(i);
     }
@@ -31,7 +32,7 @@ inline int FirstSelectableIndex(const MenuStatusList& menu) {
 
 // The first entry that denotes the same audience as like (group id, panelist mark and node
 // id) and can be chosen; -1 when none.
-inline int IndexOfEqualEntry(const MenuStatusList& menu, const MenuStatus& like) {
+inline int IndexOfEqualEntry(const MenuModel& menu, const MenuStatus& like) {
     for (std::size_t i = 0; i < menu.size(); ++i) {
         const MenuStatus& e = menu[i];
         if (e.bEnabled && !e.bSeparator && e.nGroupID == like.nGroupID &&

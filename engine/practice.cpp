@@ -40,8 +40,8 @@ void CChatClient::RebuildAttendeeMenuInPractice(std::int8_t bFlag) {
         return;
     }
     if (!m_bChatAttendees) {
-        m_MenuStatus.clear();
-        NotifyUI(msg_RebuildMenu, &m_MenuStatus);
+        m_MenuStatus.Clear();
+        AnnounceRebuiltMenu();
         NotifyUI(msg_ClearInput);
         NotifyUI(msg_DisableUserList);
         AllowUserInput(false);
@@ -51,7 +51,7 @@ void CChatClient::RebuildAttendeeMenuInPractice(std::int8_t bFlag) {
     for (int i = 0; i < static_cast<int>(m_MenuStatus.size());) {
         if (m_MenuStatus[i].IsGroupEntry() &&
             m_MenuStatus[i].nGroupID == static_cast<std::int32_t>(GROUP_ATTENDEES)) {
-            m_MenuStatus[i].bSelected = true;
+            m_MenuStatus.SetSelected(i, true);
             std::int32_t index = i;
             NotifyUI(msg_SelectMenuItem, &index);
             kept = true;
@@ -63,9 +63,9 @@ void CChatClient::RebuildAttendeeMenuInPractice(std::int8_t bFlag) {
     if (!kept) {
         MenuStatus entry = GroupEntry(GetLocalizedString("All Attendees"), GROUP_ATTENDEES);
         entry.bSelected = true;
-        m_MenuStatus.push_back(entry);
+        m_MenuStatus.PushBack(entry);
     }
-    NotifyUI(msg_RebuildMenu, &m_MenuStatus);
+    AnnounceRebuiltMenu();
 }
 
 void CChatClient::RebuildPanelistMenuInPractice() {
@@ -78,10 +78,10 @@ void CChatClient::RebuildPanelistMenuInPractice() {
     };
     if (!m_bPractice) {
         if (hostOrPresenter) {
-            m_MenuStatus.push_back(SeparatorEntry());
-            m_MenuStatus.push_back(
+            m_MenuStatus.PushBack(SeparatorEntry());
+            m_MenuStatus.PushBack(
                 GroupEntry(GetLocalizedString("Select an Attendee..."), GROUP_SELECT_ATTENDEE));
-            NotifyUI(msg_RebuildMenu, &m_MenuStatus);
+            AnnounceRebuiltMenu();
             reselect();
         } else {
             OnAttendeePrivilegeChange();
@@ -89,13 +89,13 @@ void CChatClient::RebuildPanelistMenuInPractice() {
         }
         return;
     }
-    m_MenuStatus.clear();
+    m_MenuStatus.Clear();
     if (hostOrPresenter) {
         AppendGroupEntries(kGroupsOutOfPractice);
     } else {
         AppendAttendeeAudiences(true);
     }
-    NotifyUI(msg_RebuildMenu, &m_MenuStatus);
+    AnnounceRebuiltMenu();
     if (m_bChatPanelists) {
         for (std::uint32_t i = 0; i < m_UserList.GetCount(); ++i) {
             const UserItem* user = m_UserList.GetUserItemByIndex(i);

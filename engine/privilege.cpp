@@ -225,10 +225,10 @@ void CChatClient::OnAttendeePrivilegeChange() {
     CFuncTrace trace("CChatClient::OnAttendeePrivilegeChange( )");
     const std::optional<MenuStatus> selected = SelectedMenuEntry();
     MenuStatusList recents;
-    for (const MenuStatus& entry : m_MenuStatus) {
-        if (entry.bRecent) recents.push_back(entry);
+    for (std::size_t i = 0; i < m_MenuStatus.size(); ++i) {
+        if (m_MenuStatus[i].bRecent) recents.push_back(m_MenuStatus[i]);
     }
-    m_MenuStatus.clear();
+    m_MenuStatus.Clear();
     if (m_bPractice) {
         if (m_dwMyRosters & ROLE_PANELIST) {
             RebuildPanelistMenuInPractice();
@@ -239,11 +239,11 @@ void CChatClient::OnAttendeePrivilegeChange() {
     }
     AppendAttendeeAudiences(false);
     if (m_bChatAttendees && (m_dwMyRosters & ROLE_PANELIST)) {
-        m_MenuStatus.push_back(SeparatorEntry());
-        m_MenuStatus.push_back(
+        m_MenuStatus.PushBack(SeparatorEntry());
+        m_MenuStatus.PushBack(
             GroupEntry(GetLocalizedString("Select an Attendee..."), GROUP_SELECT_ATTENDEE));
     }
-    NotifyUI(msg_RebuildMenu, &m_MenuStatus);
+    AnnounceRebuiltMenu();
 
     if ((m_dwMyRosters & ROLE_PANELIST) && m_bChatAttendees) {
         // Each recent entry goes to the top of its section, so the oldest goes in first and
@@ -266,31 +266,31 @@ void CChatClient::AppendAttendeeAudiences(bool bInPractice) {
     const bool host = m_bChatHost && !beforeHost;
     const bool presenter = m_bChatPresenter && !beforeHost;
     const bool panelists = m_bChatPanelists && PanelistsPresent();
-    if (host) m_MenuStatus.push_back(GroupEntry(GetLocalizedString("Host"), GROUP_HOST));
+    if (host) m_MenuStatus.PushBack(GroupEntry(GetLocalizedString("Host"), GROUP_HOST));
     if (presenter)
-        m_MenuStatus.push_back(GroupEntry(GetLocalizedString("Presenter"), GROUP_PRESENTER));
+        m_MenuStatus.PushBack(GroupEntry(GetLocalizedString("Presenter"), GROUP_PRESENTER));
     if (host && presenter)
-        m_MenuStatus.push_back(
+        m_MenuStatus.PushBack(
             GroupEntry(GetLocalizedString("Host & Presenter"), GROUP_HOST_PRESENTER));
     if ((host || presenter) && (m_bChatAttendees || panelists))
-        m_MenuStatus.push_back(SeparatorEntry());
+        m_MenuStatus.PushBack(SeparatorEntry());
     if (m_bChatAttendees)
-        m_MenuStatus.push_back(GroupEntry(GetLocalizedString("All Attendees"), GROUP_ATTENDEES));
+        m_MenuStatus.PushBack(GroupEntry(GetLocalizedString("All Attendees"), GROUP_ATTENDEES));
     if (panelists)
-        m_MenuStatus.push_back(GroupEntry(GetLocalizedString("All Panelists"), GROUP_PANELISTS));
+        m_MenuStatus.PushBack(GroupEntry(GetLocalizedString("All Panelists"), GROUP_PANELISTS));
     // In practice everyone is reachable without the panelists' privilege when no panelist
     // entry stands in the menu.
     const bool panelistsForEveryone =
         m_bChatPanelists || (bInPractice && GetIndexOfMenuByGroup(GROUP_PANELISTS) == -1);
     if (m_bChatAttendees && host && presenter && panelistsForEveryone) {
-        m_MenuStatus.push_back(SeparatorEntry());
-        m_MenuStatus.push_back(GroupEntry(GetLocalizedString("All Participants"), GROUP_EVERYONE));
+        m_MenuStatus.PushBack(SeparatorEntry());
+        m_MenuStatus.PushBack(GroupEntry(GetLocalizedString("All Participants"), GROUP_EVERYONE));
     }
 }
 
 std::optional<MenuStatus> CChatClient::SelectedMenuEntry() const {
-    for (const MenuStatus& entry : m_MenuStatus) {
-        if (entry.bSelected) return entry;
+    for (std::size_t i = 0; i < m_MenuStatus.size(); ++i) {
+        if (m_MenuStatus[i].bSelected) return m_MenuStatus[i];
     }
     return std::nullopt;
 }

@@ -158,7 +158,7 @@ void CChatClient::OnAttendeePrivilegeChangeInQM(std::uint32_t oldPrivilege, int 
 void CChatClient::EraseEntryAndSeparator(int index) {
     if (index < 0 || index >= static_cast<int>(m_MenuStatus.size())) return;
     if (m_MenuStatus[index].bSelected) {
-        m_MenuStatus.erase(m_MenuStatus.begin() + index);
+        m_MenuStatus.Erase(index);
         std::int32_t payload = index;
         NotifyUI(msg_SelectedUserLeft, &payload);
     } else {

@@ -134,9 +134,9 @@ void CChatClient::OnRosterChange(int bSelectEveryone) {
     }
     if (privileged) {
         const std::optional<MenuStatus> selected = SelectedMenuEntry();
-        m_MenuStatus.clear();
+        m_MenuStatus.Clear();
         AppendGroupEntries(0);
-        NotifyUI(msg_RebuildMenu, &m_MenuStatus);
+        AnnounceRebuiltMenu();
         if (!bSelectEveryone && selected && !selected->bSeparator) {
             const int again = IndexOfEqualEntry(m_MenuStatus, *selected);
             if (again != -1) SelectMenuItemByIndex(again);
@@ -150,9 +150,9 @@ void CChatClient::AppendGroupEntries(std::uint32_t dropLast) {
     for (std::int32_t i = 0; i < count; ++i) {
         const CUsersGroup* group = m_GroupList.GetGroupByIndex(i);
         if (group->GetGroupType() == 2) {
-            m_MenuStatus.push_back(SeparatorEntry());
+            m_MenuStatus.PushBack(SeparatorEntry());
         } else if (group->GetGrpName()) {
-            m_MenuStatus.push_back(
+            m_MenuStatus.PushBack(
                 GroupEntry(group->GetGrpName(), static_cast<std::int32_t>(group->GetGroupId())));
         }
     }
@@ -188,10 +188,9 @@ void CChatClient::CheckMenuStateForTPSupport(int) {
             becomes = GROUP_HOST;
         }
         if (becomes != -1) {
-            m_MenuStatus[combined].nGroupID = becomes;
-            m_MenuStatus[combined].bEnabled = true;
-            NotifyUI(msg_UpdateMenuItem, &m_MenuStatus[combined],
-                     reinterpret_cast<void*>(static_cast<std::intptr_t>(combined)));
+            m_MenuStatus.SetGroupID(combined, becomes);
+            m_MenuStatus.SetEnabled(combined, true);
+            AnnounceUpdatedEntry(combined);
         }
     }
     // The role held inside the roster keeps its holder's name in the title.

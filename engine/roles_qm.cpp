@@ -131,9 +131,9 @@ void CChatClient::SelectAudienceAfterRoleChange(std::uint32_t audience, bool bHo
 
 void CChatClient::RetitleRoleEntry(int index, const std::string& name, std::uint32_t nodeId,
                                    const char* role) {
-    std::string& title = m_MenuStatus[index].strTitle;
-    title = name + " (" + role +
-            GetUserExternalInternalString(GetUserExternalInternalTag(nodeId), 1) + ")";
+    std::string title = name + " (" + role +
+                        GetUserExternalInternalString(GetUserExternalInternalTag(nodeId), 1) + ")";
+    m_MenuStatus.SetTitle(index, title);
     NotifyUI(msg_RenameMenuItem, &title,
              reinterpret_cast<void*>(static_cast<std::intptr_t>(index)));
 }
