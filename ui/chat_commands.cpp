@@ -275,7 +275,10 @@ void MyChatController::InsertMenuItem(const MenuStatus* entry, const std::int32_
         item = chatItem;
     }
     const QSignalBlocker block(m_userlist);
+    const bool noneSelected = m_userlist->currentIndex() < 0;
     m_userlist->menu()->insertRow(at, item);
+    // A list box selects the first row put into it by itself; the engine selects by command.
+    if (noneSelected) m_userlist->setCurrentIndex(-1);
     resetTooltip();
 }
 
@@ -368,7 +371,9 @@ void MyChatController::RebuildMenu(const MenuStatusList* entries) {
         RemoveRow(0);
     if (!entries) return;
     const QString attendeeTitle = Localized("Select an Attendee...");
+    int selected = -1;
     for (const MenuStatus& entry : *entries) {
+        if (entry.bSelected && selected < 0) selected = m_userlist->numberOfItems();
         if (entry.bSeparator && entry.strTitle.empty()) {
             m_userlist->menu()->appendRow(ChatMenuItem::NewSeparator());
             continue;
@@ -391,6 +396,9 @@ void MyChatController::RebuildMenu(const MenuStatusList* entries) {
         if (item->text() == attendeeTitle) item->setAction(ChatItemAction::OpenAttendeeDialog);
         m_userlist->menu()->appendRow(item);
     }
+    // The new list shows the engine's selected entry, or nothing when it has none, rather
+    // than the first row a list box selects by itself.
+    m_userlist->setCurrentIndex(selected);
     m_userlist->viewDidEndLiveResize2();
 }
 

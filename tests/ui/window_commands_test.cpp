@@ -41,6 +41,26 @@ TEST_F(WindowTest, RebuildKeepsTitledSeparatorEntriesAsItemsAndDisabledEntriesGr
     EXPECT_TRUE(engine.events.empty());
 }
 
+TEST_F(WindowTest, ThePopupShowsTheEnginesSelectionOrNothing) {
+    Rebuild({Entry("Everyone", 15), Entry("Ann"), Entry("Bob")});
+    EXPECT_EQ(Selected(), -1);
+    EXPECT_TRUE(window->userlist()->currentText().isEmpty());
+    MenuStatus bob = Entry("Bob");
+    bob.bSelected = true;
+    Rebuild({Entry("Everyone", 15), SeparatorEntry(), Entry("Ann"), bob});
+    EXPECT_EQ(Selected(), 3);
+    Rebuild({});
+    MenuStatus ann = Entry("Ann");
+    Command(msg_InsertMenuItem, &ann, nullptr);
+    Command(msg_InsertMenuItem, &bob, nullptr);
+    EXPECT_EQ(Selected(), -1);
+    EXPECT_TRUE(engine.events.empty());
+    // The engine's own choice is shown and reported, the first row included.
+    Command(msg_SelectMenuItem, 0);
+    EXPECT_EQ(Selected(), 0);
+    EXPECT_EQ(engine.events, (std::vector<RecordedEvent>{{msg_SelectionChanged, 0}}));
+}
+
 TEST_F(WindowTest, SelectReportsNewIndexesOnly) {
     Rebuild({Entry("Everyone", 15), Entry("Ann"), Entry("Bob")});
     Command(msg_SelectMenuItem, 2);
