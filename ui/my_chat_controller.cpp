@@ -33,12 +33,22 @@ QFont SystemFont(qreal size) {
     return font;
 }
 
-// A text ending in a paragraph end: a trailing CR or LF (CR LF counts once) becomes the end
-// of the paragraph, every other CR, LF or CR LF a paragraph break inside it.
+// Line ends become paragraph ends: every LF, every CR, and CRs followed by an LF once (CR CR LF
+// is one line end converted twice on its way, which users never meant as a blank line).
 QString AsParagraphs(const QString& text) {
-    QString result = text;
-    result.replace("\r\n", "\n");
-    result.replace('\r', '\n');
+    QString result;
+    result.reserve(text.size());
+    for (qsizetype i = 0; i < text.size(); ++i) {
+        if (text[i] != u'\r') {
+            result += text[i];
+            continue;
+        }
+        qsizetype next = i + 1;
+        while (next < text.size() && text[next] == u'\r')
+            ++next;
+        if (next < text.size() && text[next] == u'\n') i = next;
+        result += u'\n';
+    }
     return result;
 }
 

@@ -59,6 +59,25 @@ TEST_F(TranscriptTest, EveryLineEndsOneParagraph) {
     EXPECT_EQ(Document()->blockCount(), 5);  // four paragraphs and the empty end
 }
 
+TEST_F(TranscriptTest, LineEndsConvertedTwiceMakeNoBlankParagraph) {
+    const struct {
+        const char* text;
+        const char* shown;
+    } cases[] = {
+        {"x\r\r\n", "x\n"},
+        {"x\r\r\r\ny", "x\ny\n"},
+        {"see www.a.com\r\r\n", "see www.a.com\n"},
+        // Line ends of their own still make blank lines.
+        {"x\r\ry", "x\n\ny\n"},
+        {"x\n\ny\r\n\r\n", "x\n\ny\n\n"},
+    };
+    for (const auto& c : cases) {
+        Command(msg_ClearChat);
+        Show(c.text);
+        EXPECT_EQ(Document()->toPlainText().toStdString(), c.shown) << c.text;
+    }
+}
+
 TEST_F(TranscriptTest, TitlesAndBodiesHaveTheirStylesAndPeerMarkupIsText) {
     Show("from Ann to Everyone", true);
     Show("<b>bold?</b> &amp;");
