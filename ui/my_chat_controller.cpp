@@ -263,6 +263,9 @@ void MyChatController::onRecevie(const QString& message, bool isTitle) {
     if (!m_textView) return;
     // The transcript follows new lines only while the user looks at its end.
     const bool follow = isScrollAtBottom();
+    // One edit for the whole line: the document lays out and repaints once, not per run.
+    QTextCursor edit(m_textView->document());
+    edit.beginEditBlock();
     if (isTitle) {
         onReceiveMsg(text, true, false);
     } else {
@@ -270,6 +273,7 @@ void MyChatController::onRecevie(const QString& message, bool isTitle) {
         for (const CChatUnit& unit : CChatUnit::GetChatUnitListFromString(utf8.constData()))
             onReceiveMsg(QString::fromUtf8(unit.GetContent()), false, unit.IsText() == 0);
     }
+    edit.endEditBlock();
     if (follow) scrollToBottom();
 }
 
