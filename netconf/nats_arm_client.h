@@ -147,6 +147,8 @@ private:
     // message ever published there (payload claim). 0 when the server cannot answer.
     std::uint64_t GrantNumber(const std::string& subject, const std::string& claim,
                               std::string* holder);
+    // The data and stream sequence of the first message ever stored on subject.
+    natsStatus FirstMessage(const std::string& subject, std::string* data, std::uint64_t* sequence);
     // Publishes to the stream, retrying the same message id while the server is away.
     // The stored sequence, or 0 with *reason set.
     std::uint64_t PublishStored(natsMsg* msg, const std::string& msgId, std::string* reason);

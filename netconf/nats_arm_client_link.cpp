@@ -271,19 +271,41 @@ std::uint64_t NatsArmClient::GrantNumber(const std::string& subject, const std::
             return ack->Sequence;
         }
         if (error == JSStreamWrongLastSequenceErr) {
-            // Granted before: the first message there holds the number.
-            natsMsg* rawMsg = nullptr;
-            status = js_GetLastMsg(&rawMsg, m_js.get(), m_subjects.CacheStream().c_str(),
-                                   subject.c_str(), nullptr, &error);
-            NatsPtr<natsMsg> first(rawMsg);
-            if (status == NATS_OK) {
-                holder->assign(natsMsg_GetData(rawMsg), natsMsg_GetDataLength(rawMsg));
-                return natsMsg_GetSequence(rawMsg);
-            }
+            // Granted before: the first message there holds the number, whatever came later.
+            std::uint64_t sequence = 0;
+            status = FirstMessage(subject, holder, &sequence);
+            if (status == NATS_OK) return sequence;
         }
         if (!IsPassing(status, error) || std::chrono::steady_clock::now() >= giveUp) return 0;
         std::this_thread::sleep_for(std::chrono::milliseconds(kReconnectWaitMs));
     }
+}
+
+natsStatus NatsArmClient::FirstMessage(const std::string& subject, std::string* data,
+                                       std::uint64_t* sequence) {
+    jsSubOptions options;
+    jsSubOptions_Init(&options);
+    const std::string stream = m_subjects.CacheStream();
+    options.Stream = stream.c_str();
+    options.Ordered = true;
+    options.Config.DeliverPolicy = js_DeliverAll;
+    jsErrCode error = static_cast<jsErrCode>(0);
+    natsSubscription* raw = nullptr;
+    natsStatus status =
+        js_SubscribeSync(&raw, m_js.get(), subject.c_str(), nullptr, &options, &error);
+    NatsPtr<natsSubscription> sub(raw);
+    natsMsg* rawMsg = nullptr;
+    if (status == NATS_OK) status = natsSubscription_NextMsg(&rawMsg, raw, kRequestTimeoutMs);
+    NatsPtr<natsMsg> msg(rawMsg);
+    jsMsgMetaData* rawMeta = nullptr;
+    if (status == NATS_OK) status = natsMsg_GetMetaData(&rawMeta, rawMsg);
+    NatsPtr<jsMsgMetaData> meta(rawMeta);
+    if (status == NATS_OK) {
+        data->assign(natsMsg_GetData(rawMsg), natsMsg_GetDataLength(rawMsg));
+        *sequence = meta->Sequence.Stream;
+    }
+    if (sub) natsSubscription_Unsubscribe(raw);
+    return status;
 }
 
 std::uint64_t NatsArmClient::PublishStored(natsMsg* msg, const std::string& msgId,

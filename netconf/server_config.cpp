@@ -21,15 +21,17 @@ std::string List(const std::vector<std::string>& items, const std::string& inden
     return out + indent + "]";
 }
 
-// Everything a participant's connection publishes to: its own subjects, the conference's
-// numbers, and the stream requests its caches and mailbox need.
+// Everything a participant's connection publishes to: its own subjects, claims on named
+// handles and session values, the claim on its own user id (nobody else's), and the stream
+// requests its caches and mailbox need.
 std::vector<std::string> PublishAllowed(const ConferenceSubjects& subjects, const std::string& user,
                                         std::uint16_t conferenceId) {
     const std::string prefix = "qc." + std::to_string(conferenceId);
     std::vector<std::string> allowed = {
         prefix + ".c.*." + user, prefix + ".p.*." + user,
-        subjects.Presence(user), subjects.AllNumbers(),
-        "$JS.API.INFO",          "$JS.API.STREAM.MSG.GET." + subjects.CacheStream(),
+        subjects.Presence(user), prefix + ".id.n.*",
+        prefix + ".id.s.*",      subjects.UserIdClaim(ConferenceUserId(user)),
+        "$JS.API.INFO",
     };
     for (const std::string& stream : {subjects.CacheStream(), subjects.MailboxStream(user)}) {
         allowed.push_back("$JS.API.STREAM.INFO." + stream);

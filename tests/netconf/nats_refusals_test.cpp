@@ -1,6 +1,7 @@
 // What the server enforces for a conference: a raw client with credentials of its own cannot
-// speak for another participant or listen to another's private data, and a participant whose
-// process dies leaves everybody's roster within ten seconds.
+// speak for another participant, listen to another's private data, take another's user id or
+// change a granted handle, and a participant whose process dies leaves everybody's roster
+// within ten seconds.
 #include <nats/nats.h>
 #include <signal.h>
 #include <spawn.h>
@@ -152,6 +153,24 @@ TEST_F(NatsRefusalsTest, AHostileClientCanNeitherSpeakForOthersNorListenToThem) 
     EXPECT_EQ(a.userId, lines[0].userId);
     EXPECT_EQ(line, lines[0].data);
     EXPECT_TRUE(Rosters(b).empty());
+}
+
+TEST_F(NatsRefusalsTest, AHostileClientCanNeitherTakeAnotherUsersIdNorChangeAGrantedHandle) {
+    ContractParticipant& a = Attached(11);
+    const std::uint32_t cache = Handle(a, "1_chat_cache_15");
+    ASSERT_NE(0u, cache);
+
+    RawClient mallory(Server(), "mallory");
+    ASSERT_TRUE(mallory.Connected());
+    const ConferenceSubjects subjects(kNatsConference);
+    // p13's user id claimed first under mallory's name, and the handle's name claimed again.
+    mallory.Publish(subjects.UserIdClaim(ConferenceUserId("p13")), "mallory");
+    mallory.Publish(subjects.NameNumber("1_chat_cache_15"), "name");
+    EXPECT_EQ(1, mallory.WaitForRefusals(1));
+
+    ContractParticipant& c = Attached(13);
+    EXPECT_EQ(ConferenceUserId("p13"), c.userId);
+    EXPECT_EQ(cache, Handle(c, "1_chat_cache_15"));
 }
 
 TEST_F(NatsRefusalsTest, AParticipantWhoseProcessDiesLeavesTheRosterWithinTenSeconds) {
