@@ -84,6 +84,9 @@ bool DesktopParticipant::Connect(double seconds, std::string* error) {
 
 void DesktopParticipant::Start(bool bQM) {
     m_handle = ChNewInstance();
+    // Roles known before the start go out with the first enrolment; set later they would
+    // make the component enroll again, and everybody rebuild their send-to lists.
+    if (m_options.roles != 0) ChSetRosters(m_handle, m_options.roles);
     _tagChatData data{};
     data.hParentView = m_view;
     data.pArmClient = m_service;
@@ -95,13 +98,20 @@ void DesktopParticipant::Start(bool bQM) {
     // The service is already connected: the component goes on from there.
     ChInitialize(m_handle, &data);
     if (bQM) ChSelectFeature(m_handle, FEATURE_QM_MODE, 0, 0, 0, 0, nullptr);
-    if (m_options.roles != 0) ChSetRosters(m_handle, m_options.roles);
     if (m_options.roles & ROLE_HOST) ChSetHost(m_handle, m_options.nodeId);
     if (m_options.roles & ROLE_PRESENTER) ChSetPresenter(m_handle, m_options.nodeId);
 }
 
 bool DesktopParticipant::WaitEnrolled(double seconds) {
     return RunUntil([this] { return In() && Engine().State() == kStateEnrolled; }, seconds);
+}
+
+bool DesktopParticipant::WaitStartedUp(double seconds) {
+    return RunUntil(
+        [this] {
+            return In() && Engine().State() == kStateEnrolled && Engine().PrivilegePending() == 0;
+        },
+        seconds);
 }
 
 bool DesktopParticipant::RunUntil(const std::function<bool()>& done, double seconds) {

@@ -33,6 +33,9 @@ public:
     void Start(bool bQM);
     // Waits until the component is enrolled in the conference; false after seconds.
     bool WaitEnrolled(double seconds);
+    // Waits until it is enrolled and has re-applied its privileges after the start (which
+    // resets the send-to choice to everyone); false after seconds.
+    bool WaitStartedUp(double seconds);
     // Runs the program's loop until done() holds or seconds passed; whether done() held.
     static bool RunUntil(const std::function<bool()>& done, double seconds);
     // Lets everything in flight arrive: the service's answers and deliveries, then the loop.

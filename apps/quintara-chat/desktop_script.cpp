@@ -19,6 +19,9 @@
 
 namespace {
 
+// The start-up takes its own time (about five seconds), whatever the script's wait.
+constexpr double kStartupSeconds = 20;
+
 std::uint32_t Number(const ScenarioArg& arg) {
     return *ParseScenarioNumber(arg.value);
 }
@@ -196,9 +199,10 @@ void DesktopScript::Execute(const ScenarioCommand& c) {
         const double seconds = 0.5 * Number(*args[0]);
         DesktopParticipant::RunUntil([] { return false; }, seconds);
     } else if (verb == "startup") {
-        // On a server the start-up is over once the component is enrolled.
-        if (!m_me.WaitEnrolled(m_me.Options().waitSeconds))
-            Fail(c, "timed out: me is not enrolled");
+        // On a server the start-up is over once the component is enrolled and its privileges
+        // were re-applied: a send-to choice made before then does not last.
+        if (!m_me.WaitStartedUp(kStartupSeconds))
+            Fail(c, "timed out: me has not finished starting up");
     } else {
         Fail(c, "unknown command " + verb);
     }
