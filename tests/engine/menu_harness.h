@@ -14,6 +14,8 @@
 
 #include "engine/chat_client.h"
 #include "pdu/roster_info_pdu.h"
+#include "platform/inproc_conference.h"
+#include "platform/virtual_run_loop.h"
 #include "tests/support/recording_window.h"
 
 namespace menutest {
@@ -94,6 +96,7 @@ struct Options {
     std::int32_t tagMode = 0;
     std::uint32_t features = 0;
     bool answerBack = false;  // the window reports selections back as a real one does
+    bool conference = false;  // attached through an in-process conference, caches and all
 };
 
 // Commands that name one menu position, by verb; others not described here keep their names.
@@ -141,8 +144,17 @@ public:
         data.lMeetingType = options.meetingType;
         data.bUseAttendeeSelector = options.selector ? 1 : 0;
         data.lExternalTagMode = options.tagMode;
+        if (options.conference) {
+            net = std::make_unique<Conference>();
+            data.pArmClient = net->conference.CreateClient(net->loop, kMyNode);
+            data.wConferenceID = net->conference.ConferenceId();
+        }
         engine.Initialize(data);
-        engine.ApeAttachConfirm(1, 0, kMyUser);
+        if (net) {
+            net->loop.RunUntilIdle();
+        } else {
+            engine.ApeAttachConfirm(1, 0, kMyUser);
+        }
         if (options.features) engine.SelectFeature(options.features, 0, 0, 0, 0, nullptr);
         window = RecordingWindow::Latest();
     }
@@ -183,6 +195,13 @@ public:
         return out;
     }
 
+    // The conference an engine started with the conference option is attached through.
+    struct Conference {
+        VirtualRunLoop loop;
+        ScopedCurrentRunLoop current{&loop};
+        InProcessConference conference;
+    };
+    std::unique_ptr<Conference> net;
     CChatClient engine;
     RecordingWindow* window = nullptr;
 };

@@ -3,9 +3,11 @@
 // commands the window saw.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <string>
 #include <vector>
 
+#include "engine/menu_model.h"
 #include "tests/engine/menu_harness.h"
 #include "tests/support/trace_capture.h"
 
@@ -528,4 +530,72 @@ TEST(WindowReentry, SelectionReportsFromInsideCommandsEndOnTheRightEntry) {
     EXPECT_EQ(q.Commands(), Strings({"select+input 3", "report 3", "left 3", "report -1", "input 0",
                                      "select+input 2", "report 2"}));
     EXPECT_EQ(q.Titles(), Strings({"Everyone", "---", "*bob"}));
+}
+
+// The model's indexed answers against a plain walk of its entries, through random insertions
+// (out of title order now and then, which must end the halving search), removals and changes.
+TEST(MenuModel, IndexedAnswersEqualAPlainWalk) {
+    MenuModel model;
+    MenuStatusList plain;
+    std::uint32_t state = 7;
+    const auto next = [&state](std::size_t below) {
+        state = state * 1103515245u + 12345u;
+        return static_cast<std::uint32_t>((state >> 8) % below);
+    };
+    const auto first = [&plain](auto wanted) {
+        const auto found = std::find_if(plain.begin(), plain.end(), wanted);
+        return found == plain.end() ? -1 : static_cast<int>(found - plain.begin());
+    };
+    for (int step = 0; step < 3000; ++step) {
+        const std::uint32_t op = plain.empty() ? 0 : next(10);
+        const std::size_t at = next(plain.size() + 1);
+        MenuStatus e;
+        e.dwNodeID = next(3) == 0 ? 0 : 1 + next(40);
+        e.nGroupID = e.dwNodeID == 0 ? static_cast<std::int32_t>(next(4)) - 1 : -1;
+        e.bSeparator = e.dwNodeID == 0 && e.nGroupID == -1;
+        e.bPanelist = e.dwNodeID != 0 && next(3) == 0;
+        e.bRecent = e.dwNodeID != 0 && next(4) == 0;
+        e.strTitle = std::string(1, static_cast<char>('a' + next(26)));
+        if (op < 4) {
+            const std::size_t to = next(8) == 0 ? at : first([&e](const MenuStatus& x) {
+                return !MenuModel::TitleBelow(x, e.strTitle.c_str());
+            });
+            model.Insert(std::min(to, plain.size()), e);
+            plain.insert(plain.begin() + std::min(to, plain.size()), e);
+        } else if (op < 8) {
+            model.Erase(at % plain.size());
+            plain.erase(plain.begin() + at % plain.size());
+        } else {
+            op == 8 ? model.SetSelected(at % plain.size(), e.bPanelist)
+                    : model.SetEnabled(at % plain.size(), e.bPanelist);
+            (op == 8 ? plain[at % plain.size()].bSelected : plain[at % plain.size()].bEnabled) =
+                e.bPanelist;
+        }
+        const std::uint32_t node = e.dwNodeID;
+        const std::int32_t group = e.nGroupID;
+        EXPECT_EQ(model.IndexOfNode(node), first([&](const MenuStatus& x) {
+                      return node != 0 && x.nGroupID == -1 && x.dwNodeID == node;
+                  }));
+        EXPECT_EQ(model.IndexOfParticipant(node, e.bRecent), first([&](const MenuStatus& x) {
+                      return node != 0 && x.nGroupID == -1 && x.dwNodeID == node &&
+                             x.bRecent == e.bRecent;
+                  }));
+        EXPECT_EQ(model.IndexOfGroup(group),
+                  first([&](const MenuStatus& x) { return x.nGroupID == group && !x.dwNodeID; }));
+        EXPECT_EQ(model.HasParticipantEntry(),
+                  first([](const MenuStatus& x) { return x.dwNodeID; }) != -1);
+        EXPECT_EQ(model.HasSelectedDisabledEntry(),
+                  first([](const MenuStatus& x) { return x.bSelected && !x.bEnabled; }) != -1);
+        for (const bool panelist : {false, true}) {
+            std::size_t end = std::min<std::size_t>(at, plain.size());
+            while (end < plain.size() &&
+                   (panelist ? plain[end].bPanelist : plain[end].IsPlainParticipantEntry()) &&
+                   MenuModel::TitleBelow(plain[end], e.strTitle.c_str()))
+                ++end;
+            const auto section =
+                panelist ? MenuModel::Section::kPanelist : MenuModel::Section::kPlain;
+            EXPECT_EQ(model.EndOfSortedRun(static_cast<int>(at), e.strTitle.c_str(), section),
+                      static_cast<int>(end));
+        }
+    }
 }

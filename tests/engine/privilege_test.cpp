@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -337,46 +338,69 @@ TEST(HostHandover, PanelMeetingHostWhoseOwnRecordArrivesGetsTheAttendeeAudiences
         EXPECT_NE(std::find(menu.begin(), menu.end(), title), menu.end()) << title;
 }
 
-TEST(Practice, EachSideSeesItsAudiences) {
+// The role groups whose caches the participant is subscribed to now.
+std::set<std::uint32_t> Subscribed(CChatClient& engine) {
+    std::set<std::uint32_t> ids;
+    for (std::uint32_t id : {GROUP_HOST, GROUP_PRESENTER, GROUP_HOST_PRESENTER, GROUP_PANELISTS,
+                             GROUP_ATTENDEES, GROUP_EVERYONE}) {
+        int subscribed = 0, requestType = 0, cacheSet = 0;
+        if (engine.GetGroupCacheStatus(id, subscribed, requestType, cacheSet) && subscribed)
+            ids.insert(id);
+    }
+    return ids;
+}
+
+TEST(Practice, EachSideSeesItsAudiencesAndKeepsItsCaches) {
     struct Case {
         const char* scenario;
         Own own;
-        std::uint32_t word;
         Strings during;
         Strings after;
+        std::set<std::uint32_t> caches;  // before, during and after practice
     };
     const Case cases[] = {
         {"attendee with attendees: one entry",
          kAttendee,
-         0x4F,
          {"*All Attendees"},
          {"Host", "Presenter", "Host & Presenter", "---", "*All Attendees", "All Panelists", "hank",
-          "pat", "---", "All Participants"}},
+          "pat", "---", "All Participants"},
+         {15, 8}},
         {"panelist: the audiences among panelists",
          kPanelist,
-         0x4F,
          {"Host", "Presenter", "Host & Presenter", "---", "All Attendees", "*All Panelists", "pat",
           "---", "All Participants"},
          {"Host", "Presenter", "Host & Presenter", "---", "All Attendees", "*All Panelists", "hank",
-          "pat", "---", "All Participants", "---", "Select an Attendee..."}},
-        {"presenter: the groups without the picker",
+          "pat", "---", "All Participants", "---", "Select an Attendee..."},
+         {15, 4}},
+        {"presenter: the groups without the picker, the audience chosen before kept",
          kPresenter,
-         0x4F,
+         {"*Host", "Presenter", "Host & Presenter", "---", "All Attendees", "All Panelists", "pat",
+          "---", "All Participants"},
+         {"*Host", "Presenter", "Host & Presenter", "---", "All Attendees", "All Panelists", "pat",
+          "---", "All Participants", "---", "Select an Attendee..."},
+         {15, 2, 4, 3}},
+        {"host: the same groups",
+         kHostRole,
          {"Host", "Presenter", "Host & Presenter", "---", "All Attendees", "All Panelists", "pat",
           "---", "*All Participants"},
          {"Host", "Presenter", "Host & Presenter", "---", "All Attendees", "All Panelists", "pat",
-          "---", "*All Participants", "---", "Select an Attendee..."}},
+          "---", "*All Participants", "---", "Select an Attendee..."},
+         {15, 1, 4, 3}},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
-        MenuHarness h({3});
-        Apply(h, {c.scenario, 3, false, c.own, true, c.word, false, false, {}, "", ""});
+        MenuHarness h({3, false, 0, 0, false, true});
+        Apply(h, {c.scenario, 3, false, c.own, c.own != kHostRole, 0x4F, false, false, {}, "", ""});
+        h.engine.SubscribeAllGroupCaches();
+        EXPECT_EQ(Subscribed(h.engine), c.caches);
         h.engine.SetPracticeStatus(1);
         EXPECT_EQ(Marked(h.engine), c.during);
+        EXPECT_EQ(Subscribed(h.engine), c.caches);
         h.Commands();
         h.engine.SetPracticeStatus(1);  // repeating the value does nothing
         EXPECT_EQ(h.Commands(), Strings());
         h.engine.SetPracticeStatus(0);
         EXPECT_EQ(Marked(h.engine), c.after);
+        EXPECT_EQ(Subscribed(h.engine), c.caches);
     }
 }

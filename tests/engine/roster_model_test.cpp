@@ -67,19 +67,6 @@ TEST(CUserListManager, RoleQueriesAnswerTheBitValue) {
     EXPECT_STREQ(out.strName.GetData(), "user");
 }
 
-TEST(CUserListManager, RoleSettersReplaceTheWholeRoleSet) {
-    CUserListManager list;
-    FillRoster(list);
-    EXPECT_EQ(list.SetHost(20), 1);  // the presenter becomes host only
-    EXPECT_EQ(list.GetUserItemFromNodeId(20)->dwRoles, 1u);
-    list.SetAttendee(50, 1);
-    EXPECT_EQ(list.GetUserItemFromNodeId(50)->dwRoles, 0u);
-    list.SetAttendee(40, 0);
-    EXPECT_EQ(list.GetUserItemFromNodeId(40)->dwRoles, 4u);
-    list.SetPanelist(30, 0);
-    EXPECT_EQ(list.GetUserItemFromNodeId(30)->dwRoles, 0u);
-}
-
 TEST(CUserListManager, LookupsTakeTheFirstMatchAndRemoveDeletesOnlyIt) {
     CUserListManager list;
     FillRoster(list);
