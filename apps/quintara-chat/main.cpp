@@ -134,8 +134,9 @@ int main(int argc, char** argv) {
             std::fflush(stdout);
             status = failures == 0 ? 0 : 1;
         }
-        // On screen the window stays the user's until it is closed.
-        if (!options.offscreen) QApplication::exec();
+        // On screen the window stays the user's until it is closed; offscreen without a
+        // script the participant stays in the conference until the program is ended.
+        if (!options.offscreen || options.scriptPath.empty()) QApplication::exec();
     }
     return status;
 }
