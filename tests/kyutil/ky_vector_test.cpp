@@ -33,16 +33,6 @@ CKyVector Of(const std::vector<int>& numbers) {
 
 }  // namespace
 
-TEST(KyVector, GrowsByThirtyTwoSlots) {
-    CKyVector v;
-    for (int i = 0; i < 33; ++i)
-        ASSERT_EQ(1, v.Add(Item(i)));
-    EXPECT_EQ(33, v.GetCount());
-    EXPECT_EQ(64, v.GetCapacity());
-    EXPECT_EQ(Item(32), v[32]);
-    EXPECT_EQ(Item(0), v.GetHead()[0]);
-}
-
 TEST(KyVector, UniqueAddAndLookupUseTheFirstOccurrence) {
     CKyVector v = Of({1, 2, 1});
     EXPECT_EQ(0, v.Add(Item(2), true));
@@ -70,20 +60,29 @@ TEST(KyVector, RemovalMovesTheTailDown) {
     EXPECT_EQ(nullptr, v.GetData());
 }
 
-TEST(KyVector, InsertAtMovesTheTailUpAndGrowsWhenFull) {
+TEST(KyVector, InsertAtMovesTheTailUpAndAFullVectorGrowsByThirtyTwoSlots) {
     CKyVector v = Of({1, 2});
     EXPECT_EQ(1, v.InsertAt(0, Item(0)));
     EXPECT_EQ(1, v.InsertAt(2, Item(9)));
     EXPECT_EQ(1, v.InsertAt(4, Item(3)));
     EXPECT_EQ((std::vector<int>{0, 1, 9, 2, 3}), Numbers(v));
 
-    CKyVector full;
-    for (int i = 0; i < 32; ++i)
-        full.Add(Item(i + 1));
+    // Thirty-two slots at a time, whether an add or an insert finds the vector full.
+    CKyVector full, added;
+    for (int i = 0; i < 32; ++i) {
+        ASSERT_EQ(1, full.Add(Item(i + 1)));
+        added.Add(Item(i));
+    }
+    EXPECT_EQ(32, full.GetCapacity());
     EXPECT_EQ(1, full.InsertAt(0, Item(0)));
-    EXPECT_EQ(64, full.GetCapacity());
-    EXPECT_EQ(Item(0), full[0]);
-    EXPECT_EQ(Item(32), full[32]);
+    EXPECT_EQ(1, added.Add(Item(32)));
+    for (const CKyVector* grown : {&full, &added}) {
+        EXPECT_EQ(64, grown->GetCapacity());
+        EXPECT_EQ(Numbers(*grown),
+                  Numbers(Of({0,  1,  2,  3,  4,  5,  6,  7,  8,  9,  10, 11, 12, 13, 14, 15, 16,
+                              17, 18, 19, 20, 21, 22, 23, 24, 25, 26, 27, 28, 29, 30, 31, 32})));
+    }
+    EXPECT_EQ(Item(0), added.GetHead()[0]);
 }
 
 TEST(KyVector, OutOfRangeIndexesAreRefusedAndReported) {

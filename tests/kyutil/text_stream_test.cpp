@@ -2,7 +2,7 @@
 
 #include "kyutil/text_stream.h"
 
-TEST(TextStream, KeepsTheLastByteForTheTerminator) {
+TEST(TextStream, KeepsTheLastByteForTheTerminatorAndWritesNumbers) {
     char buffer[8] = {};
     CTextStream text(buffer, sizeof(buffer));
     text.Advance("Assert");
@@ -12,13 +12,12 @@ TEST(TextStream, KeepsTheLastByteForTheTerminator) {
     EXPECT_EQ(7u, text.GetLength());
     text << "more" << 5;
     EXPECT_STREQ("Assert ", buffer);
-}
 
-TEST(TextStream, NumbersAreDecimalOrOnceHexadecimal) {
-    char buffer[32] = {};
-    CTextStream text(buffer, sizeof(buffer));
-    text << -12 << "," << 0;
-    text.Hex() << 255;
-    text << "," << 255;
-    EXPECT_STREQ("-12,0ff,255", buffer);
+    // Numbers are decimal, or hexadecimal for the one after Hex().
+    char numbers[32] = {};
+    CTextStream out(numbers, sizeof(numbers));
+    out << -12 << "," << 0;
+    out.Hex() << 255;
+    out << "," << 255;
+    EXPECT_STREQ("-12,0ff,255", numbers);
 }
