@@ -20,6 +20,7 @@
 #include "tests/engine/menu_harness.h"
 #include "tests/support/arm_recorder.h"
 #include "tests/support/german_host.h"
+#include "tests/support/host_recorder.h"
 #include "tests/support/trace_capture.h"
 
 namespace {
@@ -252,17 +253,6 @@ TEST(CustomerCache, ReceivedAndQMSentLinesAreCopiedOnlyWhenTheyWereShownOrSent) 
     EXPECT_EQ(texts, (Names{"to all #", "to all #", "to all #", "to you", "to you"}));
 }
 
-// What the host hears, in order.
-struct HostRecorder final : IHostChatSink {
-    void OnIncomingChat(const char* sender, const char* message, uint32_t nodeId) override {
-        calls.push_back(std::string(sender) + ": " + message + " @" + std::to_string(nodeId));
-    }
-    void OnChatShown() override { calls.push_back("shown"); }
-    void OnChatModified(bool b) override { calls.push_back(b ? "modified" : "saved"); }
-    void OnChatContentChanged(bool b) override { calls.push_back(b ? "content" : "reset"); }
-    std::vector<std::string> calls;
-};
-
 std::string Stamp(const DateTimeRec& t) {
     char text[64];
     std::snprintf(text, sizeof text, "%04d-%02d-%02d %02d:%02d:%02d/%d", t.year, t.month, t.day,
@@ -288,7 +278,7 @@ TEST(Showing, ALineGoesToWindowTranscriptAndHostWithTheClocksTimeAndOneSound) {
     ASSERT_TRUE(UnixSecondsFromCalendar({2021, 12, 31, 23, 59, 59, true}, &eve));
     room.loop.SetCalendarOrigin(CalendarFromUnixSeconds(eve - static_cast<int>(room.loop.Now())));
     hana.window->Clear();
-    host.calls.clear();
+    host.events.clear();
 
     const std::uint32_t annId = ann.client->UserId();
     hana.client->InjectPrivateData(annId, PrivateLine(annId, "Ann", hana.client->UserId(), "hi"));
@@ -300,7 +290,7 @@ TEST(Showing, ALineGoesToWindowTranscriptAndHostWithTheClocksTimeAndOneSound) {
     EXPECT_EQ(std::string(hana.engine.ChatContent().GetLineAtIndex(0)),
               "from Ann to Hana (privately):\r\thi");
     EXPECT_EQ(Stamp(hana.engine.ChatContent().GetTimeAt(0)), "2021-12-31 23:59:59/1");
-    EXPECT_EQ(host.calls, (Names{"Ann: hi @104", "shown", "content", "modified"}));
+    EXPECT_EQ(host.events, (Names{"Ann: hi @104", "shown", "content 1", "modified 1"}));
     // The host answers the one who wrote to it: the sender is picked as a recent partner.
     EXPECT_TRUE(hana.engine.IsUserSelectedUser(kAttendee));
 

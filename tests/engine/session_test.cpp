@@ -11,6 +11,7 @@
 #include "engine/chat_recovery_mgr.h"
 #include "platform/inproc_conference.h"
 #include "platform/virtual_run_loop.h"
+#include "tests/support/host_recorder.h"
 #include "tests/support/recording_window.h"
 #include "tests/support/spy_arm_client.h"
 #include "tests/support/trace_capture.h"
@@ -18,17 +19,6 @@
 namespace {
 
 constexpr std::uint32_t kSessionId = 42;
-
-class HostSinkRecorder final : public IHostChatSink {
-public:
-    void OnIncomingChat(const char*, const char*, uint32_t) override { events.push_back("chat"); }
-    void OnChatShown() override { events.push_back("shown"); }
-    void OnChatModified(bool on) override { events.push_back(on ? "modified 1" : "modified 0"); }
-    void OnChatContentChanged(bool on) override {
-        events.push_back(on ? "content 1" : "content 0");
-    }
-    std::vector<std::string> events;
-};
 
 class SessionTest : public ::testing::Test {
 protected:
@@ -52,7 +42,7 @@ protected:
     VirtualRunLoop loop;
     ScopedCurrentRunLoop current{&loop};
     InProcessConference conference;
-    HostSinkRecorder host;
+    HostRecorder host;
     int parentView = 0;
 };
 

@@ -12,6 +12,7 @@
 #include "engine/chat_client.h"
 #include "platform/warning_window.h"
 #include "tests/support/failing_file_services.h"
+#include "tests/support/host_recorder.h"
 #include "tests/support/recording_window.h"
 #include "tests/support/temp_dir.h"
 #include "tests/support/trace_capture.h"
@@ -47,17 +48,6 @@ mode_t ModeOf(const std::string& path) {
     ::stat(path.c_str(), &st);
     return st.st_mode & 07777;
 }
-
-class HostSink final : public IHostChatSink {
-public:
-    void OnIncomingChat(const char*, const char*, uint32_t) override {}
-    void OnChatShown() override {}
-    void OnChatModified(bool on) override { events.push_back(on ? "modified 1" : "modified 0"); }
-    void OnChatContentChanged(bool on) override {
-        events.push_back(on ? "content 1" : "content 0");
-    }
-    std::vector<std::string> events;
-};
 
 class TranscriptTest : public testing::Test {
 protected:
@@ -104,7 +94,7 @@ protected:
     }
 
     TempDir dir;
-    HostSink host;
+    HostRecorder host;
     CChatClient engine;
     RecordingWindow* window = nullptr;
     std::vector<std::string> warnings;
