@@ -1,6 +1,8 @@
 // The in-process conference: the contract suite on the virtual clock, and the fault
 // injection, refusals and choices that belong to this implementation.
 #include <cstring>
+#include <string>
+#include <vector>
 
 #include "platform/conference_results.h"
 #include "platform/inproc_conference.h"
@@ -59,6 +61,14 @@ protected:
     }
 };
 
+// The results the sink's events of one callback carried, in order.
+std::vector<short> Results(const ArmRecorder& sink, const std::string& name) {
+    std::vector<short> results;
+    for (const ArmEvent& event : sink.Named(name))
+        results.push_back(event.result);
+    return results;
+}
+
 }  // namespace
 
 TEST_F(InProcessConferenceTest, FailedCallsReturnTheChosenResultAndDoNothing) {
@@ -102,10 +112,8 @@ TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect
     Ctl(a)->ConfirmNextWith(ArmConfirmation::EnrollResourceStatus, 3);
     ASSERT_EQ(0, Enroll(a, "a"));
     Run();
+    ASSERT_EQ(std::vector<short>({5, 0}), Results(*a.sink, "ApeEnrollConfirm"));
     const std::vector<ArmEvent> enrolls = a.sink->Named("ApeEnrollConfirm");
-    ASSERT_EQ(2u, enrolls.size());
-    EXPECT_EQ(5, enrolls[0].result);
-    EXPECT_EQ(0, enrolls[1].result);
     ASSERT_EQ(1u, enrolls[1].resources.size());
     EXPECT_EQ(3, enrolls[1].resources[0].status);
     EXPECT_EQ(0u, enrolls[1].resources[0].value);
@@ -123,17 +131,12 @@ TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect
     ASSERT_EQ(0, a.client->AllocNameHandle(a.ape, 1, &entry, a.sink.get()));
     ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_RETRIEVE));
     Run();
-    const std::vector<ArmEvent> action = a.sink->Named("ApeCacheActionConfirmEx");
-    ASSERT_EQ(1u, action.size());
-    EXPECT_EQ(7, action[0].result);
+    EXPECT_EQ(std::vector<short>{7}, Results(*a.sink, "ApeCacheActionConfirmEx"));
+    ASSERT_EQ(std::vector<short>{6}, Results(*a.sink, "AllocNameHandleConfirm"));
     const std::vector<ArmEvent> handles = a.sink->Named("AllocNameHandleConfirm");
-    ASSERT_EQ(1u, handles.size());
-    EXPECT_EQ(6, handles[0].result);
     EXPECT_EQ(0u, handles[0].handles.at(0).handle_value);
     // The refused append left the cache never set: the subscriber saw nothing of it.
-    const std::vector<ArmEvent> got = b.sink->Named("SharedDataReceivedEx");
-    ASSERT_EQ(1u, got.size());
-    EXPECT_EQ(kArmRetry, got[0].result);
+    EXPECT_EQ(std::vector<short>{kArmRetry}, Results(*b.sink, "SharedDataReceivedEx"));
 }
 
 TEST_F(InProcessConferenceTest, RefusedJoinAndAttachLeaveTheStateUnchanged) {
@@ -147,13 +150,8 @@ TEST_F(InProcessConferenceTest, RefusedJoinAndAttachLeaveTheStateUnchanged) {
     ASSERT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &ape));
     EXPECT_EQ(0u, ape);
     Run();
-    const std::vector<ArmEvent> joins = m.sink->Named("ConferenceJoinConfirm");
-    ASSERT_EQ(2u, joins.size());
-    EXPECT_EQ(2, joins[0].result);
-    EXPECT_EQ(0, joins[1].result);
-    const std::vector<ArmEvent> attach = m.sink->Named("ApeAttachConfirm");
-    ASSERT_EQ(1u, attach.size());
-    EXPECT_EQ(4, attach[0].result);
+    EXPECT_EQ(std::vector<short>({2, 0}), Results(*m.sink, "ConferenceJoinConfirm"));
+    EXPECT_EQ(std::vector<short>{4}, Results(*m.sink, "ApeAttachConfirm"));
     EXPECT_EQ(0u, Ctl(m)->ApeHandle());
     ASSERT_EQ(0, m.client->ApeAttach(m.sink.get(), 0, kConference, &ape));
     EXPECT_NE(0u, ape);
@@ -222,48 +220,31 @@ TEST_F(InProcessConferenceTest, RequestsOutsideTheirStateAreRefused) {
     const std::uint32_t cache = Handle(b, "70001_chat_cache_15");
     std::uint32_t mem = 0;
     ASSERT_EQ(0, a.client->AllocMemHandle(2, &mem));
-    const struct {
-        const char* what;
-        int result;
-        int expected;
-    } cases[] = {
-        {"enroll with another ape handle",
-         b.client->ApeEnroll(b.ape + 1, 1, kSession, 0, 0, nullptr, nullptr, 0, 3),
-         kArmBadApeHandle},
-        {"enroll with resources missing",
-         b.client->ApeEnroll(b.ape, 1, kSession, 0, 1, nullptr, nullptr, 0, 3),
-         kArmInvalidArgument},
-        {"send with a foreign ape", b.client->ApeSendData(b.ape + 1, 1001, 1, "x", 1, 1, 1),
-         kArmBadApeHandle},
-        {"write to an unknown cache",
-         b.client->ApeSharedDataActionEx(b.ape, cache + 1000, 0, 0, CACHE_SET, 0, 0, 0, 1),
-         kArmUnknownHandle},
-        {"append without bytes",
-         b.client->ApeSharedDataActionEx(b.ape, cache, 0, 0, CACHE_APPEND, 0, 0, 0, 1),
-         kArmInvalidArgument},
-        {"another object's memory handle",
-         b.client->ApeSharedDataActionEx(b.ape, cache, 0, 0, CACHE_SET, 0, mem, 0, 1),
-         kArmUnknownHandle},
-        {"an action that is an answer",
-         b.client->ApeSharedDataActionEx(b.ape, cache, 0, 0, CACHE_REPLY_LAST, 0, 0, 0, 1),
-         kArmInvalidArgument},
-        {"request type 3",
-         b.client->ApeRequestSharedDataEx(b.ape, cache, 0, static_cast<tagCacheRequestType>(3), 255,
-                                          b.sink.get()),
-         kArmInvalidArgument},
-        {"retrieve without any sink",
-         b.client->ApeRequestSharedDataEx(b.ape, cache, 0, CACHE_REQUEST_RETRIEVE, 255, nullptr),
-         kArmInvalidArgument},
-        {"send option of another ape",
-         [&] {
-             const ARMSendOption option{b.ape + 1, 0x90};
-             return b.client->SetSendOption(-200, &option);
-         }(),
-         kArmBadApeHandle},
-        {"oversized block", b.client->AllocMemHandle(kArmMaxDataLength + 1, &mem), kArmTooLarge},
-    };
-    for (const auto& c : cases)
-        EXPECT_EQ(c.expected, c.result) << c.what;
+    // Enroll with another ape handle, and with its resources missing.
+    EXPECT_EQ(kArmBadApeHandle,
+              b.client->ApeEnroll(b.ape + 1, 1, kSession, 0, 0, nullptr, nullptr, 0, 3));
+    EXPECT_EQ(kArmInvalidArgument,
+              b.client->ApeEnroll(b.ape, 1, kSession, 0, 1, nullptr, nullptr, 0, 3));
+    EXPECT_EQ(kArmBadApeHandle, b.client->ApeSendData(b.ape + 1, 1001, 1, "x", 1, 1, 1));
+    // Writes to an unknown cache, without bytes, with another object's memory handle, and an
+    // action that is an answer.
+    EXPECT_EQ(kArmUnknownHandle,
+              b.client->ApeSharedDataActionEx(b.ape, cache + 1000, 0, 0, CACHE_SET, 0, 0, 0, 1));
+    EXPECT_EQ(kArmInvalidArgument,
+              b.client->ApeSharedDataActionEx(b.ape, cache, 0, 0, CACHE_APPEND, 0, 0, 0, 1));
+    EXPECT_EQ(kArmUnknownHandle,
+              b.client->ApeSharedDataActionEx(b.ape, cache, 0, 0, CACHE_SET, 0, mem, 0, 1));
+    EXPECT_EQ(kArmInvalidArgument,
+              b.client->ApeSharedDataActionEx(b.ape, cache, 0, 0, CACHE_REPLY_LAST, 0, 0, 0, 1));
+    // Request type 3, and a retrieval without any sink.
+    EXPECT_EQ(kArmInvalidArgument,
+              b.client->ApeRequestSharedDataEx(b.ape, cache, 0, static_cast<tagCacheRequestType>(3),
+                                               255, b.sink.get()));
+    EXPECT_EQ(kArmInvalidArgument, b.client->ApeRequestSharedDataEx(
+                                       b.ape, cache, 0, CACHE_REQUEST_RETRIEVE, 255, nullptr));
+    const ARMSendOption option{b.ape + 1, 0x90};  // another ape's
+    EXPECT_EQ(kArmBadApeHandle, b.client->SetSendOption(-200, &option));
+    EXPECT_EQ(kArmTooLarge, b.client->AllocMemHandle(kArmMaxDataLength + 1, &mem));
 }
 
 TEST_F(InProcessConferenceTest, MemoryReadsAndWritesAreClippedAtTheBlock) {
