@@ -14,6 +14,7 @@
 #include "engine/chat_recovery_mgr.h"
 #include "platform/inproc_conference.h"
 #include "platform/virtual_run_loop.h"
+#include "tests/engine/chat_room.h"
 #include "tests/support/recording_window.h"
 #include "tests/support/spy_arm_client.h"
 #include "tests/support/trace_capture.h"
@@ -47,14 +48,8 @@ struct Participant {
         client = conference.CreateClient(loop, kMyNode);
         if (refuseUserInfoSet) client->ConfirmNextWith(ArmConfirmation::ApeCacheActionConfirmEx, 7);
         spy = std::make_unique<SpyArmClient>(client);
-        _tagChatData data{};
-        data.pArmClient = spy.get();
-        data.wConferenceID = conference.ConferenceId();
-        data.dwSessionID = kSessionId;
-        data.lpszUserName = "Alice";
-        data.dwNodeID = kMyNode;
-        data.lMeetingType = 3;
-        engine.Initialize(data);
+        engine.Initialize(chatroom::StartRecord(spy.get(), conference.ConferenceId(), kSessionId,
+                                                "Alice", kMyNode, 3));
         for (std::uint32_t id : {GROUP_HOST_PRESENTER_PANELISTS, kHighGroupId}) {
             _tagChatGroupInfo info{};
             info.dwIndex = 100;

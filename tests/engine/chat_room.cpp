@@ -28,14 +28,9 @@ Member& ChatRoom::Join(const Person& person, IHostChatSink* hostSink) {
     m.engine.SetRosters(person.roles, 0);
     if (m_features != 0) m.engine.SelectFeature(m_features, 0, 0, 0, 0, nullptr);
     if (beforeStart) beforeStart(m.engine);
-    _tagChatData data{};
-    data.pArmClient = m.client;
+    _tagChatData data = StartRecord(m.client, conference.ConferenceId(), kSession, person.name,
+                                    person.node, m_meetingType);
     data.pHostSink = hostSink;
-    data.wConferenceID = conference.ConferenceId();
-    data.dwSessionID = kSession;
-    data.lpszUserName = person.name;
-    data.dwNodeID = person.node;
-    data.lMeetingType = m_meetingType;
     m.engine.Initialize(data);
     m.window = static_cast<RecordingWindow*>(m.engine.ChatUI());
     Run();

@@ -16,6 +16,20 @@
 
 namespace chatroom {
 
+// The start record of a participant on a conference, through client (may be null).
+inline _tagChatData StartRecord(IArmClient* client, std::uint16_t conferenceId,
+                                std::uint32_t sessionId, const char* name, std::uint32_t node,
+                                std::int32_t meetingType) {
+    _tagChatData data{};
+    data.pArmClient = client;
+    data.wConferenceID = conferenceId;
+    data.dwSessionID = sessionId;
+    data.lpszUserName = name;
+    data.dwNodeID = node;
+    data.lMeetingType = meetingType;
+    return data;
+}
+
 struct Person {
     const char* name;
     std::uint32_t node;

@@ -10,6 +10,7 @@
 #include "engine/chat_client.h"
 #include "platform/inproc_conference.h"
 #include "platform/virtual_run_loop.h"
+#include "tests/engine/chat_room.h"
 #include "tests/support/trace_capture.h"
 
 namespace {
@@ -108,13 +109,10 @@ TEST(LogTexts, SessionWalkAndHostCommands) {
         SCOPED_TRACE(s.step);
         Engine engine = std::make_unique<CChatClient>();
         if (s.withService) {
-            ChatData data{};
-            data.pArmClient = conference.CreateClient(loop, node);
-            data.wConferenceID = conference.ConferenceId();
-            data.dwSessionID = 42;
-            data.lpszUserName = "Alice";
-            data.dwNodeID = node++;
-            engine->Initialize(data);
+            engine->Initialize(chatroom::StartRecord(conference.CreateClient(loop, node),
+                                                     conference.ConferenceId(), 42, "Alice", node,
+                                                     0));
+            ++node;
             loop.RunUntilIdle();
         }
         TraceCapture capture;

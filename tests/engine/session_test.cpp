@@ -11,6 +11,7 @@
 #include "engine/chat_recovery_mgr.h"
 #include "platform/inproc_conference.h"
 #include "platform/virtual_run_loop.h"
+#include "tests/engine/chat_room.h"
 #include "tests/support/host_recorder.h"
 #include "tests/support/recording_window.h"
 #include "tests/support/spy_arm_client.h"
@@ -27,15 +28,10 @@ protected:
 
     _tagChatData Data(IArmClient* client, std::uint32_t node, const char* name,
                       std::int32_t meetingType = 1) {
-        _tagChatData data{};
+        _tagChatData data = chatroom::StartRecord(client, conference.ConferenceId(), kSessionId,
+                                                  name, node, meetingType);
         data.pHostSink = &host;
         data.hParentView = &parentView;
-        data.pArmClient = client;
-        data.wConferenceID = conference.ConferenceId();
-        data.dwSessionID = kSessionId;
-        data.lpszUserName = name;
-        data.dwNodeID = node;
-        data.lMeetingType = meetingType;
         return data;
     }
 
