@@ -2,6 +2,7 @@
 // connection chain and its failures, roster-info switches, the tick and the tear-down.
 #include <gtest/gtest.h>
 
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
@@ -197,9 +198,7 @@ TEST_F(SessionTest, AlreadyConnectedOrJoinedGoesOnWithinTheSameCall) {
         EXPECT_EQ(Prefix(spy.Calls(), chain.size()), chain);
         EXPECT_TRUE(
             capture.Has("CChatClient::already connected, now call ConnectConfirm() myself"));
-        if (joined) {
-            EXPECT_EQ(engine.State(), kStateAttaching);
-        }
+        if (joined) EXPECT_EQ(engine.State(), kStateAttaching);
         loop.RunUntilIdle();
         EXPECT_EQ(engine.State(), kStateEnrolled);
     }
@@ -314,19 +313,20 @@ TEST_F(SessionTest, TickClosesTheAttendeePickerOnceItsWarningIsGone) {
     RecordingWindow* window = RecordingWindow::Latest();
     ASSERT_NE(window, nullptr);
     window->warningShowing = 1;
-    window->Clear();
-    engine.CloseSeltAttDlg();  // the dialog waits for its warning to go
-    EXPECT_EQ(window->Ids(), std::vector<int>{msg_CloseAttendeeWarning});
-    window->Clear();
-    loop.AdvanceBy(1.0);
-    EXPECT_EQ(window->Ids(), std::vector<int>{msg_CloseAttendeeWarning});
+    // The commands the window gets while act runs.
+    const auto during = [window](const std::function<void()>& act) {
+        window->Clear();
+        act();
+        return window->Ids();
+    };
+    const std::vector<int> warning{msg_CloseAttendeeWarning};
+    // The dialog waits for its warning to go.
+    EXPECT_EQ(during([&] { engine.CloseSeltAttDlg(); }), warning);
+    EXPECT_EQ(during([&] { loop.AdvanceBy(1.0); }), warning);
     window->warningShowing = 0;
-    window->Clear();
-    loop.AdvanceBy(0.5);
-    EXPECT_EQ(window->Ids(), (std::vector<int>{msg_CloseAttendeeWarning, msg_CloseAttendeeDialog}));
-    window->Clear();
-    loop.AdvanceBy(0.5);
-    EXPECT_TRUE(window->Ids().empty());
+    EXPECT_EQ(during([&] { loop.AdvanceBy(0.5); }),
+              (std::vector<int>{msg_CloseAttendeeWarning, msg_CloseAttendeeDialog}));
+    EXPECT_TRUE(during([&] { loop.AdvanceBy(0.5); }).empty());
 }
 
 TEST_F(SessionTest, RolesChangedBeforeEnrolmentAreEnrolledByTheTick) {

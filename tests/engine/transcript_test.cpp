@@ -87,9 +87,8 @@ protected:
     }
     std::vector<std::string> Shown() const {
         std::vector<std::string> shown;
-        for (const RecordedCommand& c : window->Commands()) {
+        for (const RecordedCommand& c : window->Commands())
             if (c.id == msg_ShowTitle || c.id == msg_ShowText) shown.push_back(c.text);
-        }
         return shown;
     }
 

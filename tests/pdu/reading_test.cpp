@@ -61,9 +61,8 @@ TEST(Reading, RequiredAndOptionalElementsOfEachKind) {
         {Parse<CPrimCustNodeIdPDU>, 10, "<primcust>4096</primcust>", 1},
         {Parse<CPrimCustNodeIdPDU>, 10, "", 0},
     };
-    for (const auto& c : cases) {
+    for (const auto& c : cases)
         EXPECT_EQ(c.parse(Chat(c.type, c.body)), c.result) << c.type << ": " << c.body;
-    }
 }
 
 TEST(Reading, MissingOptionalElementsLeaveFieldsEmptyAndFailuresKeepWhatWasRead) {

@@ -21,9 +21,8 @@ TEST_F(GermanHost, KeysWithATranslationComeBackTranslatedInUtf8) {
 }
 
 TEST_F(GermanHost, KeysWithoutATranslationComeBackUnchanged) {
-    for (const char* key : {"Save Chat As", "", "%s %d %@"}) {
+    for (const char* key : {"Save Chat As", "", "%s %d %@"})
         EXPECT_EQ(GetLocalizedString(key, kChatBundleId), key);
-    }
     EXPECT_EQ(GetLocalizedString(std::string("Save\0Chat", 9)), std::string("Save\0Chat", 9));
     EXPECT_EQ(GetLocalizedString("Select an Attendee...", kChatBundleId, "Other"),
               "Select an Attendee...");

@@ -47,9 +47,8 @@ std::vector<std::string> ArmRecorder::Names() const {
 
 std::vector<ArmEvent> ArmRecorder::Named(const std::string& name) const {
     std::vector<ArmEvent> found;
-    for (const ArmEvent& event : m_events) {
+    for (const ArmEvent& event : m_events)
         if (event.name == name) found.push_back(event);
-    }
     return found;
 }
 

@@ -13,9 +13,8 @@ void FailingFileServices::Fail(FileOp op, FileResult result, const std::string& 
 }
 
 FileResult FailingFileServices::Injected(FileOp op, const std::string& path) const {
-    for (const Rule& rule : m_rules) {
+    for (const Rule& rule : m_rules)
         if (rule.op == op && path.find(rule.pathPart) != std::string::npos) return rule.result;
-    }
     return kFileOk;
 }
 
