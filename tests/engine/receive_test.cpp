@@ -85,6 +85,7 @@ protected:
 };
 
 TEST_F(Receiving, AGroupMessageReachesItsAudienceWithItsTitle) {
+    const Names panel{"Hana", "Pia", "Paul"};
     const struct {
         int from;  // 0 Hana, 3 Ann
         std::uint32_t groupId;
@@ -99,11 +100,8 @@ TEST_F(Receiving, AGroupMessageReachesItsAudienceWithItsTitle) {
         {3, GROUP_PANELISTS, "from Ann to All Panelists", {"Hana", "Pia", "Paul", "Ann"}},
         {3, GROUP_EVERYONE, "from Ann to All Participants", {"Hana", "Pia", "Paul", "Ann"}},
         // However an attendee came by a copy, panel chat is for the privileged.
-        {0, GROUP_PANELISTS, "from Hana to All Panelists", {"Hana", "Pia", "Paul"}},
-        {0,
-         GROUP_HOST_PRESENTER_PANELISTS,
-         "from Hana to Host, Presenter & Panelists",
-         {"Hana", "Pia", "Paul"}},
+        {0, GROUP_PANELISTS, "from Hana to All Panelists", panel},
+        {0, GROUP_HOST_PRESENTER_PANELISTS, "from Hana to Host, Presenter & Panelists", panel},
         // No cache: the message's own group id decides; an unknown one only its sender sees.
         {3, 99, "", {"Ann"}},
     };

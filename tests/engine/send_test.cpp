@@ -58,6 +58,7 @@ std::vector<ArmEvent> CacheItems(ChatRoom& room, Member& m, std::uint32_t groupI
 TEST(Sending, EveryAudienceOfAPanelMeetingReachesExactlyItsParticipants) {
     ChatRoom room(3);
     JoinPanel(room);
+    const Names everybody{"Hana", "Pia", "Paul", "Ann", "Al"};
     const struct {
         const char* from;
         std::int32_t groupId;
@@ -71,11 +72,7 @@ TEST(Sending, EveryAudienceOfAPanelMeetingReachesExactlyItsParticipants) {
         {"Ann", GROUP_PRESENTER, 0, "from Ann to Presenter (privately)", {"Pia", "Ann"}},
         {"Ann", GROUP_HOST_PRESENTER, 0, "from Ann to Host & Presenter", {"Hana", "Pia", "Ann"}},
         {"Ann", GROUP_PANELISTS, 0, "from Ann to All Panelists", {"Hana", "Pia", "Paul", "Ann"}},
-        {"Ann",
-         GROUP_EVERYONE,
-         0,
-         "from Ann to All Participants",
-         {"Hana", "Pia", "Paul", "Ann", "Al"}},
+        {"Ann", GROUP_EVERYONE, 0, "from Ann to All Participants", everybody},
         {"Paul", GROUP_ATTENDEES, 0, "from Paul to All Attendees", {"Paul", "Ann", "Al"}},
         {"Hana", GROUP_PANELISTS, 0, "from Hana to All Panelists", {"Hana", "Pia", "Paul"}},
         {"Ann", kPerson, kHana, "from Ann to Hana (privately)", {"Hana", "Ann"}},
