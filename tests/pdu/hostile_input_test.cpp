@@ -63,21 +63,16 @@ TEST(HostileInput, NestingIsReadUpToTheDepthCapOnly) {
     EXPECT_EQ(pdu.ParseXMLPDU(GroupMessageWith(Repeat("<a><b/></a>", 200))), 1);
 }
 
+// More disguises (a character reference over a CDATA section or a comment, a quoted '>' in a
+// declaration, a cut sequence after a byte-order mark) are in the fuzz corpus, whose replay
+// checks the depth of the tree the parser builds.
 TEST(HostileInput, DeepNestingIsRefusedHoweverItIsDisguised) {
     const std::string cases[] = {
         kCrashDeep,
         std::string(kHead) + kCrashDeep,
-        // A character reference runs to the next ';', over what looks like a CDATA section
-        // or a comment, and the markup behind it is real.
-        std::string(kHead) + "<message>&#x<![CDATA[x1;" + kCrashDeep,
-        std::string(kHead) + "<message>&#<!--#1;" + kCrashDeep,
-        // A quoted '>' does not end a declaration; the quote that seems to open after it
-        // does not exist for the parser.
-        "<?xml version=\"><a b='\"?>" + kCrashDeep,
         // Markup-looking text inside attribute values.
         "<chat ver=\"<![CDATA[\" x='<!--'>" + kCrashDeep,
-        // A byte-order mark makes the text UTF-8; a cut sequence would step over a quote.
-        "\xEF\xBB\xBF<chat a=\"\xF0\"xy\">" + kCrashDeep,
+        // A byte-order mark makes the text UTF-8.
         "\xEF\xBB\xBF<chat a=\"\xC3\xA9\">" + kCrashDeep,
         // Unknown markup and stray end tags around the nesting.
         "<!DOCTYPE chat [<!ENTITY x \"y\">]><chat></nothing>" + kCrashDeep,
