@@ -66,7 +66,7 @@ NatsArmClient::~NatsArmClient() {
 }
 
 int NatsArmClient::Release() {
-    Leave();
+    Leave(Closing::WithConnection);
     for (Stage stage : {Stage::Node, Stage::Conference, Stage::Ape})
         ++m_liveness->Of(stage);
     m_worker.Enqueue([this] { DisconnectTask(); });
@@ -89,7 +89,7 @@ int NatsArmClient::Connect(IArmNodeControllerSink* sink, const char*, std::uint3
 }
 
 int NatsArmClient::Destroy(IArmNodeControllerSink*, int) {
-    Leave();
+    Leave(Closing::WithConnection);
     {
         const std::lock_guard<std::mutex> lock(m_mutex);
         m_phase = Phase::Idle;
@@ -126,7 +126,7 @@ int NatsArmClient::ConferenceJoin(std::uint32_t, std::uint16_t conferenceId,
 int NatsArmClient::ConferenceLeave(std::uint32_t, std::uint16_t conferenceId, IArmConferenceSink*) {
     if (conferenceId != m_options.conferenceId) return kArmNoSuchConference;
     if (!m_bJoined) return kArmNotJoined;
-    Leave();
+    Leave(Closing::Now);
     return 0;
 }
 
@@ -275,7 +275,7 @@ int NatsArmClient::ApeSendData(std::uint32_t apeHandle, std::uint32_t destUserId
 
 int NatsArmClient::ApeDetach(std::uint32_t apeHandle) {
     if (!IsAttached(apeHandle)) return kArmBadApeHandle;
-    Detach();
+    Detach(Closing::Now);
     return 0;
 }
 
@@ -341,7 +341,7 @@ void NatsArmClient::PostLog(int level, std::string text) {
     });
 }
 
-void NatsArmClient::Detach() {
+void NatsArmClient::Detach(Closing closing) {
     if (m_apeHandle == 0) return;
     {
         const std::lock_guard<std::mutex> lock(m_mutex);
@@ -353,11 +353,11 @@ void NatsArmClient::Detach() {
     }
     m_sendOption = 0;
     ++m_liveness->Of(Stage::Ape);
-    m_worker.Enqueue([this] { DetachTask(); });
+    if (closing == Closing::Now) m_worker.Enqueue([this] { DetachTask(); });
 }
 
-void NatsArmClient::Leave() {
-    Detach();
+void NatsArmClient::Leave(Closing closing) {
+    Detach(closing);
     m_bJoined = false;
     ++m_liveness->Of(Stage::Conference);
 }

@@ -31,6 +31,7 @@
 #include "netconf/nats_handles.h"
 #include "netconf/presence_table.h"
 #include "netconf/serial_worker.h"
+#include "netconf/subscription_end.h"
 #include "platform/conference_mem_handles.h"
 
 class NatsArmClient final : public IArmClient {
@@ -105,6 +106,7 @@ private:
         IArmSharedDataSink* sink = nullptr;  // caches: where deliveries go (under m_mutex)
         bool active = true;                  // false once unsubscribed (under m_mutex)
         NatsPtr<natsSubscription> sub;
+        SubscriptionEnd end;
         std::atomic<std::uint64_t> handled{0};  // consumer sequence handed on so far
         // Stream sequence handed on last (under m_mutex): a consumer the client recreates
         // after a failover may deliver again what came just before it.
@@ -131,14 +133,19 @@ private:
     bool IsAttached(std::uint32_t apeHandle) const {
         return m_apeHandle != 0 && apeHandle == m_apeHandle;
     }
-    void Detach();
-    void Leave();
+    // Whether the server-side part goes now, or with the connection (whose closing task the
+    // caller queues).
+    enum class Closing { Now, WithConnection };
+    void Detach(Closing closing);
+    void Leave(Closing closing);
     std::string NewMsgId();
 
     // Worker tasks (nats_arm_client_link.cpp, nats_arm_client_roster.cpp).
     void ConnectTask(IArmNodeControllerSink* sink, std::uint32_t epoch);
     void AttachTask(IArmApeSink* sink, std::uint32_t ape, std::uint32_t epoch);
     void DetachTask();
+    // Leaves the conference on the server; the feeds it had, still open.
+    std::vector<std::unique_ptr<Feed>> LeaveNetTask();
     void DisconnectTask();
     void Tick();
     bool EnsureStream(const std::string& name, const std::string& subjects, bool mailbox,
@@ -226,7 +233,11 @@ private:
     NatsPtr<natsConnection> m_connection;
     NatsPtr<jsCtx> m_js;
     NatsPtr<natsSubscription> m_presenceSub;
+    SubscriptionEnd m_presenceEnd;
     std::unique_ptr<Feed> m_mailbox;
+    // Closed feeds whose handler had not returned for the last time yet; they go once the
+    // connection is closed.
+    std::vector<std::unique_ptr<Feed>> m_closingFeeds;
 
     SerialWorker m_worker;  // last: stops before anything it uses goes away
 };

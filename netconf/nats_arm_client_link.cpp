@@ -100,6 +100,7 @@ void NatsArmClient::ConnectTask(IArmNodeControllerSink* sink, std::uint32_t epoc
             status = natsConnection_Subscribe(&rawSub, rawConnection, presence.c_str(),
                                               &NatsArmClient::OnPresence, this);
             m_presenceSub.reset(rawSub);
+            if (status == NATS_OK) m_presenceEnd.Watch(rawSub);
             if (status == NATS_OK)
                 status = natsConnection_FlushTimeout(rawConnection, kRequestTimeoutMs);
             if (status == NATS_OK) {
@@ -174,43 +175,61 @@ void NatsArmClient::AttachTask(IArmApeSink* sink, std::uint32_t ape, std::uint32
 }
 
 void NatsArmClient::DetachTask() {
-    std::map<std::uint32_t, std::unique_ptr<Feed>> feeds;
-    {
-        const std::lock_guard<std::mutex> lock(m_mutex);
-        if (m_netAttached && m_connection) {
-            m_netAttached = false;
-            AnnounceLocked(false);
-        }
+    for (std::unique_ptr<Feed>& feed : LeaveNetTask())
+        DropFeed(std::move(feed));
+}
+
+std::vector<std::unique_ptr<NatsArmClient::Feed>> NatsArmClient::LeaveNetTask() {
+    std::vector<std::unique_ptr<Feed>> feeds;
+    const std::lock_guard<std::mutex> lock(m_mutex);
+    if (m_netAttached && m_connection) {
         m_netAttached = false;
-        m_session = 0;
-        m_enrollInfo.clear();
-        m_presence.Clear();
-        feeds.swap(m_cacheFeeds);
+        AnnounceLocked(false);
     }
-    for (auto& entry : feeds)
-        DropFeed(std::move(entry.second));
-    DropFeed(std::move(m_mailbox));
+    m_netAttached = false;
+    m_session = 0;
+    m_enrollInfo.clear();
+    m_presence.Clear();
+    for (auto& entry : m_cacheFeeds)
+        feeds.push_back(std::move(entry.second));
+    m_cacheFeeds.clear();
+    if (m_mailbox) feeds.push_back(std::move(m_mailbox));
+    return feeds;
 }
 
 void NatsArmClient::DisconnectTask() {
-    DetachTask();
+    {
+        // From here on no connection callback reaches this object; one running now finishes
+        // first, as it holds the registry.
+        const std::lock_guard<std::mutex> lock(g_registryMutex);
+        g_registry.erase(m_registryId);
+    }
+    std::vector<std::unique_ptr<Feed>> feeds = LeaveNetTask();
+    for (std::unique_ptr<Feed>& feed : m_closingFeeds)
+        feeds.push_back(std::move(feed));
+    m_closingFeeds.clear();
     {
         const std::lock_guard<std::mutex> lock(m_mutex);
         m_phase = Phase::Idle;
     }
-    if (m_presenceSub) {
-        natsSubscription_Drain(m_presenceSub.get());
-        natsSubscription_WaitForDrainCompletion(m_presenceSub.get(), kRequestTimeoutMs);
-        m_presenceSub.reset();
-    }
-    m_js.reset();
+    // Closing the connection ends every subscription at once. Closing the consumers one by
+    // one instead would race the client recreating them after a reconnect; the server drops
+    // consumers nobody listens to by itself.
     if (m_connection) {
         natsConnection_FlushTimeout(m_connection.get(), kRequestTimeoutMs);
         natsConnection_Close(m_connection.get());
-        m_connection.reset();
     }
-    const std::lock_guard<std::mutex> lock(g_registryMutex);
-    g_registry.erase(m_registryId);
+    // The handlers' last calls are awaited before the connection and what they use go.
+    if (m_presenceSub && !m_presenceEnd.Ended(kRequestTimeoutMs)) {
+        PostLog(2, "NatsArmClient: presence handler of " + m_options.user + " did not end");
+    }
+    for (std::unique_ptr<Feed>& feed : feeds) {
+        // One that never ends is left behind rather than freed under its handler.
+        if (feed->sub && !feed->end.Ended(kRequestTimeoutMs)) static_cast<void>(feed.release());
+    }
+    m_presenceSub.reset();
+    m_js.reset();
+    m_connection.reset();
 }
 
 bool NatsArmClient::EnsureStream(const std::string& name, const std::string& subjects, bool mailbox,
@@ -355,6 +374,7 @@ bool NatsArmClient::SubscribeFeed(Feed& feed, const std::string& stream, const s
     const natsStatus status = js_Subscribe(&raw, m_js.get(), filter.c_str(), &NatsArmClient::OnFeed,
                                            &feed, nullptr, &options, &error);
     feed.sub.reset(raw);
+    if (status == NATS_OK) feed.end.Watch(raw);
     if (status != NATS_OK) {
         *reason = "consumer on " + filter + ": " + NatsErrorText(status);
         feed.sub.reset();
@@ -404,11 +424,9 @@ bool NatsArmClient::FirstSequenceSince(const std::string& stream, const std::str
 
 void NatsArmClient::DropFeed(std::unique_ptr<Feed> feed) {
     if (!feed || !feed->sub) return;
-    // Drained, its handler has run for the last time when the wait returns.
-    if (natsSubscription_Drain(feed->sub.get()) == NATS_OK) {
-        natsSubscription_WaitForDrainCompletion(feed->sub.get(), kRequestTimeoutMs);
-    } else {
-        natsSubscription_Unsubscribe(feed->sub.get());
+    // The feed goes only once its handler has run for the last time.
+    if (!feed->end.Close(feed->sub.get(), kRequestTimeoutMs)) {
+        m_closingFeeds.push_back(std::move(feed));
     }
 }
 

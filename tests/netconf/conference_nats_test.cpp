@@ -2,7 +2,9 @@
 // this service alone: refusals at the server, an unreachable server.
 #include <nats/nats.h>
 
+#include <chrono>
 #include <cstring>
+#include <thread>
 
 #include "netconf/conference_subjects.h"
 #include "netconf/netconf_results.h"
@@ -83,4 +85,35 @@ TEST(NatsConferenceOptions, UnusableOptionsMakeNoObject) {
         EXPECT_NE(0u, ConferenceUserId(user));
         EXPECT_LT(ConferenceUserId(user), 0x80000000u);
     }
+}
+
+TEST_F(NatsConferenceTest, ParticipantsReleasedWhileTheyReconnectGetNothingMore) {
+    ContractParticipant& a = Attached(11);
+    ASSERT_EQ(0, Enroll(a, "alpha"));
+    const std::uint32_t cache = Handle(a, "1_chat_cache_15");
+    std::vector<ContractParticipant*> leaving;
+    for (std::uint32_t node = 12; node <= 15; ++node) {
+        ContractParticipant& p = Attached(node);
+        ASSERT_EQ(0, Enroll(p, "p"));
+        ASSERT_EQ(0, Request(p, cache, CACHE_REQUEST_SUBSCRIBE));
+        leaving.push_back(&p);
+    }
+    Run();
+
+    // The server goes and comes back; each participant is released at another moment of
+    // its reconnection (its callbacks, the consumers being recreated).
+    Harness().Server().Kill();
+    ASSERT_TRUE(Harness().Server().Start()) << Harness().Server().Log();
+    for (ContractParticipant* p : leaving) {
+        p->sink->Clear();
+        Release(*p);
+        std::this_thread::sleep_for(std::chrono::milliseconds(150));
+    }
+    a.sink->Clear();
+    const std::vector<std::uint8_t> line = ContractBytes("after release");
+    ASSERT_EQ(0, Write(a, cache, CACHE_APPEND, &line));
+    Run();
+    for (ContractParticipant* p : leaving)
+        EXPECT_TRUE(p->sink->Events().empty()) << p->sink->Events().front().name;
+    EXPECT_EQ(1u, a.sink->Named("ApeCacheActionConfirmEx").size());
 }
