@@ -8,17 +8,20 @@
 MenuStatusList MenuModel::ToList() const {
     MenuStatusList list;
     list.reserve(m_Entries.size());
-    for (const auto& entry : m_Entries)
+    for (const MenuStatus* entry : m_Entries)
         list.push_back(*entry);
     return list;
+}
+
+MenuModel::~MenuModel() {
+    Clear();
 }
 
 void MenuModel::Insert(std::size_t index, const MenuStatus& entry) {
     index = std::min(index, size());
     if (index > 0) CountPair(index - 1, -1);
-    m_Entries.insert(m_Entries.begin() + index, std::make_unique<MenuStatus>(entry));
+    m_Entries.insert(m_Entries.begin() + index, new MenuStatus(entry));
     m_Nodes.insert(m_Nodes.begin() + index, entry.dwNodeID);
-    m_Groups.insert(m_Groups.begin() + index, entry.nGroupID);
     m_Sections.insert(m_Sections.begin() + index, SectionOf(entry));
     Count(index, 1);
     CountNeighbours(index, 1);
@@ -28,17 +31,18 @@ void MenuModel::Erase(std::size_t index) {
     if (index >= size()) return;
     CountNeighbours(index, -1);
     Count(index, -1);
+    delete m_Entries[index];
     m_Entries.erase(m_Entries.begin() + index);
     m_Nodes.erase(m_Nodes.begin() + index);
-    m_Groups.erase(m_Groups.begin() + index);
     m_Sections.erase(m_Sections.begin() + index);
     if (index > 0) CountPair(index - 1, 1);
 }
 
 void MenuModel::Clear() {
+    for (MenuStatus* entry : m_Entries)
+        delete entry;
     m_Entries.clear();
     m_Nodes.clear();
-    m_Groups.clear();
     m_Sections.clear();
     m_NodeEntries.clear();
     m_GroupEntries.clear();
@@ -65,7 +69,6 @@ void MenuModel::SetGroupID(std::size_t index, std::int32_t groupId) {
     CountNeighbours(index, -1);
     Count(index, -1);
     m_Entries[index]->nGroupID = groupId;
-    m_Groups[index] = groupId;
     m_Sections[index] = SectionOf(*m_Entries[index]);
     Count(index, 1);
     CountNeighbours(index, 1);
@@ -79,8 +82,8 @@ void MenuModel::SetTitle(std::size_t index, const std::string& title) {
 
 int MenuModel::IndexOfGroup(std::int32_t groupId) const {
     if (m_GroupEntries.count(groupId) == 0) return -1;
-    for (std::size_t i = 0; i < m_Groups.size(); ++i) {
-        if (m_Groups[i] == groupId && m_Nodes[i] == 0) return static_cast<int>(i);
+    for (std::size_t i = 0; i < m_Nodes.size(); ++i) {
+        if (m_Nodes[i] == 0 && m_Entries[i]->nGroupID == groupId) return static_cast<int>(i);
     }
     return -1;
 }
@@ -100,19 +103,21 @@ int MenuModel::FindParticipant(std::uint32_t nodeId, Wanted wanted) const {
     for (auto it = m_Nodes.begin(); (it = std::find(it, m_Nodes.end(), nodeId)) != m_Nodes.end();
          ++it) {
         const std::size_t i = static_cast<std::size_t>(it - m_Nodes.begin());
-        if (m_Groups[i] == -1 && wanted(*m_Entries[i])) return static_cast<int>(i);
+        if (m_Entries[i]->nGroupID == -1 && wanted(*m_Entries[i])) return static_cast<int>(i);
     }
     return -1;
 }
 
 std::size_t MenuModel::EndOfSection(std::size_t from, Section section) const {
-    // Eight sections at a time: a run of attendees can be most of the menu.
+    // Thirty-two sections at a time: a run of attendees can be most of the menu.
     const std::uint64_t eight = 0x0101010101010101ull * static_cast<std::uint8_t>(section);
     const std::size_t count = m_Sections.size();
     std::size_t i = from;
-    for (std::uint64_t word; i + 8 <= count; i += 8) {
-        std::memcpy(&word, m_Sections.data() + i, sizeof word);
-        if (word != eight) break;
+    for (std::uint64_t words[4]; i + sizeof words <= count; i += sizeof words) {
+        std::memcpy(words, m_Sections.data() + i, sizeof words);
+        if (((words[0] ^ eight) | (words[1] ^ eight) | (words[2] ^ eight) | (words[3] ^ eight)) !=
+            0)
+            break;
     }
     while (i < count && m_Sections[i] == section)
         ++i;

@@ -4,7 +4,6 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <memory>
 #include <string>
 #include <unordered_map>
 #include <vector>
@@ -17,6 +16,7 @@ public:
     enum class Section : std::uint8_t { kOther, kPlain, kPanelist };
 
     MenuModel() = default;
+    ~MenuModel();
     MenuModel(const MenuModel&) = delete;
     MenuModel& operator=(const MenuModel&) = delete;
 
@@ -69,11 +69,10 @@ private:
     // The neighbours of the entry at index, taken out of (sign -1) or put back into the count.
     void CountNeighbours(std::size_t index, int sign);
 
-    // The entries, and per entry its node id, group id and section, searched without
-    // touching the entries.
-    std::vector<std::unique_ptr<MenuStatus>> m_Entries;
+    // The entries, owned (plain pointers, so that making room moves only pointers), and per
+    // entry its node id and section, searched without touching the entries.
+    std::vector<MenuStatus*> m_Entries;
     std::vector<std::uint32_t> m_Nodes;
-    std::vector<std::int32_t> m_Groups;
     std::vector<Section> m_Sections;
     // Participant entries per node and group entries per group id, so that an absent one is
     // known without a search.
