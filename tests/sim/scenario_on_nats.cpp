@@ -22,10 +22,6 @@ namespace {
 
 constexpr std::uint16_t kConference = 9;
 
-std::string Password(const std::string& name) {
-    return "pw-" + name;
-}
-
 // The short names the scenario joins; false when it does not read (the simulator says why).
 bool Participants(const std::string& path, std::vector<std::string>* names) {
     std::ifstream file(path, std::ios::binary);
@@ -71,8 +67,8 @@ int main(int argc, char** argv) {
     options.port = 0;
     std::string creds;
     for (const std::string& name : names) {
-        options.participants.push_back({name, Password(name)});
-        creds += name + " " + Password(name) + "\n";
+        options.participants.push_back({name, "pw-" + name});
+        creds += name + " pw-" + name + "\n";
     }
     NatsServer server(options);
     TempDir dir;

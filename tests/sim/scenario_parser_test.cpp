@@ -18,8 +18,12 @@ TEST(ScenarioParser, WordsStringsOptionsAndComments) {
         "conference type=3 qm start=\"2009-03-05 09:03:00\"   # the first line\n"
         "\n"
         "join ann node=0x65 name=\"Ann \\\"the host\\\" A.\" selector\n"
-        "say ann \"a # is no comment\\nin a string\\\\\" # but this is\n");
-    ASSERT_EQ(commands.size(), 3u);
+        "say ann \"a # is no comment\\nin a string\\\\\" # but this is\n"
+        "privilege 71 ann bob carl\n"
+        "host node=9\n"
+        "expect ann menu \"Host\" \"-\" \"*All Participants\"\n"
+        "inject ann private bob \"hi\" sender=0\n");
+    ASSERT_EQ(commands.size(), 7u);
     EXPECT_EQ(commands[0].line, 2);
     EXPECT_EQ(commands[0].verb, "conference");
     EXPECT_EQ(commands[0].Option("start")->value, "2009-03-05 09:03:00");
@@ -36,6 +40,12 @@ TEST(ScenarioParser, WordsStringsOptionsAndComments) {
     ASSERT_EQ(commands[2].args.size(), 2u);
     EXPECT_EQ(commands[2].args[1].value, "a # is no comment\nin a string\\");
     EXPECT_EQ(commands[2].Option("missing"), nullptr);
+
+    // Optional and repeated arguments.
+    EXPECT_EQ(commands[3].Positional().size(), 4u);
+    EXPECT_EQ(commands[4].Positional().size(), 0u);
+    EXPECT_EQ(commands[5].Positional().size(), 5u);
+    EXPECT_EQ(commands[6].Option("sender")->value, "0");
 }
 
 TEST(ScenarioParser, ErrorsNameTheirLine) {
@@ -80,40 +90,20 @@ TEST(ScenarioParser, ErrorsNameTheirLine) {
     }
 }
 
-TEST(ScenarioParser, OptionalAndRepeatedArguments) {
-    const auto commands = Parse(
-        "conference type=3\n"
-        "privilege 0x10047\n"
-        "privilege 71 ann bob carl\n"
-        "host node=9\n"
-        "select ann node=7\n"
-        "expect ann menu \"Host\" \"-\" \"*All Participants\"\n"
-        "inject ann bytes \"<x/>\"\n"
-        "inject ann private bob \"hi\" sender=0\n");
-    ASSERT_EQ(commands.size(), 8u);
-    EXPECT_EQ(commands[1].Positional().size(), 1u);
-    EXPECT_EQ(commands[2].Positional().size(), 4u);
-    EXPECT_EQ(commands[3].Positional().size(), 0u);
-    EXPECT_EQ(commands[5].Positional().size(), 5u);
-    EXPECT_EQ(commands[7].Option("sender")->value, "0");
-}
-
 TEST(ScenarioParser, Numbers) {
     const struct {
         const char* text;
         std::optional<std::uint32_t> value;
-    } cases[] = {
-        {"0", 0u},
-        {"42", 42u},
-        {"0x10047", 0x10047u},
-        {"0XfF", 0xFFu},
-        {"4294967295", 0xFFFFFFFFu},
-        {"4294967296", std::nullopt},
-        {"0x", std::nullopt},
-        {"-1", std::nullopt},
-        {"12a", std::nullopt},
-        {"", std::nullopt},
-    };
+    } cases[] = {{"0", 0u},
+                 {"42", 42u},
+                 {"0x10047", 0x10047u},
+                 {"0XfF", 0xFFu},
+                 {"4294967295", 0xFFFFFFFFu},
+                 {"4294967296", std::nullopt},
+                 {"0x", std::nullopt},
+                 {"-1", std::nullopt},
+                 {"12a", std::nullopt},
+                 {"", std::nullopt}};
     for (const auto& c : cases)
         EXPECT_EQ(ParseScenarioNumber(c.text), c.value) << c.text;
 }

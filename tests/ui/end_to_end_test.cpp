@@ -1,22 +1,15 @@
 // Components with their real Qt windows on the in-process conference: a user types and
-// sends, the others see the line; pictures of the windows are saved under the build folder.
-#include <gtest/gtest.h>
-
-#include <QApplication>
+// sends, the other sees the line; pictures of the windows are saved under the build folder.
 #include <QDir>
-#include <QElapsedTimer>
 #include <QTest>
 #include <QTextDocument>
 
 #include "api/quintarachat.h"
 #include "engine/chat_client.h"
 #include "platform/inproc_conference.h"
-#include "ui/chat_menu_item.h"
-#include "ui/chat_popup_button.h"
+#include "tests/ui/window_fixture.h"
 #include "ui/chat_select_attd_control.h"
 #include "ui/chat_text_view.h"
-#include "ui/kvo_text_field.h"
-#include "ui/my_chat_controller.h"
 #include "ui/qt_host.h"
 #include "ui/qt_run_loop.h"
 
@@ -24,16 +17,6 @@ namespace {
 
 constexpr std::uint32_t kHana = 11;
 constexpr std::uint32_t kAnn = 22;
-constexpr std::uint32_t kMax = 33;
-
-template <typename Done>
-bool RunUntil(Done done) {
-    QElapsedTimer clock;
-    clock.start();
-    while (!done() && clock.elapsed() < 6000)
-        QApplication::processEvents(QEventLoop::AllEvents, 5);
-    return done();
-}
 
 struct Participant {
     QWidget view;
@@ -43,8 +26,10 @@ struct Participant {
 
 class EndToEnd : public testing::Test {
 protected:
+    // Only the library's own window is wanted, so the default factory is the one replaced:
+    // an installed factory, even an empty one, would hide the default from later tests.
     EndToEnd() {
-        SetChatWindowFactory([this] {
+        SetDefaultChatWindowFactory([this] {
             IChatWindow* window = MakeQtChatWindow();
             made = static_cast<MyChatController*>(window);
             return window;
@@ -53,7 +38,7 @@ protected:
     ~EndToEnd() override {
         for (auto& p : people)
             ChDeleteInstance(p->handle);
-        SetChatWindowFactory(nullptr);
+        SetDefaultChatWindowFactory(nullptr);
     }
 
     Participant& Join(const char* name, std::uint32_t node, std::uint32_t roles) {
@@ -81,13 +66,6 @@ protected:
         return p.window->textView()->document()->toPlainText().toStdString();
     }
 
-    static int Row(const Participant& p, const QString& text) {
-        ChatPopUpButton* popup = p.window->userlist();
-        for (int i = 0; i < popup->numberOfItems(); ++i)
-            if (popup->itemAtIndex(i)->text() == text) return i;
-        return -1;
-    }
-
     static void Save(QWidget* widget, const char* name) {
         QDir().mkpath(QC_UI_PICTURE_DIR);
         EXPECT_TRUE(widget->grab().save(QString(QC_UI_PICTURE_DIR "/%1.png").arg(name)));
@@ -103,7 +81,6 @@ protected:
 TEST_F(EndToEnd, TypedLineReachesEveryWindow) {
     Participant& hana = Join("Hana", kHana, ROLE_HOST);
     Participant& ann = Join("Ann", kAnn, 0);
-    Participant& max = Join("Max", kMax, 0);
     for (auto& p : people)
         ChSetHost(p->handle, kHana);
     // Enrolment, caches and the start-up ticks that apply the privileges.
@@ -127,10 +104,7 @@ TEST_F(EndToEnd, TypedLineReachesEveryWindow) {
     QTest::keyClick(hana.window->editView(), Qt::Key_Return);
 
     const std::string line = "Hello from Hana, see www.example.com";
-    ASSERT_TRUE(RunUntil([&] {
-        return Transcript(ann).find(line) != std::string::npos &&
-               Transcript(max).find(line) != std::string::npos;
-    }));
+    ASSERT_TRUE(RunUntil([&] { return Transcript(ann).find(line) != std::string::npos; }));
     EXPECT_NE(Transcript(hana).find(line), std::string::npos);
     EXPECT_NE(Transcript(ann).find("from Hana to All Participants"), std::string::npos);
     EXPECT_TRUE(hana.window->editView()->toPlainText().isEmpty());
@@ -148,7 +122,7 @@ TEST_F(EndToEnd, TypedLineReachesEveryWindow) {
     hana.window->popAttendeeList(popup);
     ASSERT_TRUE(RunUntil([] {
         return ChatSelectAttdControl::instance() &&
-               ChatSelectAttdControl::instance()->dataSource()->numberOfRowsInTableView() == 2;
+               ChatSelectAttdControl::instance()->dataSource()->numberOfRowsInTableView() == 1;
     }));
     Save(ChatSelectAttdControl::instance(), "attendee_picker");
     ChatSelectAttdControl::instance()->Close();

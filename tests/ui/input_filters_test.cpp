@@ -29,7 +29,7 @@ TEST(MaxFilter, BeepsAtTheLimitAndCutsWholeCharacters) {
     EXPECT_TRUE(filter.stringForObjectValue(QVariant(5)).isNull());
 }
 
-TEST(NumberFilter, AcceptsDigitsUpToTheLimit) {
+TEST(NumberFilter, AcceptsDigitsUpToTheLimitWithoutOverflow) {
     int beeps = 0;
     NumberFilter filter;
     filter.setMaxnumber(100);
@@ -46,13 +46,10 @@ TEST(NumberFilter, AcceptsDigitsUpToTheLimit) {
         rejected += c.valid ? 0 : 1;
     }
     EXPECT_EQ(beeps, rejected);
-}
 
-TEST(NumberFilter, ValuesOfLongDigitStringsDoNotOverflow) {
-    NumberFilter filter;
+    // Long digit strings do not overflow, in checks or in values.
     filter.setMaxnumber(INT_MAX);
     EXPECT_TRUE(filter.isPartialStringValid("2147483647"));
-    filter.setBeeper([] {});
     EXPECT_FALSE(filter.isPartialStringValid("2147483648"));
     EXPECT_EQ(filter.getObjectValue("42abc"), 42);
     EXPECT_EQ(filter.getObjectValue("abc"), 0);

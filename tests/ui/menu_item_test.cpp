@@ -12,12 +12,18 @@ float Width(const ChatMenuItem& item) {
     return static_cast<float>(QFontMetricsF(item.font()).horizontalAdvance(item.text()));
 }
 
-TEST(ChatMenuItem, TitleThatFitsIsShownWhole) {
+// A title that fits is shown whole, in the colour of the item's state at the last compression.
+TEST(ChatMenuItem, TitleThatFitsIsShownWholeInTheColourOfItsState) {
     ChatMenuItem item("Ann", ChatItemAction::Select);
     item.compressTitlewithWidth(300);
     EXPECT_EQ(item.text(), "Ann");
     EXPECT_FALSE(item.isCompressed());
     EXPECT_TRUE(item.toolTip().isEmpty());
+    EXPECT_EQ(item.foreground().color(), QColor(Qt::black));
+    item.setEnabled(false);
+    EXPECT_EQ(item.foreground().color(), QColor(Qt::black));
+    item.compressTitlewithWidth(300);
+    EXPECT_EQ(item.foreground().color(), QColor(Qt::gray));
 }
 
 TEST(ChatMenuItem, LongTitleIsShortenedWithAnEllipsisToFit) {
@@ -61,15 +67,6 @@ TEST(ChatMenuItem, SuffixWithACommaIsCutAtTheCommaAndTheNameShortened) {
     EXPECT_EQ(base, "a (b)");
     EXPECT_EQ(suffix, " (c, d)");
     EXPECT_FALSE(SplitTitleSuffix("plain", &base, &suffix));
-}
-
-TEST(ChatMenuItem, ColourFollowsTheEnabledStateAtTheNextCompression) {
-    ChatMenuItem item("Bob", ChatItemAction::Select);
-    item.compressTitlewithWidth(200);
-    EXPECT_EQ(item.foreground().color(), QColor(Qt::black));
-    item.setEnabled(false);
-    item.compressTitlewithWidth(200);
-    EXPECT_EQ(item.foreground().color(), QColor(Qt::gray));
 }
 
 TEST(ChatMenuItem, SurrogatePairsAreNeverSplit) {

@@ -2,9 +2,7 @@
 #include <gtest/gtest.h>
 
 #include <QApplication>
-#include <QDataStream>
 #include <QDir>
-#include <QElapsedTimer>
 #include <QFileDialog>
 #include <QFileInfo>
 #include <QMessageBox>
@@ -21,15 +19,6 @@
 #include "ui/warning_box.h"
 
 namespace {
-
-// Runs Qt events until done() or about two seconds passed.
-template <typename Done>
-void RunUntil(Done done) {
-    QElapsedTimer clock;
-    clock.start();
-    while (!done() && clock.elapsed() < 2000)
-        QApplication::processEvents(QEventLoop::AllEvents, 5);
-}
 
 TEST(QtRunLoop, PostsFromAnyThreadRunLaterOnTheLoopThread) {
     QtRunLoop loop;
@@ -107,28 +96,10 @@ TEST_F(WindowTest, SavePanelRunsUntilConfirmedOrAbortedByTheEngine) {
     EXPECT_EQ(QFileInfo(QString::fromStdString(path)).fileName(), "Chat.txt");
 }
 
-}  // namespace
-
-namespace {
-
-// A short silent mono WAV file at path.
-void WriteSilentWav(const QString& path) {
+void WriteFile(const QString& path, const QByteArray& bytes) {
     QFile file(path);
     ASSERT_TRUE(file.open(QIODevice::WriteOnly));
-    const quint32 samples = 800;
-    QByteArray data;
-    QDataStream out(&data, QIODevice::WriteOnly);
-    out.setByteOrder(QDataStream::LittleEndian);
-    out.writeRawData("RIFF", 4);
-    out << quint32(36 + samples * 2);
-    out.writeRawData("WAVEfmt ", 8);
-    out << quint32(16) << quint16(1) << quint16(1) << quint32(8000) << quint32(16000) << quint16(2)
-        << quint16(16);
-    out.writeRawData("data", 4);
-    out << quint32(samples * 2);
-    for (quint32 i = 0; i < samples; ++i)
-        out << qint16(0);
-    file.write(data);
+    file.write(bytes);
 }
 
 TEST(QtSound, PlaysWavFilesAndRefusesTheRestWithALogLine) {
@@ -138,11 +109,12 @@ TEST(QtSound, PlaysWavFilesAndRefusesTheRestWithALogLine) {
     });
     const QString dir = QDir::tempPath() + "/quintara-sound-test";
     QDir().mkpath(dir);
-    WriteSilentWav(dir + "/ding.wav");
-    QFile text(dir + "/notes.txt");
-    ASSERT_TRUE(text.open(QIODevice::WriteOnly));
-    text.write("not a sound");
-    text.close();
+    // A short silent WAV file: 800 samples, mono, 16 bits at 8000 Hz.
+    WriteFile(dir + "/ding.wav",
+              QByteArray::fromHex("524946466406000057415645666d74201000000001000100401f0000803e0000"
+                                  "020010006461746140060000") +
+                  QByteArray(1600, '\0'));
+    WriteFile(dir + "/notes.txt", "not a sound");
 
     // No audio device is needed: playing is asked for and nothing fails.
     InstallQtSoundPlayer();

@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <QApplication>
+#include <QElapsedTimer>
 #include <QWidget>
 #include <memory>
 #include <string>
@@ -28,6 +29,16 @@ inline MenuStatus SeparatorEntry(const std::string& title = "") {
     MenuStatus entry = Entry(title);
     entry.bSeparator = true;
     return entry;
+}
+
+// Runs Qt events until done() holds or about six seconds passed; whether it holds.
+template <typename Done>
+bool RunUntil(Done done) {
+    QElapsedTimer clock;
+    clock.start();
+    while (!done() && clock.elapsed() < 6000)
+        QApplication::processEvents(QEventLoop::AllEvents, 5);
+    return done();
 }
 
 class WindowTest : public testing::Test {
