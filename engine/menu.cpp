@@ -107,7 +107,10 @@ void CChatClient::InsertChatUserName(const char* name, std::uint32_t nodeId, int
         const int position =
             m_dwMeetingType == 3 ? PanelAttendeeInsertPosition(text) : AttendeeInsertPosition(text);
         AnnounceInsertedUser(entry, position, bSelect, selectedWasDisabled);
-    } else if (!m_bQMMode) {
+    } else if (!m_bQMMode && (privileged || m_bChatPanelists)) {
+        // An attendee reaches panelists, presenters and hosts by name only with the panelist
+        // privilege: the privilege re-application erases such entries without it, so one must
+        // not appear just because its holder joined later.
         MacInfoTrace2(kChatTag, "CChatClient::InsertChatUserName : bPanelist");
         entry.bPanelist = true;
         const int panelists = GetIndexOfMenuByGroup(GROUP_PANELISTS);

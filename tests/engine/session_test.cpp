@@ -198,7 +198,9 @@ TEST_F(SessionTest, AlreadyConnectedOrJoinedGoesOnWithinTheSameCall) {
         EXPECT_EQ(Prefix(spy.Calls(), chain.size()), chain);
         EXPECT_TRUE(
             capture.Has("CChatClient::already connected, now call ConnectConfirm() myself"));
-        if (joined) EXPECT_EQ(engine.State(), kStateAttaching);
+        if (joined) {
+            EXPECT_EQ(engine.State(), kStateAttaching);
+        }
         loop.RunUntilIdle();
         EXPECT_EQ(engine.State(), kStateEnrolled);
     }
