@@ -2,34 +2,9 @@
 #include <cstdio>
 
 #include "engine/chat_client.h"
+#include "sim/lang/scenario_notation.h"
 #include "sim/simulator.h"
 #include "sim/transcript_view.h"
-
-namespace {
-
-std::string Quoted(const std::string& text) {
-    std::string out = "\"";
-    for (const char ch : text) {
-        if (ch == '\n') {
-            out += "\\n";
-        } else if (ch == '\r') {
-            out += "\\r";
-        } else {
-            if (ch == '"' || ch == '\\') out += '\\';
-            out += ch;
-        }
-    }
-    return out + "\"";
-}
-
-std::string Joined(const std::vector<std::string>& items) {
-    std::string out;
-    for (const std::string& item : items)
-        out += (out.empty() ? "" : " ") + Quoted(item);
-    return out.empty() ? "(nothing)" : out;
-}
-
-}  // namespace
 
 void Simulator::Expect(const ScenarioCommand& c) {
     const auto args = c.Positional();
@@ -53,16 +28,16 @@ void Simulator::Expect(const ScenarioCommand& c) {
         } else {
             const TranscriptEntry entry = ReadTranscriptEntry(store, lines - 1);
             if (entry.title != title || entry.text != text)
-                Fail(c, p->name + "'s newest line is " + Quoted(entry.title) + " " +
-                            Quoted(entry.text));
+                Fail(c, p->name + "'s newest line is " + QuotedScenarioText(entry.title) + " " +
+                            QuotedScenarioText(entry.text));
         }
     } else if (kind == "no-new-lines") {
         if (!needArgs(0)) return;
         if (lines != p->linesSeen) {
             const TranscriptEntry entry = ReadTranscriptEntry(store, lines - 1);
             Fail(c, p->name + " got " + std::to_string(lines - p->linesSeen) +
-                        " new line(s), the newest " + Quoted(entry.title) + " " +
-                        Quoted(entry.text));
+                        " new line(s), the newest " + QuotedScenarioText(entry.title) + " " +
+                        QuotedScenarioText(entry.text));
         }
     } else if (kind == "menu") {
         std::vector<std::string> expected;
@@ -72,10 +47,11 @@ void Simulator::Expect(const ScenarioCommand& c) {
         for (const std::string& item : expected)
             if (item != "?") modelExpected.push_back(item);
         const std::vector<std::string> model = EngineMenu(Engine(*p));
-        if (model != modelExpected) Fail(c, p->name + "'s send-to list is " + Joined(model));
+        if (model != modelExpected)
+            Fail(c, p->name + "'s send-to list is " + QuotedScenarioList(model));
         if (p->window) {
             const std::vector<std::string> popup = PopupMenu(*p->window);
-            if (popup != expected) Fail(c, p->name + "'s popup shows " + Joined(popup));
+            if (popup != expected) Fail(c, p->name + "'s popup shows " + QuotedScenarioList(popup));
         }
     } else if (kind == "input") {
         if (!needArgs(1)) return;
@@ -88,13 +64,13 @@ void Simulator::Expect(const ScenarioCommand& c) {
     } else if (kind == "input-text") {
         if (!needArgs(1)) return;
         const std::string text = p->window ? p->window->InputText() : "";
-        if (text != args[2]->value) Fail(c, p->name + "'s input holds " + Quoted(text));
+        if (text != args[2]->value) Fail(c, p->name + "'s input holds " + QuotedScenarioText(text));
     } else if (kind == "warning") {
         if (!needArgs(1)) return;
         if (p->warnings.empty()) {
             Fail(c, p->name + " saw no warning");
         } else if (p->warnings.back() != args[2]->value) {
-            Fail(c, p->name + "'s newest warning is " + Quoted(p->warnings.back()));
+            Fail(c, p->name + "'s newest warning is " + QuotedScenarioText(p->warnings.back()));
         }
         p->warnings.clear();
     } else if (kind == "sound") {

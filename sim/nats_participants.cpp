@@ -3,7 +3,7 @@
 #include <fstream>
 #include <sstream>
 
-#include "netconf/conference_subjects.h"
+#include "netconf/conference_credentials.h"
 #include "netconf/nats_arm_client.h"
 
 bool ReadSimCredentials(const std::string& path, std::map<std::string, std::string>* passwords,
@@ -13,20 +13,15 @@ bool ReadSimCredentials(const std::string& path, std::map<std::string, std::stri
         *error = path + ": cannot read the credentials";
         return false;
     }
-    std::string line;
-    for (int number = 1; std::getline(file, line); ++number) {
-        const std::size_t comment = line.find('#');
-        if (comment != std::string::npos) line.erase(comment);
-        std::istringstream words(line);
-        std::string user, password, extra;
-        if (!(words >> user)) continue;
-        if (!(words >> password) || (words >> extra) || !IsValidConferenceUser(user)) {
-            *error =
-                path + ":" + std::to_string(number) + ": a line takes a user name and a password";
-            return false;
-        }
-        (*passwords)[user] = password;
+    std::stringstream text;
+    text << file.rdbuf();
+    std::vector<ConferenceCredential> pairs;
+    if (!ParseConferenceCredentials(text.str(), &pairs, error)) {
+        *error = path + ": " + *error;
+        return false;
     }
+    for (const ConferenceCredential& pair : pairs)
+        (*passwords)[pair.user] = pair.password;
     return true;
 }
 

@@ -1,14 +1,10 @@
 // Showing a participant: its transcript and its send-to list.
 #include "engine/chat_client.h"
+#include "sim/lang/scenario_notation.h"
 #include "sim/simulator.h"
 #include "sim/transcript_view.h"
 
 namespace {
-
-std::string Notation(const std::string& title, bool separator, bool selected, bool enabled) {
-    if (separator) return "-";
-    return std::string(selected ? "*" : "") + (enabled ? "" : "~") + title;
-}
 
 // A text's line breaks as continuation lines under the text's column.
 std::string Indented(const std::string& text, std::size_t column) {
@@ -28,17 +24,18 @@ std::string Indented(const std::string& text, std::size_t column) {
 std::vector<std::string> Simulator::EngineMenu(const CChatClient& engine) {
     std::vector<std::string> items;
     for (const MenuStatus& entry : engine.Menu())
-        items.push_back(Notation(entry.strTitle, entry.bSeparator && entry.strTitle.empty(),
-                                 entry.bSelected, entry.bEnabled));
+        items.push_back(MenuEntryNotation(entry.strTitle,
+                                          entry.bSeparator && entry.strTitle.empty(),
+                                          entry.bSelected, entry.bEnabled));
     return items;
 }
 
 std::vector<std::string> Simulator::PopupMenu(const SimWindow& window) {
     std::vector<std::string> items;
     for (const PopupItem& item : window.Popup())
-        items.push_back(item.placeholder
-                            ? "?"
-                            : Notation(item.title, item.separator, item.selected, item.enabled));
+        items.push_back(item.placeholder ? "?"
+                                         : MenuEntryNotation(item.title, item.separator,
+                                                             item.selected, item.enabled));
     return items;
 }
 

@@ -6,7 +6,7 @@
 #include <fstream>
 #include <sstream>
 
-#include "netconf/conference_subjects.h"
+#include "netconf/conference_credentials.h"
 
 namespace {
 
@@ -94,30 +94,17 @@ bool ParseDesktopOptions(int argc, const char* const* argv, DesktopOptions* out,
 }
 
 bool ParseCredentials(const std::string& text, DesktopCredentials* out, std::string* error) {
-    DesktopCredentials creds;
-    std::istringstream lines(text);
-    std::string line;
-    for (int number = 1; std::getline(lines, line); ++number) {
-        const std::size_t comment = line.find('#');
-        if (comment != std::string::npos) line.erase(comment);
-        std::istringstream words(line);
-        std::string user, password, extra;
-        if (!(words >> user)) continue;
-        if (!(words >> password) || (words >> extra) || !IsValidConferenceUser(user)) {
-            *error = "line " + std::to_string(number) + ": a line takes a user name and a password";
-            return false;
-        }
-        if (!creds.user.empty()) {
-            *error = "line " + std::to_string(number) + ": one participant, one user";
-            return false;
-        }
-        creds = {user, password};
+    std::vector<ConferenceCredential> pairs;
+    if (!ParseConferenceCredentials(text, &pairs, error)) return false;
+    if (pairs.size() > 1) {
+        *error = "line " + std::to_string(pairs[1].line) + ": one participant, one user";
+        return false;
     }
-    if (creds.user.empty()) {
+    if (pairs.empty()) {
         *error = "no user name and password";
         return false;
     }
-    *out = creds;
+    *out = {pairs[0].user, pairs[0].password};
     return true;
 }
 

@@ -9,6 +9,7 @@
 #include "engine/chat_client.h"
 #include "platform/sound.h"
 #include "platform/warning_window.h"
+#include "sim/lang/scenario_notation.h"
 #include "ui/attd_data_source.h"
 #include "ui/chat_menu_item.h"
 #include "ui/chat_popup_button.h"
@@ -47,31 +48,6 @@ bool ParseRoles(const std::string& text, std::uint32_t* out) {
     }
     *out = roles;
     return true;
-}
-
-std::string Quoted(const std::string& text) {
-    std::string out = "\"";
-    for (const char ch : text) {
-        if (ch == '\n' || ch == '\r') {
-            out += ch == '\n' ? "\\n" : "\\r";
-            continue;
-        }
-        if (ch == '"' || ch == '\\') out += '\\';
-        out += ch;
-    }
-    return out + "\"";
-}
-
-std::string Joined(const std::vector<std::string>& items) {
-    std::string out;
-    for (const std::string& item : items)
-        out += (out.empty() ? "" : " ") + Quoted(item);
-    return out.empty() ? "(nothing)" : out;
-}
-
-std::string Notation(const std::string& title, bool separator, bool selected, bool enabled) {
-    if (separator) return "-";
-    return std::string(selected ? "*" : "") + (enabled ? "" : "~") + title;
 }
 
 // The transcript entry at index: its title without ":" and CR, its text with \n line breaks.
@@ -315,7 +291,8 @@ void DesktopScript::Expect(const ScenarioCommand& c) {
         if (store.GetLineCount() != m_linesSeen) {
             const auto [title, text] = Entry(store, store.GetLineCount() - 1);
             Fail(c, "me got " + std::to_string(store.GetLineCount() - m_linesSeen) +
-                        " new line(s), the newest " + Quoted(title) + " " + Quoted(text));
+                        " new line(s), the newest " + QuotedScenarioText(title) + " " +
+                        QuotedScenarioText(text));
         }
         m_linesSeen = store.GetLineCount();
         return;
@@ -340,7 +317,7 @@ void DesktopScript::Print() {
         const auto [title, text] = Entry(store, i);
         std::fprintf(m_out, "  %s:\n    %s\n", title.c_str(), text.c_str());
     }
-    std::fprintf(m_out, "  send-to list: %s\n", Joined(EngineMenu()).c_str());
+    std::fprintf(m_out, "  send-to list: %s\n", QuotedScenarioList(EngineMenu()).c_str());
     m_linesSeen = store.GetLineCount();
 }
 
@@ -359,7 +336,7 @@ std::string DesktopScript::CheckLine(const ScenarioCommand& c) {
         return "";
     }
     const auto [title, text] = Entry(store, store.GetLineCount() - 1);
-    return "me's newest line is " + Quoted(title) + " " + Quoted(text);
+    return "me's newest line is " + QuotedScenarioText(title) + " " + QuotedScenarioText(text);
 }
 
 std::string DesktopScript::CheckMenu(const ScenarioCommand& c) {
@@ -371,9 +348,9 @@ std::string DesktopScript::CheckMenu(const ScenarioCommand& c) {
         if (args[i]->value != "?") modelExpected.push_back(args[i]->value);
     }
     const std::vector<std::string> model = EngineMenu();
-    if (model != modelExpected) return "me's send-to list is " + Joined(model);
+    if (model != modelExpected) return "me's send-to list is " + QuotedScenarioList(model);
     const std::vector<std::string> popup = PopupMenu();
-    if (popup != expected) return "me's popup shows " + Joined(popup);
+    if (popup != expected) return "me's popup shows " + QuotedScenarioList(popup);
     return "";
 }
 
@@ -388,13 +365,13 @@ std::string DesktopScript::CheckInputText(const ScenarioCommand& c) {
     const std::string text =
         m_me.Window() ? m_me.Window()->editView()->toPlainText().toStdString() : "";
     if (text == c.Positional()[2]->value) return "";
-    return "me's input holds " + Quoted(text);
+    return "me's input holds " + QuotedScenarioText(text);
 }
 
 std::string DesktopScript::CheckWarning(const ScenarioCommand& c) {
     if (m_warnings.empty()) return "me saw no warning";
     if (m_warnings.back() == c.Positional()[2]->value) return "";
-    return "me's newest warning is " + Quoted(m_warnings.back());
+    return "me's newest warning is " + QuotedScenarioText(m_warnings.back());
 }
 
 std::string DesktopScript::CheckSound(const ScenarioCommand& c) {
@@ -406,7 +383,7 @@ std::string DesktopScript::CheckSound(const ScenarioCommand& c) {
 std::string DesktopScript::SelectableNow(const ScenarioCommand& c) {
     const int index = SelectIndex(c);
     if (index == -2) return "\"" + c.Positional()[1]->value + "\" appears twice; select by node=";
-    if (index < 0) return "no such item in me's popup: " + Joined(PopupMenu());
+    if (index < 0) return "no such item in me's popup: " + QuotedScenarioList(PopupMenu());
     const ChatPopUpButton* button = m_me.Window()->userlist();
     if (!button->isEnabled() || !button->itemAtIndex(index)->isEnabled())
         return "the item is disabled in me's popup";
@@ -445,8 +422,9 @@ int DesktopScript::SelectIndex(const ScenarioCommand& c) const {
 std::vector<std::string> DesktopScript::EngineMenu() const {
     std::vector<std::string> items;
     for (const MenuStatus& entry : m_me.Engine().Menu())
-        items.push_back(Notation(entry.strTitle, entry.bSeparator && entry.strTitle.empty(),
-                                 entry.bSelected, entry.bEnabled));
+        items.push_back(MenuEntryNotation(entry.strTitle,
+                                          entry.bSeparator && entry.strTitle.empty(),
+                                          entry.bSelected, entry.bEnabled));
     return items;
 }
 
@@ -464,8 +442,8 @@ std::vector<std::string> DesktopScript::PopupMenu() const {
             items.push_back("?");
             continue;
         }
-        items.push_back(Notation(title.toStdString(), separator, i == button->currentIndex(),
-                                 row->isEnabled()));
+        items.push_back(MenuEntryNotation(title.toStdString(), separator,
+                                          i == button->currentIndex(), row->isEnabled()));
     }
     return items;
 }
