@@ -595,6 +595,7 @@ private:
     int m_nPrivilegeCountdown = 0;    // 0 idle; else counts ticks up to 10
     int m_bPrivilegePending = 0;      // from Initialize until the countdown fires
     int m_nStartupTicks = 0;          // 1..20 after Initialize, then 0
+    bool m_bAudienceChosen = false;   // the user picked another send-to entry in the window
     int m_bEnrolled = 0;              // an enroll confirmation arrived
     int m_bRostersPending = 0;        // roles changed before enrolment
     int m_bInitCaches = 0;            // this participant initialises the caches

@@ -100,6 +100,9 @@ int CChatClient::HandleUIMessage(int message, void* iParam, void*) {
             const bool valid = index >= 0 && index < static_cast<int>(m_MenuStatus.size());
             if (valid && m_MenuStatus[index].nGroupID == static_cast<int>(GROUP_EVERYONE))
                 SendTelemetryActionByID(kTelemetryEveryoneSelected);
+            // The window also reports the selections the engine makes; only a report of an
+            // entry other than the engine's own selected one is the user's choice.
+            if (valid && !m_MenuStatus[index].bSelected) m_bAudienceChosen = true;
             for (std::size_t i = 0; i < m_MenuStatus.size(); ++i)
                 m_MenuStatus.SetSelected(i, static_cast<int>(i) == index);
             return 0;

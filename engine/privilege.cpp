@@ -57,7 +57,9 @@ void CChatClient::OnPrivilegeChanged(std::uint32_t privilege, int bForce) {
     const bool startupWindow = m_nStartupTicks >= 1 && m_nStartupTicks <= 19;
     const bool countdown = m_nPrivilegeCountdown != 0 && m_bPrivilegePending;
     const int everyoneNow = GetIndexOfMenuByGroup(GROUP_EVERYONE);
-    if (((bForce && startupWindow) || countdown) && everyoneNow != -1 &&
+    // The start-up leans towards everyone only until the user has chosen an audience: a
+    // private question asked in the first seconds must not go to all participants.
+    if (((bForce && startupWindow) || countdown) && !m_bAudienceChosen && everyoneNow != -1 &&
         m_MenuStatus[everyoneNow].bEnabled) {
         SelectMenuItemByIndex(everyoneNow);
         if (bForce && startupWindow) m_nStartupTicks = 0;
