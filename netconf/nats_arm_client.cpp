@@ -6,16 +6,13 @@
 #include <utility>
 
 #include "netconf/netconf_results.h"
+#include "platform/conference_arguments.h"
 #include "platform/conference_results.h"
 #include "platform/run_loop.h"
 #include "platform/trace.h"
 
 namespace {
 
-constexpr int kSendOptionCode = -200;
-constexpr char kSessionResourceName[] = "c_session_id";
-constexpr std::uint16_t kResourceRefused = 1;
-constexpr std::uint32_t kMaxEntries = 4096;
 constexpr auto kTickInterval = std::chrono::milliseconds(500);
 
 std::uint64_t RandomInstance() {
@@ -164,12 +161,9 @@ int NatsArmClient::ApeEnroll(std::uint32_t apeHandle, int enroll, std::uint32_t 
                              std::uint32_t, int resourceCount, ARMSessionResource* resources,
                              const void* enrollInfo, std::uint32_t enrollInfoLength, int) {
     if (!IsAttached(apeHandle)) return kArmBadApeHandle;
-    if (resourceCount < 0 || static_cast<std::uint32_t>(resourceCount) > kMaxEntries ||
-        (resourceCount > 0 && resources == nullptr) ||
-        (enrollInfo == nullptr && enrollInfoLength > 0)) {
-        return kArmInvalidArgument;
-    }
-    if (enrollInfoLength > kArmMaxDataLength) return kArmTooLarge;
+    if (const int refusal =
+            CheckEnrollArguments(resourceCount, resources, enrollInfo, enrollInfoLength))
+        return refusal;
     IArmApeSink* const sink = m_pApeSink;
     const std::uint32_t ape = m_apeHandle;
     auto answer = std::make_shared<EnrollAnswer>();
@@ -289,9 +283,7 @@ int NatsArmClient::RegisterSharedDataSink(std::uint32_t apeHandle, IArmSharedDat
 int NatsArmClient::AllocNameHandle(std::uint32_t apeHandle, std::uint32_t count,
                                    NameHandle* entries, IArmAllocHandleSink* sink) {
     if (!IsAttached(apeHandle)) return kArmBadApeHandle;
-    if (sink == nullptr || count > kMaxEntries || (count > 0 && entries == nullptr)) {
-        return kArmInvalidArgument;
-    }
+    if (const int refusal = CheckNameHandleArguments(count, entries, sink)) return refusal;
     auto answer = std::make_shared<std::vector<NameHandle>>(entries, entries + count);
     const std::uint32_t ape = m_apeHandle;
     const std::uint32_t epoch = Epoch(Stage::Ape);

@@ -5,6 +5,7 @@
 
 #include "netconf/nats_arm_client.h"
 #include "netconf/netconf_results.h"
+#include "platform/conference_arguments.h"
 #include "platform/conference_results.h"
 
 namespace {
@@ -25,15 +26,8 @@ int NatsArmClient::ApeSharedDataActionEx(std::uint32_t apeHandle, std::uint32_t 
                                          std::uint32_t, int confirm) {
     if (!IsAttached(apeHandle)) return kArmBadApeHandle;
     if (cacheHandle == 0) return kArmUnknownHandle;
-    if (action != CACHE_SET && action != CACHE_APPEND) return kArmInvalidArgument;
     Bytes data;
-    if (memHandle != 0) {
-        const std::vector<std::uint8_t>* block = m_memory.Find(memHandle);
-        if (block == nullptr) return kArmUnknownHandle;
-        data = std::make_shared<const std::vector<std::uint8_t>>(*block);
-    } else if (action == CACHE_APPEND) {
-        return kArmInvalidArgument;  // an item needs bytes
-    }
+    if (const int refusal = CacheActionBytes(action, memHandle, m_memory, &data)) return refusal;
     IArmApeSink* const sink = m_pApeSink;
     const std::uint32_t ape = m_apeHandle;
     const std::uint32_t requestIdx = ++m_lastRequestIdx;

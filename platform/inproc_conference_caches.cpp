@@ -1,6 +1,7 @@
 // The shared-data caches and memory handles of one participant's service object.
 #include <utility>
 
+#include "platform/conference_arguments.h"
 #include "platform/conference_results.h"
 #include "platform/inproc_conference.h"
 #include "platform/inproc_conference_client.h"
@@ -13,15 +14,8 @@ int InProcessArmClient::ApeSharedDataActionEx(std::uint32_t apeHandle, std::uint
     if (!IsAttached(apeHandle)) return kArmBadApeHandle;
     ConferenceCache* const cache = m_conference.FindCache(cacheHandle);
     if (cache == nullptr) return kArmUnknownHandle;
-    if (action != CACHE_SET && action != CACHE_APPEND) return kArmInvalidArgument;
     Bytes data;
-    if (memHandle != 0) {
-        const std::vector<std::uint8_t>* block = m_memory.Find(memHandle);
-        if (block == nullptr) return kArmUnknownHandle;
-        data = std::make_shared<const std::vector<std::uint8_t>>(*block);
-    } else if (action == CACHE_APPEND) {
-        return kArmInvalidArgument;  // an item needs bytes
-    }
+    if (const int refusal = CacheActionBytes(action, memHandle, m_memory, &data)) return refusal;
 
     const short result = ConfirmResult(ArmConfirmation::ApeCacheActionConfirmEx);
     const std::uint32_t requestIdx = ++m_lastRequestIdx;

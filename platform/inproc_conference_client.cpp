@@ -5,20 +5,12 @@
 #include <string>
 #include <utility>
 
+#include "platform/conference_arguments.h"
 #include "platform/conference_results.h"
 #include "platform/inproc_conference.h"
 #include "platform/run_loop.h"
 
 namespace {
-
-// The option code SetSendOption takes for the next send's option.
-constexpr int kSendOptionCode = -200;
-// The session resource every enroller is granted.
-constexpr char kSessionResourceName[] = "c_session_id";
-// Resource status of a resource that was not granted.
-constexpr std::uint16_t kResourceRefused = 1;
-// Most entries one request may carry.
-constexpr std::uint32_t kMaxEntries = 4096;
 
 // The answer of one enroll: copies of the resources, pointing at copies of their names.
 struct EnrollAnswer {
@@ -142,12 +134,9 @@ int InProcessArmClient::ApeEnroll(std::uint32_t apeHandle, int enroll, std::uint
                                   const void* enrollInfo, std::uint32_t enrollInfoLength, int) {
     if (const auto fault = Fault(ArmOperation::ApeEnroll)) return *fault;
     if (!IsAttached(apeHandle)) return kArmBadApeHandle;
-    if (resourceCount < 0 || static_cast<std::uint32_t>(resourceCount) > kMaxEntries ||
-        (resourceCount > 0 && resources == nullptr) ||
-        (enrollInfo == nullptr && enrollInfoLength > 0)) {
-        return kArmInvalidArgument;
-    }
-    if (enrollInfoLength > kArmMaxDataLength) return kArmTooLarge;
+    if (const int refusal =
+            CheckEnrollArguments(resourceCount, resources, enrollInfo, enrollInfoLength))
+        return refusal;
     IArmApeSink* const sink = m_pApeSink;
     const std::uint32_t ape = m_apeHandle;
     if (enroll == 0) {
@@ -220,9 +209,7 @@ int InProcessArmClient::AllocNameHandle(std::uint32_t apeHandle, std::uint32_t c
                                         NameHandle* entries, IArmAllocHandleSink* sink) {
     if (const auto fault = Fault(ArmOperation::AllocNameHandle)) return *fault;
     if (!IsAttached(apeHandle)) return kArmBadApeHandle;
-    if (sink == nullptr || count > kMaxEntries || (count > 0 && entries == nullptr)) {
-        return kArmInvalidArgument;
-    }
+    if (const int refusal = CheckNameHandleArguments(count, entries, sink)) return refusal;
     const short result = ConfirmResult(ArmConfirmation::AllocNameHandleConfirm);
     auto answer = std::make_shared<std::vector<NameHandle>>(entries, entries + count);
     for (NameHandle& entry : *answer) {
