@@ -154,6 +154,11 @@ private:
     // message ever published there (payload claim). 0 when the server cannot answer.
     std::uint64_t GrantNumber(const std::string& subject, const std::string& claim,
                               std::string* holder);
+    // An ordered look at what stream stores under filter: everything, or with a start time
+    // (nanoseconds since the epoch, not 0) what was stored since.
+    natsStatus ReplayStored(const std::string& stream, const std::string& filter,
+                            std::int64_t startNanos, NatsPtr<natsSubscription>* sub,
+                            jsErrCode* error);
     // The data and stream sequence of the first message ever stored on subject.
     natsStatus FirstMessage(const std::string& subject, std::string* data, std::uint64_t* sequence);
     // Publishes to the stream, retrying the same message id while the server is away.

@@ -124,18 +124,11 @@ void NatsArmClient::RetrieveTask(std::uint32_t handle, IArmSharedDataSink* sink,
     bool everSet = false;
     bool complete = false;
     if (m_js) {
-        jsSubOptions options;
-        jsSubOptions_Init(&options);
-        const std::string stream = m_subjects.CacheStream();
-        options.Stream = stream.c_str();
-        options.Ordered = true;
-        options.Config.DeliverPolicy = js_DeliverAll;
         jsErrCode error = static_cast<jsErrCode>(0);
-        natsSubscription* raw = nullptr;
-        const std::string filter = m_subjects.CacheFilter(handle);
+        NatsPtr<natsSubscription> sub;
         natsStatus status =
-            js_SubscribeSync(&raw, m_js.get(), filter.c_str(), nullptr, &options, &error);
-        NatsPtr<natsSubscription> sub(raw);
+            ReplayStored(m_subjects.CacheStream(), m_subjects.CacheFilter(handle), 0, &sub, &error);
+        natsSubscription* const raw = sub.get();
         jsConsumerInfo* rawInfo = nullptr;
         if (status == NATS_OK) {
             status = natsSubscription_GetConsumerInfo(&rawInfo, raw, nullptr, &error);

@@ -300,19 +300,28 @@ std::uint64_t NatsArmClient::GrantNumber(const std::string& subject, const std::
     }
 }
 
-natsStatus NatsArmClient::FirstMessage(const std::string& subject, std::string* data,
-                                       std::uint64_t* sequence) {
+natsStatus NatsArmClient::ReplayStored(const std::string& stream, const std::string& filter,
+                                       std::int64_t startNanos, NatsPtr<natsSubscription>* sub,
+                                       jsErrCode* error) {
     jsSubOptions options;
     jsSubOptions_Init(&options);
-    const std::string stream = m_subjects.CacheStream();
     options.Stream = stream.c_str();
     options.Ordered = true;
-    options.Config.DeliverPolicy = js_DeliverAll;
-    jsErrCode error = static_cast<jsErrCode>(0);
+    options.Config.DeliverPolicy = startNanos != 0 ? js_DeliverByStartTime : js_DeliverAll;
+    options.Config.OptStartTime = startNanos;
     natsSubscription* raw = nullptr;
-    natsStatus status =
-        js_SubscribeSync(&raw, m_js.get(), subject.c_str(), nullptr, &options, &error);
-    NatsPtr<natsSubscription> sub(raw);
+    const natsStatus status =
+        js_SubscribeSync(&raw, m_js.get(), filter.c_str(), nullptr, &options, error);
+    sub->reset(raw);
+    return status;
+}
+
+natsStatus NatsArmClient::FirstMessage(const std::string& subject, std::string* data,
+                                       std::uint64_t* sequence) {
+    jsErrCode error = static_cast<jsErrCode>(0);
+    NatsPtr<natsSubscription> sub;
+    natsStatus status = ReplayStored(m_subjects.CacheStream(), subject, 0, &sub, &error);
+    natsSubscription* const raw = sub.get();
     natsMsg* rawMsg = nullptr;
     if (status == NATS_OK) status = natsSubscription_NextMsg(&rawMsg, raw, kRequestTimeoutMs);
     NatsPtr<natsMsg> msg(rawMsg);
@@ -388,17 +397,10 @@ bool NatsArmClient::FirstSequenceSince(const std::string& stream, const std::str
                                        std::string* reason) {
     // A consumer by start time that nothing has been delivered by yet stands right before
     // the first action stored since; one that already delivered names it in that message.
-    jsSubOptions options;
-    jsSubOptions_Init(&options);
-    options.Stream = stream.c_str();
-    options.Ordered = true;
-    options.Config.DeliverPolicy = js_DeliverByStartTime;
-    options.Config.OptStartTime = startNanos;
     jsErrCode error = static_cast<jsErrCode>(0);
-    natsSubscription* raw = nullptr;
-    natsStatus status =
-        js_SubscribeSync(&raw, m_js.get(), filter.c_str(), nullptr, &options, &error);
-    NatsPtr<natsSubscription> sub(raw);
+    NatsPtr<natsSubscription> sub;
+    natsStatus status = ReplayStored(stream, filter, startNanos, &sub, &error);
+    natsSubscription* const raw = sub.get();
     jsConsumerInfo* rawInfo = nullptr;
     if (status == NATS_OK)
         status = natsSubscription_GetConsumerInfo(&rawInfo, raw, nullptr, &error);
