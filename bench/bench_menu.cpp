@@ -2,14 +2,13 @@
 // participants enroll and then leave. Each arrival looks up its place in the menu, so the
 // cost of one arrival may grow with the menu's size, but no faster; this prints the cost per
 // arrival and per departure near 1,000, 5,000 and 10,000 entries and how it grew.
-#include <chrono>
 #include <cstdint>
 #include <cstdio>
 #include <string>
 #include <vector>
 
+#include "bench/roster_crowd.h"
 #include "engine/chat_client.h"
-#include "pdu/roster_info_pdu.h"
 #include "platform/trace.h"
 
 namespace {
@@ -21,55 +20,6 @@ constexpr int kParticipants = 10000;
 // Each reported cost is the mean over this many operations ending at the checkpoint.
 constexpr int kWindow = 500;
 const int kCheckpoints[] = {1000, 5000, 10000};
-
-using Clock = std::chrono::steady_clock;
-
-struct Participant {
-    std::uint32_t node;
-    std::string enroll;
-};
-
-// Names in a scrambled order, so that arrivals land all over the menu.
-std::vector<Participant> MakeParticipants() {
-    std::vector<Participant> people;
-    std::uint32_t state = 12345;
-    for (int i = 0; i < kParticipants; ++i) {
-        state = state * 1103515245u + 12345u;
-        CRosterInfoPDU pdu;
-        const std::uint32_t node = kFirstNode + static_cast<std::uint32_t>(i);
-        pdu.SetNodeID(node);
-        pdu.SetUserName("user " + std::to_string(state % 1000003u));
-        pdu.SetRoleSet(0u);
-        pdu.SetVisible(1);
-        pdu.SetUserType(1u);
-        pdu.GenerateXMLPDU();
-        people.push_back({node, pdu.ToWireText()});
-    }
-    return people;
-}
-
-void AddGroup(CChatClient& engine, const char* name, std::uint32_t id) {
-    _tagChatGroupInfo info{};
-    info.dwIndex = 1000;
-    info.dwGroupType = 1;
-    info.dwGroupId = id;
-    info.cszGroupName = name;
-    engine.AddGroup(&info, 1);
-}
-
-// Reports one participant added (deleted = false) or gone; returns the time it took.
-double Report(CChatClient& engine, const Participant& person, bool added) {
-    ARMApeUser user{person.node, person.node + 100000,
-                    reinterpret_cast<const std::uint8_t*>(person.enroll.data()),
-                    static_cast<std::int32_t>(person.enroll.size())};
-    ARMApeRoster record{};
-    record.dwSessionID = kSession;
-    record.wUserCount = 1;
-    record.pUsers = &user;
-    const Clock::time_point start = Clock::now();
-    engine.ApeRosterChanged(1, 0, added ? 1 : 0, added ? 0 : 1, 0, &record);
-    return std::chrono::duration<double, std::micro>(Clock::now() - start).count();
-}
 
 // Mean cost (microseconds) of the kWindow operations ending at each checkpoint.
 std::vector<double> WindowMeans(const std::vector<double>& costs, bool fromEnd) {
@@ -110,20 +60,20 @@ int main() {
     data.lMeetingType = 1;
     engine.Initialize(data);
     engine.OnPrivilegeChanged(0x8, 0);
-    AddGroup(engine, "Host", 1);
-    AddGroup(engine, "Presenter", 2);
-    AddGroup(engine, "Host & Presenter", 3);
-    AddGroup(engine, "All Attendees", 8);
+    AddMenuGroup(engine, "Host", 1);
+    AddMenuGroup(engine, "Presenter", 2);
+    AddMenuGroup(engine, "Host & Presenter", 3);
+    AddMenuGroup(engine, "All Attendees", 8);
 
-    const std::vector<Participant> people = MakeParticipants();
+    const std::vector<CrowdMember> people = MakeCrowd(kParticipants, kFirstNode, 0);
     std::vector<double> inserts;
-    for (const Participant& person : people)
-        inserts.push_back(Report(engine, person, true));
+    for (const CrowdMember& person : people)
+        inserts.push_back(ReportMember(engine, kSession, person, true));
     const std::size_t entries = engine.Menu().size();
     // Leave in arrival order; the n-th departure from the end sees about n entries.
     std::vector<double> removals;
-    for (const Participant& person : people)
-        removals.push_back(Report(engine, person, false));
+    for (const CrowdMember& person : people)
+        removals.push_back(ReportMember(engine, kSession, person, false));
 
     std::printf("menu entries after %d arrivals: %zu, after the departures: %zu\n", kParticipants,
                 entries, engine.Menu().size());

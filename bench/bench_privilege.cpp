@@ -11,8 +11,8 @@
 #include <string>
 #include <vector>
 
+#include "bench/roster_crowd.h"
 #include "engine/chat_client.h"
-#include "pdu/roster_info_pdu.h"
 #include "platform/trace.h"
 
 namespace {
@@ -25,43 +25,6 @@ constexpr int kWindow = 200;  // arrivals averaged at each checkpoint
 constexpr int kSmall = 1000;
 
 using Clock = std::chrono::steady_clock;
-
-struct Participant {
-    std::uint32_t node;
-    std::string enroll;
-};
-
-// Every tenth participant is a panelist; names in a scrambled order.
-std::vector<Participant> MakeParticipants() {
-    std::vector<Participant> people;
-    std::uint32_t state = 12345;
-    for (int i = 0; i < kParticipants; ++i) {
-        state = state * 1103515245u + 12345u;
-        const std::uint32_t node = kFirstNode + static_cast<std::uint32_t>(i);
-        CRosterInfoPDU pdu;
-        pdu.SetNodeID(node);
-        pdu.SetUserName("user " + std::to_string(state % 1000003u));
-        pdu.SetRoleSet(i % 10 == 0 ? ROLE_PANELIST : 0u);
-        pdu.SetVisible(1);
-        pdu.SetUserType(1u);
-        pdu.GenerateXMLPDU();
-        people.push_back({node, pdu.ToWireText()});
-    }
-    return people;
-}
-
-double Arrive(CChatClient& engine, const Participant& person) {
-    ARMApeUser user{person.node, person.node + 100000,
-                    reinterpret_cast<const std::uint8_t*>(person.enroll.data()),
-                    static_cast<std::int32_t>(person.enroll.size())};
-    ARMApeRoster record{};
-    record.dwSessionID = kSession;
-    record.wUserCount = 1;
-    record.pUsers = &user;
-    const Clock::time_point start = Clock::now();
-    engine.ApeRosterChanged(1, 0, 1, 0, 0, &record);
-    return std::chrono::duration<double, std::micro>(Clock::now() - start).count();
-}
 
 double Reapply(CChatClient& engine) {
     const Clock::time_point start = Clock::now();
@@ -109,23 +72,18 @@ int main() {
     engine.Initialize(data);
     for (int i = 0; i < 20; ++i)
         engine.OnTick();
-    for (const auto& group : {std::make_pair("Host", 1u), std::make_pair("All Panelists", 4u),
-                              std::make_pair("All Attendees", 8u)}) {
-        _tagChatGroupInfo info{};
-        info.dwIndex = 1000;
-        info.dwGroupType = 1;
-        info.dwGroupId = group.second;
-        info.cszGroupName = group.first;
-        engine.AddGroup(&info, 1);
-    }
+    AddMenuGroup(engine, "Host", 1);
+    AddMenuGroup(engine, "All Panelists", 4);
+    AddMenuGroup(engine, "All Attendees", 8);
     engine.OnPrivilegeChanged(0x4F, 0);
 
-    const std::vector<Participant> people = MakeParticipants();
+    // Every tenth participant is a panelist.
+    const std::vector<CrowdMember> people = MakeCrowd(kParticipants, kFirstNode, 10);
     std::vector<double> arrivals;
     double reapplySmall = 0;
     bool lookupsMatch = true;
     for (int i = 0; i < kParticipants; ++i) {
-        arrivals.push_back(Arrive(engine, people[i]));
+        arrivals.push_back(ReportMember(engine, kSession, people[i], true));
         if (i + 1 == kSmall) {
             reapplySmall = Reapply(engine);
             lookupsMatch = lookupsMatch && LookupsMatchTheWalk(engine.UserList());
