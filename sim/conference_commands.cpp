@@ -16,29 +16,6 @@ std::uint32_t OptionNumber(const ScenarioCommand& c, const char* key, std::uint3
     return arg ? Number(*arg) : fallback;
 }
 
-// Role words joined by commas (host, presenter, panelist; attendee for none) or a number.
-std::optional<std::uint32_t> ParseRoles(const std::string& text) {
-    if (auto number = ParseScenarioNumber(text)) return number;
-    std::uint32_t roles = 0;
-    std::size_t start = 0;
-    while (start <= text.size()) {
-        std::size_t comma = text.find(',', start);
-        if (comma == std::string::npos) comma = text.size();
-        const std::string word = text.substr(start, comma - start);
-        if (word == "host") {
-            roles |= ROLE_HOST;
-        } else if (word == "presenter") {
-            roles |= ROLE_PRESENTER;
-        } else if (word == "panelist") {
-            roles |= ROLE_PANELIST;
-        } else if (word != "attendee") {
-            return std::nullopt;
-        }
-        start = comma + 1;
-    }
-    return roles;
-}
-
 }  // namespace
 
 void Simulator::Conference(const ScenarioCommand& c) {
@@ -69,7 +46,7 @@ void Simulator::Join(const ScenarioCommand& c) {
     }
     std::optional<std::uint32_t> roles;
     if (const ScenarioArg* arg = c.Option("roles")) {
-        roles = ParseRoles(arg->value);
+        roles = ParseScenarioRoles(arg->value);
         if (!roles)
             return Fail(c, "roles= takes host, presenter, panelist or attendee: " + arg->value);
     }
@@ -140,7 +117,7 @@ void Simulator::HostOrPresenter(const ScenarioCommand& c) {
 }
 
 void Simulator::Roles(const ScenarioCommand& c) {
-    const auto roles = ParseRoles(c.Positional()[1]->value);
+    const auto roles = ParseScenarioRoles(c.Positional()[1]->value);
     if (!roles) return Fail(c, "roles takes host, presenter, panelist or attendee");
     Participant* p = Find(c, c.Positional()[0]->value);
     if (!p) return;

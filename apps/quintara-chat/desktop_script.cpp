@@ -27,29 +27,6 @@ std::uint32_t Number(const ScenarioArg& arg) {
     return *ParseScenarioNumber(arg.value);
 }
 
-// Role words joined by commas (host, presenter, panelist; attendee for none) or a number.
-bool ParseRoles(const std::string& text, std::uint32_t* out) {
-    if (const auto number = ParseScenarioNumber(text)) return *out = *number, true;
-    static const std::pair<const char*, std::uint32_t> kWords[] = {{"host", ROLE_HOST},
-                                                                   {"presenter", ROLE_PRESENTER},
-                                                                   {"panelist", ROLE_PANELIST},
-                                                                   {"attendee", 0}};
-    std::uint32_t roles = 0;
-    std::size_t start = 0;
-    while (start <= text.size()) {
-        std::size_t comma = text.find(',', start);
-        if (comma == std::string::npos) comma = text.size();
-        const std::string word = text.substr(start, comma - start);
-        bool known = false;
-        for (const auto& [name, bit] : kWords)
-            if (word == name) roles |= bit, known = true;
-        if (!known) return false;
-        start = comma + 1;
-    }
-    *out = roles;
-    return true;
-}
-
 // The transcript entry at index: its title without ":" and CR, its text with \n line breaks.
 std::pair<std::string, std::string> Entry(const CChatContentStorage& store, std::size_t index) {
     const std::string_view line = store.GetLineAtIndex(index);
@@ -118,11 +95,10 @@ void DesktopScript::Execute(const ScenarioCommand& c) {
         return Fail(c, "the desktop program leaves its save and open panels to the user");
     if (verb == "host" || verb == "presenter") return HostCall(c);
     if (verb == "roles") {
-        std::uint32_t roles = 0;
         if (!IsMe(c, 0)) return;
-        if (!ParseRoles(args[1]->value, &roles))
-            return Fail(c, "roles takes host, presenter, panelist or attendee");
-        ChSetRosters(me, roles);
+        const auto roles = ParseScenarioRoles(args[1]->value);
+        if (!roles) return Fail(c, "roles takes host, presenter, panelist or attendee");
+        ChSetRosters(me, *roles);
     } else if (verb == "privilege") {
         ChSetPrivilege(me, Number(*args[0]));
     } else if (verb == "before-host") {

@@ -35,6 +35,10 @@ struct ScenarioError {
 // no overflow past 32 bits.
 std::optional<std::uint32_t> ParseScenarioNumber(std::string_view text);
 
+// Role words as scenarios write them: host, presenter, panelist and attendee (none) joined by
+// commas, or a number. The roster's role bits, or nothing for an unknown word.
+std::optional<std::uint32_t> ParseScenarioRoles(std::string_view text);
+
 // Splits one line into its verb and arguments; a line that is empty or only a comment gives
 // an empty verb. False, with a message, for an unterminated string, an unknown escape or a
 // string glued to a word.

@@ -1,6 +1,7 @@
 // Splitting one scenario line into words, strings and key=value options.
 #include <cctype>
 
+#include "engine/chat_client.h"
 #include "sim/lang/scenario.h"
 
 namespace {
@@ -116,4 +117,27 @@ std::optional<std::uint32_t> ParseScenarioNumber(std::string_view text) {
         if (value > 0xFFFFFFFFu) return std::nullopt;
     }
     return static_cast<std::uint32_t>(value);
+}
+
+std::optional<std::uint32_t> ParseScenarioRoles(std::string_view text) {
+    if (const auto number = ParseScenarioNumber(text)) return number;
+    static const std::pair<std::string_view, std::uint32_t> kWords[] = {
+        {"host", ROLE_HOST},
+        {"presenter", ROLE_PRESENTER},
+        {"panelist", ROLE_PANELIST},
+        {"attendee", 0}};
+    std::uint32_t roles = 0;
+    std::size_t start = 0;
+    while (start <= text.size()) {
+        std::size_t comma = text.find(',', start);
+        if (comma == std::string_view::npos) comma = text.size();
+        const std::string_view word = text.substr(start, comma - start);
+        bool known = false;
+        for (const auto& [name, bit] : kWords) {
+            if (word == name) roles |= bit, known = true;
+        }
+        if (!known) return std::nullopt;
+        start = comma + 1;
+    }
+    return roles;
 }
