@@ -477,6 +477,9 @@ private:
     // Stores the privilege word and splits it into the flags; the everyone flag only when asked.
     void StorePrivilege(std::uint32_t privilege, bool bWithEveryone);
     // Enables the group entries the flags and the local participant's roles allow.
+    // Before host, lets a participant reach the attendees unless the picker holds a plain
+    // attendee back; returns whether it is before host.
+    bool ApplyBeforeHost(bool hostOrPresenter);
     void EnableGroupEntries(bool beforeHost);
     // Re-creates the participant entries the flags allow, panelists in their own section.
     void ReapplyParticipantEntries();

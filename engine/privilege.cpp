@@ -5,18 +5,12 @@
 
 #include "engine/chat_client.h"
 #include "engine/menu_entries.h"
+#include "engine/privilege_bits.h"
 #include "platform/func_trace.h"
 #include "platform/string_table.h"
 
 namespace {
 
-// Bits of the privilege word.
-constexpr std::uint32_t kPrivilegeAttendees = 0x1;
-constexpr std::uint32_t kPrivilegeHost = 0x2;
-constexpr std::uint32_t kPrivilegePresenter = 0x4;
-constexpr std::uint32_t kPrivilegePrivately = 0x8;
-constexpr std::uint32_t kPrivilegePanelists = 0x40;
-constexpr std::uint32_t kPrivilegeEveryone = 0x10000;
 // The bits whose change makes the normal rules rebuild the attendee menu.
 constexpr std::uint32_t kNormalRuleBits = 0x47;
 
@@ -36,13 +30,7 @@ void CChatClient::OnPrivilegeChanged(std::uint32_t privilege, int bForce) {
         !hostOrPresenter)
         OnAttendeePrivilegeChange();
 
-    const bool beforeHost = IsBeforeHost();
-    if (beforeHost) {
-        m_bChatAttendees = 1;
-        // With the picker in use a plain attendee waits for the host before reaching others.
-        if (m_bUseAttendeeSelector && !hostOrPresenter && !(m_dwMyRosters & ROLE_PANELIST))
-            m_bChatAttendees = 0;
-    }
+    const bool beforeHost = ApplyBeforeHost(hostOrPresenter);
     EnableGroupEntries(beforeHost);
     ReapplyParticipantEntries();
 
@@ -72,6 +60,17 @@ void CChatClient::OnPrivilegeChanged(std::uint32_t privilege, int bForce) {
         }
     }
     if (GetIndexOfMenuByGroup(GROUP_SELECT_ATTENDEE) == -1) CloseSeltAttDlg();
+}
+
+bool CChatClient::ApplyBeforeHost(bool hostOrPresenter) {
+    const bool beforeHost = IsBeforeHost();
+    if (beforeHost) {
+        m_bChatAttendees = 1;
+        // With the picker in use a plain attendee waits for the host before reaching others.
+        if (m_bUseAttendeeSelector && !hostOrPresenter && !(m_dwMyRosters & ROLE_PANELIST))
+            m_bChatAttendees = 0;
+    }
+    return beforeHost;
 }
 
 void CChatClient::OnBeforeHostChange(int) {

@@ -4,6 +4,7 @@
 
 #include "engine/chat_client.h"
 #include "engine/menu_entries.h"
+#include "engine/privilege_bits.h"
 #include "platform/func_trace.h"
 #include "platform/string_table.h"
 
@@ -11,9 +12,6 @@ namespace {
 
 // The bits whose change makes the QM rules edit the attendee menu.
 constexpr std::uint32_t kQMRuleBits = 0x10047;
-constexpr std::uint32_t kPrivilegeHost = 0x2;
-constexpr std::uint32_t kPrivilegePresenter = 0x4;
-constexpr std::uint32_t kPrivilegeEveryone = 0x10000;
 
 }  // namespace
 
@@ -41,12 +39,7 @@ void CChatClient::OnPrivilegeChangedInQM(std::uint32_t privilege, int bForce) {
     if ((changed || bForce) && !hostOrPresenter)
         OnAttendeePrivilegeChangeInQM(old & kQMRuleBits, bForce);
 
-    const bool beforeHost = IsBeforeHost();
-    if (beforeHost) {
-        m_bChatAttendees = 1;
-        if (m_bUseAttendeeSelector && !hostOrPresenter && !(m_dwMyRosters & ROLE_PANELIST))
-            m_bChatAttendees = 0;
-    }
+    const bool beforeHost = ApplyBeforeHost(hostOrPresenter);
     EnableGroupEntries(beforeHost);
     if (beforeHost && m_UserList.GetCount() != 0 && m_nPrivilegeCountdown != 0)
         SetGroupMenuEnable(GROUP_EVERYONE, true);
