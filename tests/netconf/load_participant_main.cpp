@@ -3,7 +3,8 @@
 // sends its share, alternating a group line (cache append) and a private line to the next peer,
 // each "<user> <number>". It checks that every line meant for it arrives exactly once and in
 // its sender's order, and prints "received group=G private=P duplicates=D disorder=O" when all
-// came or the time is up (exit status 0 only when everything came in order).
+// came or the time is up (exit status 0 only when everything came in order). Never told
+// "go", it only stays enrolled until it is killed or its time is up.
 // Usage: netconf_load_participant URLS USER PASSWORD NODE COUNT NEXT_PEER PEER...
 #include <cstdio>
 #include <cstdlib>
@@ -39,11 +40,13 @@ public:
           m_peers(peers) {}
 
     void Go() {
+        m_going = true;
         m_loop.AddTimer(kSendInterval, kSendInterval, [this] { SendOne(); });
     }
-    // Whether every line meant for this participant arrived.
+    // Whether it was told to go and every line meant for it arrived.
     bool Complete() const {
-        return m_group == m_count / 2 * static_cast<int>(m_peers + 1) && m_private == m_count / 2;
+        return m_going && m_group == m_count / 2 * static_cast<int>(m_peers + 1) &&
+               m_private == m_count / 2;
     }
     void Report() const {
         std::printf("received group=%d private=%d duplicates=%d disorder=%d\n", m_group, m_private,
@@ -164,6 +167,7 @@ private:
     std::uint32_t m_cache = 0;
     std::set<std::uint32_t> m_members;
     bool m_ready = false;
+    bool m_going = false;
     int m_sent = 0;
     int m_group = 0, m_private = 0, m_duplicates = 0, m_disorder = 0;
     std::map<std::pair<bool, std::uint32_t>, int> m_last;

@@ -3,10 +3,6 @@
 // change a granted handle, and a participant whose process dies leaves everybody's roster
 // within ten seconds.
 #include <nats/nats.h>
-#include <signal.h>
-#include <spawn.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
 #include <chrono>
 #include <condition_variable>
@@ -15,9 +11,8 @@
 #include <vector>
 
 #include "netconf/conference_subjects.h"
+#include "tests/netconf/child_process.h"
 #include "tests/netconf/nats_harness.h"
-
-extern char** environ;
 
 namespace {
 
@@ -179,34 +174,11 @@ TEST_F(NatsRefusalsTest, AParticipantWhoseProcessDiesLeavesTheRosterWithinTenSec
     Run();
     a.sink->Clear();
 
-    int out[2];
-    ASSERT_EQ(0, pipe(out));
-    posix_spawn_file_actions_t actions;
-    posix_spawn_file_actions_init(&actions);
-    posix_spawn_file_actions_adddup2(&actions, out[1], STDOUT_FILENO);
-    posix_spawn_file_actions_addclose(&actions, out[0]);
+    // A participant of the load run that is never told to send only stays enrolled.
     const std::string user = FixtureUser(20);
-    std::vector<std::string> args = {
-        QC_NETCONF_PARTICIPANT, Server().Url(), user, FixturePassword(user), "20", "7", "doomed"};
-    std::vector<char*> argv;
-    for (std::string& arg : args)
-        argv.push_back(arg.data());
-    argv.push_back(nullptr);
-    pid_t child = -1;
-    ASSERT_EQ(0, posix_spawn(&child, argv[0], &actions, nullptr, argv.data(), environ));
-    posix_spawn_file_actions_destroy(&actions);
-    close(out[1]);
-    std::string said;
-    char buffer[256];
-    while (said.find('\n') == std::string::npos) {
-        const ssize_t got = read(out[0], buffer, sizeof buffer);
-        if (got <= 0) break;
-        said.append(buffer, static_cast<std::size_t>(got));
-    }
-    close(out[0]);
-    ASSERT_EQ("enrolled\n", said);
-
-    const std::string entry = "[20:" + std::to_string(ConferenceUserId(user)) + ":doomed]";
+    ChildProcess child({QC_NETCONF_LOAD_PARTICIPANT, Server().Url(), user, FixturePassword(user),
+                        "20", "0", "p11", "p11"});
+    const std::string entry = "[20:" + std::to_string(ConferenceUserId(user)) + ":p20]";
     const auto seen = [&a](const std::string& change) {
         for (const std::string& roster : Rosters(a)) {
             if (roster == change) return true;
@@ -220,10 +192,9 @@ TEST_F(NatsRefusalsTest, AParticipantWhoseProcessDiesLeavesTheRosterWithinTenSec
         return std::chrono::steady_clock::now() - start;
     };
     waitFor("+7" + entry, std::chrono::seconds(10));
-    ASSERT_TRUE(seen("+7" + entry));
+    ASSERT_TRUE(seen("+7" + entry)) << child.Output();
 
-    kill(child, SIGKILL);
-    waitpid(child, nullptr, 0);
+    child.Wait(SIGKILL);
     const auto took = waitFor("-7" + entry, std::chrono::seconds(12));
     EXPECT_TRUE(seen("-7" + entry));
     EXPECT_LT(took, std::chrono::seconds(10));

@@ -1,16 +1,12 @@
 // A nats-server process for one test: its own configuration and JetStream folder on a free
-// loopback port, stopped and its files removed when the object goes.
+// loopback port, killed and its files removed when the object goes.
 #pragma once
 
-#include <sys/types.h>
-
-#include <condition_variable>
 #include <memory>
-#include <mutex>
 #include <string>
-#include <thread>
 
 #include "netconf/server_config.h"
+#include "tests/netconf/child_process.h"
 #include "tests/support/temp_dir.h"
 
 // A TCP port on 127.0.0.1 that nothing listens on right now.
@@ -20,31 +16,22 @@ class NatsServer {
 public:
     // options.port 0 takes a free port; an empty store folder a temporary one.
     explicit NatsServer(ConferenceServerOptions options);
-    ~NatsServer();
-    NatsServer(const NatsServer&) = delete;
-    NatsServer& operator=(const NatsServer&) = delete;
 
-    // Starts the server and returns once it is ready; false (with the log) when it is not
-    // within 20 seconds.
+    // Starts the server (again, after Kill) and returns once it is ready; false (with the log)
+    // when it is not within 20 seconds.
     bool Start();
-    // Ends the server: politely (SIGTERM) or as a crash (SIGKILL); returns once it is gone.
-    void Stop();
-    void Kill();
+    // Ends the server as a crash would; returns once it is gone.
+    void Kill() { m_process.reset(); }
 
     std::string Url() const;
-    const ConferenceServerOptions& Options() const { return m_options; }
     // Whether a log line containing text appeared, waiting up to seconds for it.
-    bool WaitForLog(const std::string& text, double seconds);
-    std::string Log() const;
+    bool WaitForLog(const std::string& text, double seconds) {
+        return m_process && m_process->WaitFor(text, seconds);
+    }
+    std::string Log() const { return m_process ? m_process->Output() : std::string(); }
 
 private:
-    void End(int signal);
-
     ConferenceServerOptions m_options;
     TempDir m_dir;
-    pid_t m_pid = -1;
-    std::thread m_reader;
-    mutable std::mutex m_mutex;
-    std::condition_variable m_logged;
-    std::string m_log;
+    std::unique_ptr<ChildProcess> m_process;
 };

@@ -4,9 +4,6 @@
 // Usage: scenario_on_nats SIMULATOR SCENARIO [SIMULATOR OPTIONS...]
 // Exit status: the simulator's (77: the scenario needs the in-process conference), or 1 when
 // the server does not start.
-#include <spawn.h>
-#include <sys/wait.h>
-
 #include <cstdio>
 #include <fstream>
 #include <sstream>
@@ -15,8 +12,6 @@
 
 #include "sim/lang/scenario.h"
 #include "tests/netconf/nats_server.h"
-
-extern char** environ;
 
 namespace {
 
@@ -35,19 +30,12 @@ bool Participants(const std::string& path, std::vector<std::string>* names) {
     return true;
 }
 
+// Runs the simulator and passes its output on; its exit status.
 int Run(std::vector<std::string> args) {
-    std::vector<char*> argv;
-    for (std::string& arg : args)
-        argv.push_back(arg.data());
-    argv.push_back(nullptr);
-    pid_t pid = -1;
-    if (posix_spawn(&pid, argv[0], nullptr, nullptr, argv.data(), environ) != 0) {
-        std::fprintf(stderr, "cannot start %s\n", argv[0]);
-        return 1;
-    }
-    int status = 0;
-    waitpid(pid, &status, 0);
-    return WIFEXITED(status) ? WEXITSTATUS(status) : 1;
+    ChildProcess simulator(std::move(args));
+    const int status = simulator.Wait();
+    std::fputs(simulator.Output().c_str(), stdout);
+    return status < 0 ? 1 : status;
 }
 
 }  // namespace
