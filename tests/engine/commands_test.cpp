@@ -1,5 +1,5 @@
-// The host's tuning commands (feature word, recording status, configuration XML, sound) and
-// the events the chat window raises, on an engine behind a recording window.
+// The host's tuning commands (feature word, QM and everyone-only modes, recording status,
+// configuration XML) and the events the chat window raises, on an engine behind a recording window.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -10,12 +10,16 @@
 #include "engine/chat_client.h"
 #include "engine/chat_recovery_mgr.h"
 #include "platform/telemetry.h"
+#include "tests/engine/chat_room.h"
 #include "tests/engine/menu_harness.h"
 #include "tests/support/trace_capture.h"
 
 namespace {
 
+using chatroom::ChatRoom;
+using chatroom::Member;
 using menutest::MenuHarness;
+using Strings = std::vector<std::string>;
 
 // Reported telemetry actions, collected while the object lives.
 struct TelemetryCapture {
@@ -44,19 +48,14 @@ TEST(Commands, SelectionChangedMarksExactlyTheReportedEntry) {
     const int everyone = h.engine.GetIndexOfMenuByGroup(GROUP_EVERYONE);
     const int attendees = h.engine.GetIndexOfMenuByGroup(GROUP_ATTENDEES);
     const int size = static_cast<int>(h.engine.Menu().size());
-
+    // While a selected user has left the window reports -1; beyond the menu nothing is
+    // selected either, and the previous choice is gone.
     const struct {
         std::int32_t index;
         std::vector<int> selected;
         std::vector<int> telemetry;
     } cases[] = {
-        {everyone, {everyone}, {902}},
-        {attendees, {attendees}, {}},
-        // While a selected user has left the window reports -1; beyond the menu nothing
-        // is selected either, and the previous choice is gone.
-        {-1, {}, {}},
-        {size, {}, {}},
-    };
+        {everyone, {everyone}, {902}}, {attendees, {attendees}, {}}, {-1, {}, {}}, {size, {}, {}}};
     for (const auto& c : cases) {
         std::int32_t before = c.index == attendees ? everyone : attendees;
         ASSERT_EQ(h.engine.HandleUIMessage(msg_SelectionChanged, &before, nullptr), 0);
@@ -75,44 +74,54 @@ TEST(Commands, ShowAttendeeListNamesOnlyPlainAttendees) {
     h.Commands();
     std::int32_t created = 1;
     EXPECT_EQ(h.engine.HandleUIMessage(msg_ShowAttendeeList, &created, nullptr), 0);
-    std::vector<std::string> listed;
+    Strings listed;
     for (const RecordedCommand& c : h.window->Commands()) {
         ASSERT_EQ(c.id, msg_AddAttendee);
         listed.push_back(c.attendee.strName + "@" + std::to_string(c.attendee.dwNodeID));
     }
-    EXPECT_EQ(listed, (std::vector<std::string>{"ann@201", "cy@203"}));
+    EXPECT_EQ(listed, (Strings{"ann@201", "cy@203"}));
 }
 
-TEST(Commands, AttendeeSelectedWithoutChoiceReselectsTheSelectedEntry) {
-    MenuHarness h;
+TEST(Commands, AttendeeSelectedGivesThePickedUserAnEntryOrReselectsTheSelectedOne) {
+    // With the attendee selector an attendee gets an entry only when picked.
+    MenuHarness h({1, true});
     SeedGroups(h);
+    h.Enroll({{201, "ann", 0}});
+    ASSERT_EQ(h.engine.GetIndexOfMenuByNodeID(201), -1);
     std::int32_t attendees = h.engine.GetIndexOfMenuByGroup(GROUP_ATTENDEES);
     h.engine.HandleUIMessage(msg_SelectionChanged, &attendees, nullptr);
-    h.Commands();
-    std::uint32_t none = 0;
-    EXPECT_EQ(h.engine.HandleUIMessage(msg_AttendeeSelected, &none, nullptr), 1);
-    EXPECT_EQ(h.Commands(), std::vector<std::string>{"select " + std::to_string(attendees)});
-
+    const auto pick = [&h](std::uint32_t node) {
+        h.Commands();
+        EXPECT_EQ(h.engine.HandleUIMessage(msg_AttendeeSelected, &node, nullptr), 1) << node;
+        return h.Commands();
+    };
+    // No choice re-sends the selection; a participant who left between the pick and the
+    // event gets nothing.
+    EXPECT_EQ(pick(0), Strings{"select " + std::to_string(attendees)});
+    EXPECT_TRUE(pick(299).empty());
+    EXPECT_EQ(h.engine.GetIndexOfMenuByNodeID(299), -1);
+    pick(201);
+    EXPECT_GE(h.engine.GetIndexOfMenuByNodeID(201), 0);
     // Nothing selected: nothing to re-send.
     std::int32_t outside = -1;
     h.engine.HandleUIMessage(msg_SelectionChanged, &outside, nullptr);
-    h.Commands();
-    EXPECT_EQ(h.engine.HandleUIMessage(msg_AttendeeSelected, &none, nullptr), 1);
-    EXPECT_TRUE(h.Commands().empty());
+    EXPECT_TRUE(pick(0).empty());
 }
 
-TEST(Commands, AttendeeSelectedGivesThePickedUserAnEntryOutsidePanelMeetings) {
-    // With the attendee selector an attendee gets an entry only when picked.
-    MenuHarness h({1, true});
+TEST(Commands, EventsNoWindowSendsChangeNothing) {
+    MenuHarness h({3});
     h.Enroll({{201, "ann", 0}});
-    ASSERT_EQ(h.engine.GetIndexOfMenuByNodeID(201), -1);
-    std::uint32_t picked = 201;
-    EXPECT_EQ(h.engine.HandleUIMessage(msg_AttendeeSelected, &picked, nullptr), 1);
-    EXPECT_GE(h.engine.GetIndexOfMenuByNodeID(201), 0);
-    // Nobody outside the roster gets an entry.
-    std::uint32_t stranger = 999;
-    EXPECT_EQ(h.engine.HandleUIMessage(msg_AttendeeSelected, &stranger, nullptr), 1);
-    EXPECT_EQ(h.engine.GetIndexOfMenuByNodeID(999), -1);
+    const Strings titles = h.Titles();
+    h.Commands();
+    for (const int message : {0, 2000, 4999, 5004, 6000}) {
+        std::int32_t value = 0;
+        EXPECT_EQ(h.engine.HandleUIMessage(message, &value, &value), 1) << message;
+    }
+    EXPECT_EQ(h.Titles(), titles);
+    EXPECT_TRUE(h.Commands().empty());
+    // Sending with nothing typed asks the window for the text and does nothing more.
+    EXPECT_EQ(h.engine.HandleUIMessage(msg_SendChat, nullptr, nullptr), 0);
+    EXPECT_EQ(h.Commands(), Strings{"msg_GetInputText"});
 }
 
 TEST(Commands, FeatureWordSetsModesAndTellsTheRecoveryManager) {
@@ -138,11 +147,10 @@ TEST(Commands, FeatureWordSetsModesAndTellsTheRecoveryManager) {
         EXPECT_EQ(capture.Has("Enter CChatClient::SetMeetingType = 1"), c.meetingTypeAgain)
             << c.features;
         EXPECT_EQ(h.engine.GetHideSendToCombox(), c.noSendToItems) << c.features;
-        const std::vector<std::string> commands = h.Commands();
+        const Strings commands = h.Commands();
         EXPECT_EQ(std::count(commands.begin(), commands.end(), "msg_NoSendToItems"),
                   c.noSendToItems ? 1 : 0)
             << c.features;
-        ASSERT_NE(h.engine.RecoveryMgr(), nullptr);
         EXPECT_EQ(h.engine.RecoveryMgr()->GetQMFlag(), c.qm) << c.features;
         EXPECT_EQ(h.engine.RecoveryMgr()->GetGroupMsgRecovery(), c.groupRecovery) << c.features;
         // Leaving QM mode does not run the meeting type again.
@@ -151,6 +159,52 @@ TEST(Commands, FeatureWordSetsModesAndTellsTheRecoveryManager) {
         EXPECT_FALSE(leaving.Has("Enter CChatClient::SetMeetingType = 1")) << c.features;
         EXPECT_FALSE(h.engine.RecoveryMgr()->GetQMFlag()) << c.features;
     }
+}
+
+TEST(Commands, QMModeAddsOnlyTheGroupsItLacksAndNeverTwice) {
+    for (const std::int32_t type : {1, 3}) {
+        MenuHarness h({type});
+        const std::size_t groups = h.engine.GroupList().GetGroupsCount();
+        Strings expected = h.Titles();
+        for (const std::uint32_t features : {FEATURE_QM_MODE, 0u, FEATURE_QM_MODE})
+            h.engine.SelectFeature(features, 0, 0, 0, 0, nullptr);
+        // Meeting type 1 gains its everyone group once; type 3 has all it needs.
+        if (type == 1) expected.insert(expected.begin(), "Everyone");
+        EXPECT_EQ(h.Titles(), expected) << type;
+        EXPECT_EQ(static_cast<std::size_t>(h.engine.GroupList().GetGroupsCount()),
+                  groups + (type == 1 ? 1 : 0));
+    }
+}
+
+TEST(Commands, EveryoneOnlyHidesTheListAndSendsToEveryoneWhateverTheWindowReports) {
+    // The host sets the mode before the start: the window still learns of it.
+    ChatRoom room(3, FEATURE_EVERYONE_ONLY);
+    Member& hana = room.Join({"Hana", 101, ROLE_HOST});
+    Member& ann = room.Join({"Ann", 104, 0});
+    room.SetHostAndPresenter(101, 0);
+    const std::vector<int> ids = ann.window->Ids();
+    EXPECT_NE(std::find(ids.begin(), ids.end(), msg_NoSendToItems), ids.end());
+
+    ASSERT_TRUE(room.Select(ann, GROUP_EVERYONE));
+    const int everyone = ann.engine.GetIndexOfMenuByGroup(GROUP_EVERYONE);
+    ASSERT_NE(everyone, 0);  // entry 0 is "Host"
+    std::int32_t reported = 0;
+    EXPECT_EQ(ann.engine.HandleUIMessage(msg_SelectionChanged, &reported, nullptr), 0);
+    EXPECT_TRUE(ann.engine.Menu()[everyone].bSelected);
+    EXPECT_FALSE(ann.engine.Menu()[0].bSelected);
+    ann.window->inputText = "hello";
+    EXPECT_EQ(ann.engine.HandleUIMessage(msg_SendChat, nullptr, nullptr), 0);
+    room.Run();
+    EXPECT_EQ(room.Holders("from Ann to All Participants|hello"), (Strings{"Hana", "Ann"}));
+
+    // A selection made before the mode came is not sent to: the host's menu, rebuilt from the
+    // groups, has the everyone entry, and that is where the line goes.
+    ASSERT_TRUE(room.Select(hana, GROUP_HOST));
+    hana.engine.SelectFeature(FEATURE_EVERYONE_ONLY, 0, 0, 0, 0, nullptr);
+    hana.window->inputText = "to host";
+    hana.engine.HandleUIMessage(msg_SendChat, nullptr, nullptr);
+    room.Run();
+    EXPECT_EQ(room.Holders("from Hana to All Participants|to host"), (Strings{"Hana", "Ann"}));
 }
 
 TEST(Commands, RecordingStatusesZeroAndThreeOweEveryGroupItsDescription) {
@@ -167,69 +221,43 @@ TEST(Commands, RecordingStatusesZeroAndThreeOweEveryGroupItsDescription) {
     }
 }
 
-// The customer id and the FAQ fields as the next roster record carries them.
-std::string RosterRecord(CChatClient& engine) {
-    CRosterInfoPDU pdu;
-    engine.MakeRosterInfoPDU(&pdu);
-    return pdu.ToWireText();
-}
-
 TEST(Commands, ConfigurationKindsAndTheirRefusals) {
-    const std::string customer =
-        "<chat ver=\"1.0\"><mtype>11</mtype><customerid>555</customerid></chat>";
-    const std::string faq = "<chat ver=\"1.0\"><mtype>8</mtype><lname>Lee</lname></chat>";
+    const char* customer = "<chat ver=\"1.0\"><mtype>11</mtype><customerid>555</customerid></chat>";
+    const char* faq = "<chat ver=\"1.0\"><mtype>8</mtype><lname>Lee</lname></chat>";
     const struct {
         std::uint32_t type;
-        std::string xml;
+        const char* xml;
         std::uint32_t customerId;
         bool lastName;
     } cases[] = {
         {3, customer, 555, false},
+        {3, "<chat ver=\"1.0\"><mtype>11</mtype><customerid>0</customerid></chat>", 0, false},
         {2, faq, 77, true},
         {3, "<chat ver=\"1.0\"><mtype>11</mtype></chat>", 77, false},
         {3, "not xml", 77, false},
+        {3, nullptr, 77, false},
+        {2, nullptr, 77, false},
         {3, faq, 77, false},
         {2, customer, 77, false},
         {7, customer, 77, false},
         {7, faq, 77, false},
     };
     for (const auto& c : cases) {
+        SCOPED_TRACE(std::to_string(c.type) + (c.xml ? c.xml : "null"));
         MenuHarness h({1});
         h.engine.RecoveryMgr()->SetCustomerId(77);
-        EXPECT_EQ(h.engine.SetConfig(c.type, c.xml.c_str()), 0);
-        EXPECT_EQ(h.engine.RecoveryMgr()->GetCustomerId(), c.customerId) << c.type << c.xml;
-        EXPECT_EQ(RosterRecord(h.engine).find("<LName>") != std::string::npos, c.lastName)
-            << c.type << c.xml;
+        EXPECT_EQ(h.engine.SetConfig(c.type, c.xml), 0);
+        EXPECT_EQ(h.engine.RecoveryMgr()->GetCustomerId(), c.customerId);
+        // The FAQ fields as the next roster record carries them.
+        CRosterInfoPDU pdu;
+        h.engine.MakeRosterInfoPDU(&pdu);
+        EXPECT_EQ(pdu.ToWireText().find("<LName>") != std::string::npos, c.lastName);
     }
-}
-
-TEST(Commands, ConfigurationHandlersReportWhetherTheyTookTheText) {
-    MenuHarness h({1});
-    EXPECT_EQ(h.engine.HandleCustomerIdConfig(
-                  "<chat ver=\"1.0\"><mtype>11</mtype><customerid>0</customerid></chat>"),
-              1);
-    EXPECT_EQ(h.engine.RecoveryMgr()->GetCustomerId(), 0u);
-    EXPECT_EQ(h.engine.HandleCustomerIdConfig(nullptr), 0);
-    EXPECT_EQ(h.engine.HandleFAQMacroInfoConfig("<chat ver=\"1.0\"><mtype>8</mtype></chat>"), 1);
-    EXPECT_EQ(h.engine.HandleFAQMacroInfoConfig("<chat ver=\"1.0\"><mtype>11</mtype></chat>"), 0);
-    EXPECT_EQ(h.engine.HandleFAQMacroInfoConfig(nullptr), 0);
     // After the tear-down there is nothing to configure.
+    MenuHarness h({1});
     h.engine.Cleanup();
-    EXPECT_EQ(h.engine.HandleCustomerIdConfig(
-                  "<chat ver=\"1.0\"><mtype>11</mtype><customerid>5</customerid></chat>"),
-              0);
-    EXPECT_EQ(h.engine.HandleFAQMacroInfoConfig("<chat ver=\"1.0\"><mtype>8</mtype></chat>"), 0);
-    EXPECT_EQ(h.engine.SetConfig(3, "<chat ver=\"1.0\"><mtype>11</mtype></chat>"), 0);
-}
-
-TEST(Commands, WithoutAWarningThePickerClosesAtOnce) {
-    MenuHarness h({3});
-    h.Commands();
-    h.engine.CloseSeltAttDlg();
-    EXPECT_EQ(h.Commands(),
-              (std::vector<std::string>{"msg_CloseAttendeeWarning", "msg_CloseAttendeeDialog"}));
-    h.engine.CloseAllDlg();
-    EXPECT_EQ(h.Commands(), std::vector<std::string>{"msg_CloseAllDialogs"});
+    EXPECT_EQ(h.engine.SetConfig(3, customer), 0);
+    EXPECT_EQ(h.engine.SetConfig(2, faq), 0);
 }
 
 }  // namespace
