@@ -45,6 +45,7 @@ std::vector<std::string> Writes(const std::vector<std::string>& calls) {
 struct Participant {
     // refuseUserInfoSet: the service refuses the first cache set, the user-info cache's.
     explicit Participant(bool refuseUserInfoSet = false) {
+        RecordingWindow::Install();
         client = conference.CreateClient(loop, kMyNode);
         if (refuseUserInfoSet) client->ConfirmNextWith(ArmConfirmation::ApeCacheActionConfirmEx, 7);
         spy = std::make_unique<SpyArmClient>(client);
@@ -60,6 +61,7 @@ struct Participant {
         }
         loop.RunUntilIdle();
     }
+    ~Participant() { RecordingWindow::Uninstall(); }
 
     // The ids of the groups 1, 2, 3, 4, 7, 8 and 15 that are subscribed now.
     IdSet Subscribed() {
@@ -80,25 +82,27 @@ struct Participant {
     CChatClient engine;
 };
 
-class CachesTest : public ::testing::Test {
-protected:
-    void SetUp() override { RecordingWindow::Install(); }
-    void TearDown() override { RecordingWindow::Uninstall(); }
-};
-
-TEST_F(CachesTest, EachRoleSubscribesTheCachesItMayRead) {
+TEST(Caches, EachRoleSubscribesTheCachesItMayReadAndARoleChangeMovesThem) {
     Participant p;
-    ASSERT_EQ(p.engine.State(), kStateEnrolled);
-    struct RoleCase {
+    ASSERT_EQ(p.Subscribed(), (IdSet{15, 8}));
+    constexpr std::uint32_t kAsBefore = ~0u;  // no roster change: re-subscribe from the old role
+    const struct {
         const char* role;
-        std::uint32_t hostId;
-        std::uint32_t presenterId;
-        std::uint32_t rosters;
+        std::uint32_t hostId, presenterId, rosters;
         IdSet subscribed;
-    };
-    // One engine walks through the roles, so each row also checks that what the previous
-    // role read is given up.
-    const RoleCase cases[] = {
+    } steps[] = {
+        // Becoming host re-subscribes by the new role at once: the attendees' cache goes, the
+        // host's, host-and-presenter's and the panelists' come.
+        {"attendee becomes host", kMyNode, 0, kAsBefore, {15, 1, 3, 4, 7}},
+        {"host also becomes presenter", kMyNode, kMyNode, kAsBefore, {15, 1, 2, 3, 4, 7}},
+        // Still presenter (and panelist): host-and-presenter stays.
+        {"host role moves away", kOtherNode, kMyNode, kAsBefore, {15, 2, 3, 4, 7}},
+        // A presenter outside the chat roster changes no subscription by itself; the move
+        // from the previous role takes the presenter's cache and brings the attendees'.
+        {"presenter role moves away", kOtherNode, kOtherNode, kAsBefore, {15, 3, 4, 7, 8}},
+        {"presenter again", kOtherNode, kMyNode, kAsBefore, {15, 2, 3, 4, 7}},
+        {"host again", kMyNode, kMyNode, kAsBefore, {15, 1, 2, 3, 4, 7}},
+        // Subscribing by the rosters gives up what the previous role read.
         {"host", kMyNode, kOtherNode, ROLE_HOST | ROLE_PANELIST, {15, 1, 4, 3, 7}},
         {"presenter", kOtherNode, kMyNode, ROLE_PRESENTER | ROLE_PANELIST, {15, 2, 4, 3, 7}},
         {"both", kMyNode, kMyNode, ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST, {15, 1, 2, 3, 4, 7}},
@@ -106,51 +110,25 @@ TEST_F(CachesTest, EachRoleSubscribesTheCachesItMayRead) {
         {"attendee", kOtherNode, kOtherNode, 0, {15, 8}},
         {"attendee, no role held", 0, 0, 0, {15, 8}},
     };
-    for (const RoleCase& c : cases) {
+    std::uint32_t host = 0, presenter = 0;
+    for (const auto& c : steps) {
         SCOPED_TRACE(c.role);
-        p.engine.OnHostChanged(c.hostId);
-        p.engine.OnPresenterChanged(c.presenterId);
-        p.engine.SetRosters(c.rosters, 1);
-        p.engine.SubscribeAllGroupCaches();
-        EXPECT_EQ(p.Subscribed(), c.subscribed);
-    }
-}
-
-TEST_F(CachesTest, ARoleChangeMovesTheSubscriptionsFromTheOldRoleToTheNew) {
-    Participant p;
-    ASSERT_EQ(p.Subscribed(), (IdSet{15, 8}));
-    struct ChangeCase {
-        const char* change;
-        bool hostChange;  // else the presenter changes
-        std::uint32_t newHolder;
-        IdSet subscribed;
-    };
-    const ChangeCase cases[] = {
-        // Becoming host re-subscribes by the new role at once: the attendees' cache goes, the
-        // host's, host-and-presenter's and the panelists' come.
-        {"attendee becomes host", true, kMyNode, {15, 1, 3, 4, 7}},
-        {"host also becomes presenter", false, kMyNode, {15, 1, 2, 3, 4, 7}},
-        // Still presenter (and panelist): host-and-presenter stays.
-        {"host role moves away", true, kOtherNode, {15, 2, 3, 4, 7}},
-        // A presenter outside the chat roster changes no subscription by itself; the move
-        // from the previous role takes the presenter's cache and brings the attendees'.
-        {"presenter role moves away", false, kOtherNode, {15, 3, 4, 7, 8}},
-        {"presenter again", false, kMyNode, {15, 2, 3, 4, 7}},
-        {"host again", true, kMyNode, {15, 1, 2, 3, 4, 7}},
-    };
-    for (const ChangeCase& c : cases) {
-        SCOPED_TRACE(c.change);
-        if (c.hostChange) {
-            p.engine.OnHostChanged(c.newHolder);
+        // A re-subscription moves from the role before the one change the row makes.
+        const bool both = c.rosters != kAsBefore;
+        if (both || c.hostId != host) p.engine.OnHostChanged(host = c.hostId);
+        if (both || c.presenterId != presenter)
+            p.engine.OnPresenterChanged(presenter = c.presenterId);
+        if (c.rosters == kAsBefore) {
+            p.engine.ReSubscribeGroupCaches();
         } else {
-            p.engine.OnPresenterChanged(c.newHolder);
+            p.engine.SetRosters(c.rosters, 1);
+            p.engine.SubscribeAllGroupCaches();
         }
-        p.engine.ReSubscribeGroupCaches();
         EXPECT_EQ(p.Subscribed(), c.subscribed);
     }
 }
 
-TEST_F(CachesTest, ARequestIsSentOnlyWhenItWouldChangeTheSubscription) {
+TEST(Caches, ARequestIsSentOnlyWhenItWouldChangeTheSubscription) {
     Participant p;
     struct RequestCase {
         const char* request;
@@ -191,7 +169,7 @@ TEST_F(CachesTest, ARequestIsSentOnlyWhenItWouldChangeTheSubscription) {
     EXPECT_EQ(p.spy->Count("ApeRequestSharedDataEx"), before);
 }
 
-TEST_F(CachesTest, ARefusedRequestLeavesTheGroupAsItWasForALaterRetry) {
+TEST(Caches, ARefusedRequestLeavesTheGroupAsItWasForALaterRetry) {
     Participant p;
     p.client->FailNext(ArmOperation::ApeRequestSharedDataEx, 5);
     TraceCapture capture;
@@ -203,7 +181,7 @@ TEST_F(CachesTest, ARefusedRequestLeavesTheGroupAsItWasForALaterRetry) {
     EXPECT_EQ(p.Subscribed(), (IdSet{8}));
 }
 
-TEST_F(CachesTest, CachesNeverMarkedSetAreNeverSubscribed) {
+TEST(Caches, CachesNeverMarkedSetAreNeverSubscribed) {
     // The user-info cache's initialisation is refused, so the status cache is never marked
     // and no group cache is known to be set.
     Participant p(true);
@@ -222,7 +200,7 @@ TEST_F(CachesTest, CachesNeverMarkedSetAreNeverSubscribed) {
     EXPECT_EQ(p.Subscribed(), IdSet{});
 }
 
-TEST_F(CachesTest, CacheActionConfirmationsDriveTheNextStep) {
+TEST(Caches, CacheActionConfirmationsDriveTheNextStep) {
     enum Entity { kUserInfo, kStatus, kGroupCache, kNoEntity };
     struct ConfirmCase {
         const char* confirmation;
@@ -270,7 +248,7 @@ TEST_F(CachesTest, CacheActionConfirmationsDriveTheNextStep) {
     }
 }
 
-TEST_F(CachesTest, InitialisingSetsEveryCacheFromOneSharedBlock) {
+TEST(Caches, InitialisingSetsEveryCacheFromOneSharedBlock) {
     for (const std::uint32_t customerId : {0u, 5000u}) {
         SCOPED_TRACE(customerId);
         Participant p;
@@ -301,7 +279,7 @@ TEST_F(CachesTest, InitialisingSetsEveryCacheFromOneSharedBlock) {
     }
 }
 
-TEST_F(CachesTest, AHandleRequestCarriesNamesOnly) {
+TEST(Caches, AHandleRequestCarriesNamesOnly) {
     Participant p;
     ASSERT_NE(p.engine.UserInfoCacheHandle().handle_value, 0u);
     // Asked again, with the handles of the first answer known, the entries still go out
@@ -322,7 +300,7 @@ TEST_F(CachesTest, AHandleRequestCarriesNamesOnly) {
     }
 }
 
-TEST_F(CachesTest, TheStatusCacheAnswerDecidesWhetherToInitialiseOrJoin) {
+TEST(Caches, TheStatusCacheAnswerDecidesWhetherToInitialiseOrJoin) {
     const std::vector<std::uint8_t> mark = {'1', '\0'};
     struct AnswerCase {
         const char* answer;
@@ -372,7 +350,7 @@ TEST_F(CachesTest, TheStatusCacheAnswerDecidesWhetherToInitialiseOrJoin) {
     }
 }
 
-TEST_F(CachesTest, HandlesAndGroupIdsMapBothWays) {
+TEST(Caches, HandlesAndGroupIdsMapBothWays) {
     Participant p;
     for (std::uint32_t id : {1u, 15u, 7u, kHighGroupId}) {
         SCOPED_TRACE(id);

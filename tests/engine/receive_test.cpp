@@ -84,57 +84,50 @@ protected:
     ChatRoom room{3};
 };
 
-TEST_F(Receiving, AGroupMessageReachesItsAudienceWithItsTitle) {
-    const Names panel{"Hana", "Pia", "Paul"};
+TEST_F(Receiving, AMessageReachesItsAudienceWithItsTitle) {
+    const Names panel{"Hana", "Pia", "Paul"}, all{"Hana", "Pia", "Paul", "Ann"};
+    constexpr bool kGroup = false, kPrivate = true;
     const struct {
         int from;  // 0 Hana, 3 Ann
-        std::uint32_t groupId;
+        bool privately;
+        std::int32_t to;  // group id, or receive id (1: Hana's user id)
         const char* title;
         Names holders;
     } rows[] = {
         // The attendees' chat is kept from host and presenter, not from panelists.
-        {3, GROUP_ATTENDEES, "from Ann to All Attendees", {"Paul", "Ann"}},
-        {3, GROUP_HOST, "from Ann to Host (privately)", {"Hana", "Ann"}},
-        {3, GROUP_PRESENTER, "from Ann to Presenter (privately)", {"Pia", "Ann"}},
-        {3, GROUP_HOST_PRESENTER, "from Ann to Host & Presenter", {"Hana", "Pia", "Ann"}},
-        {3, GROUP_PANELISTS, "from Ann to All Panelists", {"Hana", "Pia", "Paul", "Ann"}},
-        {3, GROUP_EVERYONE, "from Ann to All Participants", {"Hana", "Pia", "Paul", "Ann"}},
+        {3, kGroup, GROUP_ATTENDEES, "from Ann to All Attendees", {"Paul", "Ann"}},
+        {3, kGroup, GROUP_HOST, "from Ann to Host (privately)", {"Hana", "Ann"}},
+        {3, kGroup, GROUP_PRESENTER, "from Ann to Presenter (privately)", {"Pia", "Ann"}},
+        {3, kGroup, GROUP_HOST_PRESENTER, "from Ann to Host & Presenter", {"Hana", "Pia", "Ann"}},
+        {3, kGroup, GROUP_PANELISTS, "from Ann to All Panelists", all},
+        {3, kGroup, GROUP_EVERYONE, "from Ann to All Participants", all},
         // However an attendee came by a copy, panel chat is for the privileged.
-        {0, GROUP_PANELISTS, "from Hana to All Panelists", panel},
-        {0, GROUP_HOST_PRESENTER_PANELISTS, "from Hana to Host, Presenter & Panelists", panel},
+        {0, kGroup, GROUP_PANELISTS, "from Hana to All Panelists", panel},
+        {0, kGroup, GROUP_HOST_PRESENTER_PANELISTS, "from Hana to Host, Presenter & Panelists",
+         panel},
         // No cache: the message's own group id decides; an unknown one only its sender sees.
-        {3, 99, "", {"Ann"}},
+        {3, kGroup, 99, "", {"Ann"}},
+        {3, kPrivate, -1, "from Ann to Host (privately)", {"Hana", "Ann"}},
+        {3, kPrivate, -3, "from Ann to Presenter (privately)", {"Pia", "Ann"}},
+        {3, kPrivate, -2, "from Ann to Host & Presenter", {"Hana", "Pia", "Ann"}},
+        {3, kPrivate, -6, "from Ann to All Attendees", {"Paul", "Ann"}},
+        {3, kPrivate, 0, "from Ann to All Participants", all},
+        // Between two people nobody else sees it while no history is restored.
+        {3, kPrivate, 1, "from Ann to Hana (privately)", {"Hana", "Ann"}},
+        {3, kPrivate, -4, "from Ann to  (privately)", {"Ann"}},
     };
     int n = 0;
     for (const auto& row : rows) {
         const std::string text = "line " + std::to_string(++n);
         const char* name = row.from == 0 ? "Hana" : "Ann";
-        ToGroup(row.groupId, GroupLine(Id(row.from), name, row.groupId, text), Id(row.from));
-        EXPECT_EQ(room.Holders(std::string(row.title) + "|" + text), row.holders) << row.title;
-    }
-}
-
-TEST_F(Receiving, APrivateMessageIsShownByItsReceiveId) {
-    const struct {
-        std::int32_t recId;  // 1: Hana's user id
-        const char* title;
-        Names holders;
-    } rows[] = {
-        {-1, "from Ann to Host (privately)", {"Hana", "Ann"}},
-        {-3, "from Ann to Presenter (privately)", {"Pia", "Ann"}},
-        {-2, "from Ann to Host & Presenter", {"Hana", "Pia", "Ann"}},
-        {-6, "from Ann to All Attendees", {"Paul", "Ann"}},
-        {0, "from Ann to All Participants", {"Hana", "Pia", "Paul", "Ann"}},
-        // Between two people nobody else sees it while no history is restored.
-        {1, "from Ann to Hana (privately)", {"Hana", "Ann"}},
-        {-4, "from Ann to  (privately)", {"Ann"}},
-    };
-    int n = 0;
-    for (const auto& row : rows) {
-        const std::string text = "private " + std::to_string(++n);
-        const std::uint32_t to = row.recId == 1 ? Id(0) : static_cast<std::uint32_t>(row.recId);
-        Privately(PrivateLine(Id(3), "Ann", to, text), Id(3));
-        EXPECT_EQ(room.Holders(std::string(row.title) + "|" + text), row.holders) << row.title;
+        const std::uint32_t to =
+            row.privately && row.to == 1 ? Id(0) : static_cast<std::uint32_t>(row.to);
+        if (row.privately) {
+            Privately(PrivateLine(Id(row.from), name, to, text), Id(row.from));
+        } else {
+            ToGroup(to, GroupLine(Id(row.from), name, to, text), Id(row.from));
+        }
+        EXPECT_EQ(room.Holders(std::string(row.title) + "|" + text), row.holders) << text;
     }
 }
 
@@ -258,19 +251,13 @@ std::string Stamp(const DateTimeRec& t) {
     return text;
 }
 
-TEST(Showing, ALineGoesToWindowTranscriptAndHostWithTheClocksTimeAndOneSound) {
-    std::vector<std::string> played;
-    SetSoundPlayer([&played](const char* path) { played.push_back(path); });
+TEST(Showing, ALineGoesToWindowTranscriptAndHostWithTheClocksTime) {
     HostRecorder host;
     ChatRoom room(3);
     Member& hana = room.Join({"Hana", kHost, ROLE_HOST}, &host);
     Member& ann = room.Join({"Ann", kAttendee, 0});
     Member& paul = room.Join({"Paul", kPanelist, ROLE_PANELIST});
     room.SetHostAndPresenter(kHost, kPresenter);
-    hana.engine.SetSoundIncomingChat(2);
-    FSRef sound{};
-    std::snprintf(sound.path, sizeof sound.path, "/sounds/ding.aiff");
-    hana.engine.SetSoundFSSpec(sound);
     // A stamp one second before the new year, whatever the clock shows now.
     std::int64_t eve = 0;
     ASSERT_TRUE(UnixSecondsFromCalendar({2021, 12, 31, 23, 59, 59, true}, &eve));
@@ -292,20 +279,18 @@ TEST(Showing, ALineGoesToWindowTranscriptAndHostWithTheClocksTimeAndOneSound) {
     // The host answers the one who wrote to it: the sender is picked as a recent partner.
     EXPECT_TRUE(hana.engine.IsUserSelectedUser(kAttendee));
 
-    // The first-line sound does not play again; a new line carries the new time.
+    // A new line carries the new time.
     room.loop.AdvanceBy(1.0);
     room.Say(paul, "later", GROUP_EVERYONE);
     EXPECT_EQ(ChatRoom::Transcript(hana).back(), "from Paul to All Participants|later");
     EXPECT_EQ(Stamp(hana.engine.ChatContent().GetTimeAt(1)), "2022-01-01 00:00:00/1");
-    EXPECT_EQ(played, Names{"/sounds/ding.aiff"});
     // A panelist answers group chat the same way; an attendee does not.
     room.Say(hana, "to all", GROUP_EVERYONE);
     EXPECT_TRUE(paul.engine.IsUserSelectedUser(kHost));
     EXPECT_FALSE(ann.engine.IsUserSelectedUser(kHost));
-    SetSoundPlayer(nullptr);
 }
 
-TEST(Showing, TheSoundModeDecidesWhichLinesPlay) {
+TEST(Showing, TheSoundModeDecidesWhichLinesPlayTheChosenFile) {
     const struct {
         PlaySoundMode mode;
         std::uint32_t panel;
@@ -314,8 +299,8 @@ TEST(Showing, TheSoundModeDecidesWhichLinesPlay) {
     } rows[] = {{0, 1, "/s", 0}, {1, 0, "/s", 0}, {1, 1, "/s", 3},
                 {2, 0, "/s", 1}, {3, 0, "/s", 3}, {3, 1, "", 0}};
     for (const auto& row : rows) {
-        std::size_t played = 0;
-        SetSoundPlayer([&played](const char*) { ++played; });
+        Names played;
+        SetSoundPlayer([&played](const char* path) { played.push_back(path); });
         CChatClient engine;
         engine.SetSoundIncomingChat(row.mode);
         FSRef file{};
@@ -324,7 +309,7 @@ TEST(Showing, TheSoundModeDecidesWhichLinesPlay) {
         engine.SetPanelStatus(row.panel);
         for (int i = 0; i < 3; ++i)
             engine.PlaySoundIfNeed();
-        EXPECT_EQ(played, row.plays) << row.mode << "/" << row.panel << row.file;
+        EXPECT_EQ(played, Names(row.plays, row.file)) << row.mode << "/" << row.panel << row.file;
     }
     SetSoundPlayer(nullptr);
 }
