@@ -5,20 +5,7 @@
 
 #include "kyutil/ky_string2.h"
 
-TEST(KyString2, NullAndEmptyTextsAreEqual) {
-    CKyString2 text("abc");
-    text.CopyFrom(static_cast<const char*>(nullptr));
-    EXPECT_EQ(nullptr, text.GetData());
-    EXPECT_TRUE(text.IsEmpty());
-    EXPECT_TRUE(text.Equals(static_cast<const char*>(nullptr)));
-    EXPECT_TRUE(CKyString2("").Equals(text));
-
-    const CKyString2 zeros(3);
-    EXPECT_EQ(3, zeros.GetLength());
-    EXPECT_EQ('\0', zeros[2]);
-}
-
-TEST(KyString2, EqualsComparesEveryByteCaseSensitively) {
+TEST(KyString2, NullAndEmptyTextsAreEqualAndOtherwiseEveryByteCounts) {
     struct Case {
         const char* a;
         const char* b;
@@ -34,6 +21,11 @@ TEST(KyString2, EqualsComparesEveryByteCaseSensitively) {
         EXPECT_EQ(c.equal, a.Equals(c.b));
         EXPECT_EQ(c.equal, a.Equals(CKyString2(c.b)));
     }
+    CKyString2 text("abc");
+    text.CopyFrom(static_cast<const char*>(nullptr));
+    EXPECT_EQ(nullptr, text.GetData());
+    EXPECT_TRUE(text.IsEmpty());
+    EXPECT_TRUE(text.Equals(static_cast<const char*>(nullptr)));
 }
 
 TEST(KyString2, LongTextsAreCutTo65535Bytes) {
@@ -64,40 +56,28 @@ TEST(KyString2, CopyingItsOwnTextIsSafe) {
     EXPECT_STREQ("llo", other.GetData());
 }
 
-TEST(KyString2, DeleteStaysWithinTheText) {
+TEST(KyString2, DeleteAndMidStayWithinTheText) {
     struct Case {
+        bool mid;
         int32_t start;
         int32_t count;
-        int32_t result;
-        const char* after;
+        const char* text;  // what Delete leaves of "hello", or the part Mid takes
+        int32_t result;    // Delete's answer
     };
     const Case cases[] = {
-        {1, 2, 3, "hlo"},    {-3, 2, 3, "llo"}, {0, 0, -1, "hello"},
-        {5, 1, -1, "hello"}, {3, 10, 3, "hel"}, {0, 5, 0, ""},
+        {false, 1, 2, "hlo", 3},    {false, -3, 2, "llo", 3}, {false, 0, 0, "hello", -1},
+        {false, 5, 1, "hello", -1}, {false, 3, 10, "hel", 3}, {false, 0, 5, "", 0},
+        {true, 1, 3, "ell", 0},     {true, -2, 2, "he", 0},   {true, 3, 10, "lo", 0},
+        {true, 5, 2, "", 0},        {true, 6, 2, "", 0},      {true, 1, -1, "", 0},
     };
     for (const Case& c : cases) {
-        SCOPED_TRACE(::testing::Message() << c.start << "," << c.count);
+        SCOPED_TRACE(::testing::Message() << c.mid << ": " << c.start << "," << c.count);
         CKyString2 text("hello");
-        EXPECT_EQ(c.result, text.Delete(c.start, c.count));
-        EXPECT_STREQ(c.after, text.GetData());
-        EXPECT_EQ(std::strlen(c.after), text.GetLength());
-    }
-}
-
-TEST(KyString2, MidCutsAtTheEndOfTheText) {
-    struct Case {
-        int32_t start;
-        int32_t count;
-        const char* part;
-    };
-    const Case cases[] = {
-        {1, 3, "ell"}, {-2, 2, "he"}, {3, 10, "lo"}, {5, 2, ""}, {6, 2, ""}, {1, -1, ""},
-    };
-    const CKyString2 text("hello");
-    for (const Case& c : cases) {
-        SCOPED_TRACE(::testing::Message() << c.start << "," << c.count);
-        const CKyString2 part = text.Mid(c.start, c.count);
-        EXPECT_STREQ(c.part, part.GetData());
-        EXPECT_EQ(std::strlen(c.part), part.GetLength());
+        if (!c.mid) {
+            EXPECT_EQ(c.result, text.Delete(c.start, c.count));
+        }
+        const CKyString2 seen = c.mid ? text.Mid(c.start, c.count) : text;
+        EXPECT_STREQ(c.text, seen.GetData());
+        EXPECT_EQ(std::strlen(c.text), seen.GetLength());
     }
 }

@@ -84,12 +84,6 @@ TEST(Envelope, AnEmptyMainTypeIsWrittenAsAnEmptyElement) {
     EXPECT_EQ(pdu.ToWireText(), "<chat ver=\"1.0\"><mtype /></chat>");
 }
 
-TEST(Envelope, TheBaseBuildsNothing) {
-    CKvoChatXMLPDU pdu(11, 7);
-    EXPECT_EQ(pdu.GenerateXMLPDU(), 0);
-    EXPECT_EQ(pdu.ToWireText(), "");
-}
-
 TEST(Envelope, ASecondGenerateOrParseReplacesTheFirst) {
     CGroupMessagePDU pdu;
     pdu.SetSendID(1u);

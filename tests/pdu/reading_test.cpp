@@ -132,20 +132,4 @@ TEST(Reading, OneFaqObjectTakesEveryConfigurationAndKeepsWhatALaterOneLacks) {
     EXPECT_EQ(pdu.GetEmailAddress(), "b@example.org");
     EXPECT_EQ(pdu.ParseXMLPDU(Chat(11, "<fname>Bo</fname>")), 0);
     EXPECT_EQ(pdu.GetFirstName(), "Ann");
-    // Configuration is only read, never generated: the document stays what was last read.
-    const std::string read = pdu.ToWireText();
-    EXPECT_EQ(pdu.GenerateXMLPDU(), 0);
-    EXPECT_EQ(pdu.ToWireText(), read);
-}
-
-TEST(Reading, ARefusedCustomerIdKeepsTheOneBefore) {
-    CCustomerIdPDU pdu;
-    ASSERT_EQ(pdu.ParseXMLPDU(Chat(11, "<customerid>77</customerid>")), 1);
-    EXPECT_EQ(pdu.ParseXMLPDU(Chat(11, "<customerid></customerid>")), 0);
-    EXPECT_EQ(pdu.GetCustomerId_DWORD(), 77u);
-    ASSERT_EQ(pdu.ParseXMLPDU(Chat(11, "<customerid>0</customerid>")), 1);
-    EXPECT_EQ(pdu.GetCustomerId(), "0");
-    CPrimCustNodeIdPDU node;
-    ASSERT_EQ(node.ParseXMLPDU(Chat(10, "<primcust>4294967295</primcust>")), 1);
-    EXPECT_EQ(node.GetPrimCustNodeId_DWORD(), 0xFFFFFFFFu);
 }
