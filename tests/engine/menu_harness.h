@@ -133,6 +133,14 @@ inline std::vector<std::string> Titles(const CChatClient& engine) {
     return titles;
 }
 
+// The texts joined with "|", so that a table row states a whole menu or command run in one text.
+inline std::string Join(const std::vector<std::string>& texts) {
+    std::string joined;
+    for (std::size_t i = 0; i < texts.size(); ++i)
+        joined += (i ? "|" : "") + texts[i];
+    return joined;
+}
+
 class MenuHarness {
 public:
     explicit MenuHarness(const Options& options = Options()) {
