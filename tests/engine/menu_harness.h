@@ -5,7 +5,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdint>
+#include <cstdlib>
 #include <map>
 #include <memory>
 #include <string>
@@ -17,6 +19,7 @@
 #include "platform/inproc_conference.h"
 #include "platform/virtual_run_loop.h"
 #include "tests/support/recording_window.h"
+#include "tests/support/trace_capture.h"
 
 namespace menutest {
 
@@ -141,6 +144,25 @@ inline std::string Join(const std::vector<std::string>& texts) {
     return joined;
 }
 
+// "|"-joined texts apart again; an empty text holds none.
+inline std::vector<std::string> Split(const std::string& joined) {
+    std::vector<std::string> texts;
+    for (std::size_t from = 0; !joined.empty() && from <= joined.size();) {
+        const std::size_t bar = std::min(joined.find('|', from), joined.size());
+        texts.push_back(joined.substr(from, bar - from));
+        from = bar + 1;
+    }
+    return texts;
+}
+
+// What follows the prefix in each trace line that starts with it, joined with "|".
+inline std::string Traced(const TraceCapture& trace, const std::string& prefix) {
+    std::vector<std::string> rests;
+    for (const std::string& text : trace.Texts())
+        if (text.rfind(prefix, 0) == 0) rests.push_back(text.substr(prefix.size()));
+    return Join(rests);
+}
+
 class MenuHarness {
 public:
     explicit MenuHarness(const Options& options = Options()) {
@@ -177,6 +199,15 @@ public:
         }
     }
 
+    // The same from "|"-joined "title id" texts, e.g. "Host 1|---|All Attendees 8".
+    void Seed(const char* groups) {
+        for (const std::string& g : Split(groups)) {
+            const std::size_t space = g.rfind(' ');
+            const int id = g == "---" ? 0 : std::atoi(g.c_str() + space + 1);
+            Seed({{g.substr(0, space), static_cast<std::uint32_t>(id)}});
+        }
+    }
+
     // One record of this session holding the entries, reported as added, deleted or modified.
     void Report(std::vector<ReportEntry> entries, std::uint32_t added, std::uint32_t deleted,
                 std::uint32_t modified) {
@@ -194,6 +225,7 @@ public:
     void Modify(const Person& person) { Report({EntryFor(person)}, 0, 0, 1); }
 
     std::vector<std::string> Titles() const { return menutest::Titles(engine); }
+    std::string Menu() const { return Join(Titles()); }
     // The commands the window saw since the last call, described.
     std::vector<std::string> Commands() {
         std::vector<std::string> out;
@@ -202,6 +234,7 @@ public:
         window->Clear();
         return out;
     }
+    std::string Seen() { return Join(Commands()); }
 
     // The conference an engine started with the conference option is attached through.
     struct Conference {

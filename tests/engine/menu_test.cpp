@@ -16,69 +16,51 @@ using namespace menutest;
 namespace {
 
 using Strings = std::vector<std::string>;
-using Seed = std::vector<std::pair<std::string, std::uint32_t>>;
 
 constexpr std::uint32_t kQM = FEATURE_QM_MODE;
 constexpr const char* kDoubledSeparator =
     "CChatClient::InsertRecentUserName : add sep indexStart+2 != indexEnd";
-
-const Seed kPanelTail = {
-    {"---", 0}, {"All Participants", 15}, {"---", 0}, {"Select an Attendee...", 16}};
-
-struct InsertCase {
-    const char* scenario;
-    Options options;
-    Seed seed;
-    Strings names;  // inserted in order as nodes 201, 202, ...
-    Strings menu;
-    Strings commands;
-};
+constexpr const char* kPanelTail = "---|All Participants 15|---|Select an Attendee... 16";
 
 }  // namespace
 
 TEST(InsertChatUserName, PlacesAttendeesByMeetingTypeAndRules) {
-    const InsertCase cases[] = {
-        {"type 1: below All Attendees, case-insensitive, equal titles above",
-         {1},
-         {{"Host", 1}, {"All Attendees", 8}, {"All Panelists", 4}},
-         {"bob", "Alice", "carol", "BOB"},
-         {"Host", "All Attendees", "Alice", "BOB", "bob", "carol", "All Panelists"},
-         {"insert 2 bob", "insert 2 Alice", "insert 4 carol", "insert 3 BOB"}},
-        {"type 2 without All Attendees: appended",
-         {2},
-         {{"Host", 1}},
-         {"bob", "Alice"},
-         {"Host", "bob", "Alice"},
-         {"insert -1 bob", "insert -1 Alice"}},
-        {"QM: a separator opens the participant section under Everyone",
-         {1, false, 0, kQM},
-         {},
-         {"bob", "Alice"},
-         {"Everyone", "---", "Alice", "bob"},
-         {"insert -1 ---", "insert -1 bob", "insert 2 Alice"}},
-        {"type 3: attendees fenced between All Participants and the picker",
-         {3},
-         kPanelTail,
-         {"bob", "Alice"},
-         {"Host", "Presenter", "Host & Presenter", "---", "All Panelists", "---",
-          "All Participants", "---", "Alice", "bob", "---", "Select an Attendee..."},
-         {"insert 7 ---", "insert 8 bob", "insert 8 Alice"}},
-        {"type 3 without everyone or attendees entry: appended, no separator",
-         {3},
-         {},
-         {"bob"},
-         {"Host", "Presenter", "Host & Presenter", "---", "All Panelists", "bob"},
-         {"insert -1 bob"}},
+    struct Case {
+        const char* scenario;
+        std::int32_t meetingType;
+        std::uint32_t features;
+        const char* seed;
+        const char* names;  // inserted in order as nodes 201, 202, ...
+        const char* menu;
+        const char* commands;
     };
-    for (const InsertCase& c : cases) {
+    const Case cases[] = {
+        {"type 1: below All Attendees, case-insensitive, equal titles above", 1, 0,
+         "Host 1|All Attendees 8|All Panelists 4", "bob|Alice|carol|BOB",
+         "Host|All Attendees|Alice|BOB|bob|carol|All Panelists",
+         "insert 2 bob|insert 2 Alice|insert 4 carol|insert 3 BOB"},
+        {"type 2 without All Attendees: appended", 2, 0, "Host 1", "bob|Alice", "Host|bob|Alice",
+         "insert -1 bob|insert -1 Alice"},
+        {"QM: a separator opens the participant section under Everyone", 1, kQM, "", "bob|Alice",
+         "Everyone|---|Alice|bob", "insert -1 ---|insert -1 bob|insert 2 Alice"},
+        {"type 3: attendees fenced between All Participants and the picker", 3, 0, kPanelTail,
+         "bob|Alice",
+         "Host|Presenter|Host & Presenter|---|All Panelists|---|All Participants|---|Alice|bob|---|"
+         "Select an Attendee...",
+         "insert 7 ---|insert 8 bob|insert 8 Alice"},
+        {"type 3 without everyone or attendees entry: appended, no separator", 3, 0, "", "bob",
+         "Host|Presenter|Host & Presenter|---|All Panelists|bob", "insert -1 bob"},
+    };
+    for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
-        MenuHarness h(c.options);
+        MenuHarness h({c.meetingType, false, 0, c.features});
         h.Seed(c.seed);
         h.Commands();
-        for (std::size_t i = 0; i < c.names.size(); ++i)
-            h.engine.InsertChatUserName(c.names[i].c_str(), 201 + i, 0);
-        EXPECT_EQ(h.Titles(), c.menu);
-        EXPECT_EQ(h.Commands(), c.commands);
+        const Strings names = Split(c.names);
+        for (std::size_t i = 0; i < names.size(); ++i)
+            h.engine.InsertChatUserName(names[i].c_str(), 201 + i, 0);
+        EXPECT_EQ(h.Menu(), c.menu);
+        EXPECT_EQ(h.Seen(), c.commands);
     }
 }
 
@@ -86,20 +68,20 @@ TEST(InsertChatUserName, LocalParticipantAndPracticeAddNothing) {
     const std::string reapplied = "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65615";
     for (const bool host : {false, true}) {  // a privileged participant re-applies its privilege
         MenuHarness h({1});
-        h.Seed({{"All Attendees", 8}});
+        h.Seed("All Attendees 8");
         if (host) h.engine.OnHostChanged(kMyNode);
         TraceCapture trace;
         h.engine.InsertChatUserName("me", kMyNode, 0);
         EXPECT_EQ(trace.Has(reapplied), host);
-        EXPECT_EQ(h.Titles(), Strings({host ? "*All Attendees" : "All Attendees"}));
+        EXPECT_EQ(h.Menu(), host ? "*All Attendees" : "All Attendees");
     }
     MenuHarness attendee({1});
-    attendee.Seed({{"All Attendees", 8}});
+    attendee.Seed("All Attendees 8");
     attendee.engine.SetPracticeStatus(1);
     attendee.Commands();
     attendee.engine.InsertChatUserName("bob", 201, 0);
-    EXPECT_EQ(attendee.Titles(), Strings({"*All Attendees"}));
-    EXPECT_EQ(attendee.Commands(), Strings());
+    EXPECT_EQ(attendee.Menu(), "*All Attendees");
+    EXPECT_EQ(attendee.Seen(), "");
 }
 
 TEST(InsertChatUserName, SecondInsertOnlySelectsInThePanelMeeting) {
@@ -108,7 +90,7 @@ TEST(InsertChatUserName, SecondInsertOnlySelectsInThePanelMeeting) {
     h.engine.InsertChatUserName("bob", 201, 0);
     h.Commands();
     h.engine.InsertChatUserName("bob", 201, 1);
-    EXPECT_EQ(h.Commands(), Strings({"select 8"}));
+    EXPECT_EQ(h.Seen(), "select 8");
 }
 
 TEST(InsertChatUserName, PrivateOnlyAttendeeInputFollowsParticipantEntries) {
@@ -116,64 +98,53 @@ TEST(InsertChatUserName, PrivateOnlyAttendeeInputFollowsParticipantEntries) {
     h.engine.OnHostChanged(300);  // once a host is in, private chat alone is allowed
     h.Enroll({{300, "hank", ROLE_HOST}});
     h.engine.OnPrivilegeChanged(0x8, 0);
-    h.Seed({{"All Attendees", 8}});
+    h.Seed("All Attendees 8");
     h.Commands();
     h.engine.InsertChatUserName("bob", 201, 0);
-    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "input 1"}));
+    EXPECT_EQ(h.Seen(), "insert -1 bob|input 1");
     h.engine.RemoveChatUserName("bob", 201, 1);
-    EXPECT_EQ(h.Commands(), Strings({"remove 1", "input 0", "msg_ClearInput"}));
+    EXPECT_EQ(h.Seen(), "remove 1|input 0|msg_ClearInput");
 }
 
 TEST(SetGroupMenuEnable, TellsOnlyOfChangesAndAnInsertReplacesADisabledSelection) {
     MenuHarness h({1});
-    h.Seed({{"Host", 1}, {"All Attendees", 8}});
-    h.engine.SelectMenuItemByIndex(1);
+    h.Seed("Host 1|All Attendees 8");
     h.Commands();
+    h.engine.SelectMenuItemByIndex(1);
+    h.engine.SelectMenuItemByIndex(5);  // indices outside the menu are ignored
+    h.engine.SelectMenuItemByIndex(-1);
+    EXPECT_EQ(h.Seen(), "select 1");
     h.engine.SetGroupMenuEnable(8, false);
     h.engine.SetGroupMenuEnable(8, false);
     h.engine.SetGroupMenuEnable(4, false);  // no such entry
-    EXPECT_EQ(h.Commands(), Strings({"update 1 off"}));
+    EXPECT_EQ(h.Seen(), "update 1 off");
     h.engine.InsertChatUserName("bob", 201, 0);  // the first enabled entry takes the selection
-    EXPECT_EQ(h.Titles(), Strings({"*Host", "All Attendees", "bob"}));
-    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "select 0"}));
+    EXPECT_EQ(h.Menu(), "*Host|All Attendees|bob");
+    EXPECT_EQ(h.Seen(), "insert -1 bob|select 0");
     h.engine.SetGroupMenuEnable(8, true);
-    EXPECT_EQ(h.Commands(), Strings({"update 1 on"}));
+    EXPECT_EQ(h.Seen(), "update 1 on");
 }
 
 TEST(RemoveChatUserName, TidiesSeparatorsAndFallsBack) {
     struct Case {
         const char* scenario;
         bool selector;
-        Seed seed;
+        const char* seed;
         bool disableEveryone;
-        Strings menu;
-        Strings commands;
+        const char* menu;
+        const char* commands;
     };
     const Case cases[] = {
-        {"selected entry gone: the everyone entry takes over",
-         false,
-         {{"All Participants", 15}, {"All Attendees", 8}},
-         false,
-         {"*All Participants", "All Attendees"},
-         {"remove 2", "select 0"}},
-        {"everyone disabled: the first enabled entry takes over",
-         false,
-         {{"All Participants", 15}, {"All Attendees", 8}},
-         true,
-         {"All Participants", "*All Attendees"},
-         {"remove 2", "select 1"}},
-        {"the trailing separator goes",
-         false,
-         {{"All Attendees", 8}, {"---", 0}},
-         false,
-         {"*All Attendees"},
-         {"remove 1", "remove 1", "select 0"}},
-        {"with the attendee picker the trailing separator stays",
-         true,
-         {{"All Attendees", 8}, {"---", 0}},
-         false,
-         {"*All Attendees", "---"},
-         {"remove 1", "select 0"}},
+        {"selected entry gone: the everyone entry takes over", false,
+         "All Participants 15|All Attendees 8", false, "*All Participants|All Attendees",
+         "remove 2|select 0"},
+        {"everyone disabled: the first enabled entry takes over", false,
+         "All Participants 15|All Attendees 8", true, "All Participants|*All Attendees",
+         "remove 2|select 1"},
+        {"the trailing separator goes", false, "All Attendees 8|---", false, "*All Attendees",
+         "remove 1|remove 1|select 0"},
+        {"with the attendee picker the trailing separator stays", true, "All Attendees 8|---",
+         false, "*All Attendees|---", "remove 1|select 0"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
@@ -184,8 +155,8 @@ TEST(RemoveChatUserName, TidiesSeparatorsAndFallsBack) {
         h.engine.SelectMenuItemByIndex(h.engine.GetIndexOfMenuByNodeID(201));
         h.Commands();
         h.engine.RemoveChatUserName("bob", 201, 0);
-        EXPECT_EQ(h.Titles(), c.menu);
-        EXPECT_EQ(h.Commands(), c.commands);
+        EXPECT_EQ(h.Menu(), c.menu);
+        EXPECT_EQ(h.Seen(), c.commands);
     }
 }
 
@@ -196,73 +167,38 @@ TEST(RemoveChatUserNameInQM, SelectedEntryLeavesAsDepartedAudience) {
     h.engine.SelectMenuItemByIndexInQM(2);
     h.Commands();
     h.engine.RemoveChatUserNameInQM("carl", 202);
-    EXPECT_EQ(h.Commands(), Strings({"remove 3"}));
+    EXPECT_EQ(h.Seen(), "remove 3");
     h.engine.RemoveChatUserNameInQM("bob", 201);
-    EXPECT_EQ(h.Commands(), Strings({"left 2", "input 0", "remove 1"}));
-    EXPECT_EQ(h.Titles(), Strings({"Everyone"}));
+    EXPECT_EQ(h.Seen(), "left 2|input 0|remove 1");
+    EXPECT_EQ(h.Menu(), "Everyone");
 }
 
 TEST(RemoveChatUserNameInQM, RoleEntryGoesOnlyWhenSelectedAndTakesItsSeparatorAlong) {
-    const std::string status =
-        "CChatClient::RemoveChatUserNameInQM,user[node is 300] selected status ";
-    const std::string separator =
-        "CChatClient::RemoveChatUserNameInQM,remove spe line,its index is ";
     struct Case {
         const char* scenario;
         std::int32_t meetingType;  // 1 brings the everyone entry, 2 does not
         std::uint32_t host, presenter;
-        Seed seed;
+        const char* seed;
         int selected;  // index selected before the node leaves
-        Strings menu;
-        Strings commands;
-        Strings log;
+        const char* menu;
+        const char* commands;
+        const char* status;     // the logged selected status and index of hank's entry
+        const char* separator;  // the logged index of the separator removed with it
     };
     const Case cases[] = {
-        {"host entry selected, the local participant presents: separator above goes",
-         1,
-         300,
-         kMyNode,
-         {{"---", 0}, {"Host", 1}, {"Presenter", 2}},
-         2,
-         {"Everyone", "Presenter"},
-         {"left 2", "input 0", "remove 1"},
-         {status + "1,its index is 2", separator + "1"}},
-        {"host entry not selected: it stays",
-         1,
-         300,
-         kMyNode,
-         {{"---", 0}, {"Host", 1}, {"Presenter", 2}},
-         0,
-         {"*Everyone", "---", "hank (Host)", "Presenter"},
-         {},
-         {status + "0,its index is 2"}},
-        {"host entry selected, the presenter is someone else: separator stays",
-         1,
-         300,
-         301,
-         {{"---", 0}, {"Host", 1}, {"Presenter", 2}},
-         2,
-         {"Everyone", "---", "Presenter"},
-         {"left 2", "input 0"},
-         {status + "1,its index is 2"}},
-        {"presenter entry selected with no host known",
-         1,
-         0,
-         300,
-         {{"---", 0}, {"Presenter", 2}},
-         2,
-         {"Everyone"},
-         {"left 2", "input 0", "remove 1"},
-         {status + "1,its index is 2", separator + "1"}},
-        {"combined entry at the top: the separator now at the top goes",
-         2,
-         300,
-         300,
-         {{"Host & Presenter", 3}, {"---", 0}, {"All Attendees", 8}},
-         0,
-         {"All Attendees"},
-         {"left 0", "input 0", "remove 0"},
-         {status + "1,its index is 0", separator + "0"}},
+        {"host entry selected, the local participant presents: separator above goes", 1, 300,
+         kMyNode, "---|Host 1|Presenter 2", 2, "Everyone|Presenter", "left 2|input 0|remove 1",
+         "1,its index is 2", "1"},
+        {"host entry not selected: it stays", 1, 300, kMyNode, "---|Host 1|Presenter 2", 0,
+         "*Everyone|---|hank (Host)|Presenter", "", "0,its index is 2", ""},
+        {"host entry selected, the presenter is someone else: separator stays", 1, 300, 301,
+         "---|Host 1|Presenter 2", 2, "Everyone|---|Presenter", "left 2|input 0",
+         "1,its index is 2", ""},
+        {"presenter entry selected with no host known", 1, 0, 300, "---|Presenter 2", 2, "Everyone",
+         "left 2|input 0|remove 1", "1,its index is 2", "1"},
+        {"combined entry at the top: the separator now at the top goes", 2, 300, 300,
+         "Host & Presenter 3|---|All Attendees 8", 0, "All Attendees", "left 0|input 0|remove 0",
+         "1,its index is 0", "0"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
@@ -278,37 +214,41 @@ TEST(RemoveChatUserNameInQM, RoleEntryGoesOnlyWhenSelectedAndTakesItsSeparatorAl
         h.Commands();
         TraceCapture trace;
         h.Leave({300, "hank", ROLE_HOST});
-        EXPECT_EQ(h.Titles(), c.menu);
-        EXPECT_EQ(h.Commands(), c.commands);
-        for (const std::string& line : c.log)
-            EXPECT_TRUE(trace.Has(line)) << line;
-        EXPECT_EQ(trace.Has(separator + "0") || trace.Has(separator + "1"), c.log.size() == 2);
+        EXPECT_EQ(h.Menu(), c.menu);
+        EXPECT_EQ(h.Seen(), c.commands);
+        EXPECT_EQ(Traced(trace,
+                         "CChatClient::RemoveChatUserNameInQM,user[node is 300] selected "
+                         "status "),
+                  c.status);
+        EXPECT_EQ(
+            Traced(trace, "CChatClient::RemoveChatUserNameInQM,remove spe line,its index is "),
+            c.separator);
     }
 }
 
 TEST(RecentEntries, PickerKeepsTwentyNewestFirst) {
     MenuHarness h({1, true});
     h.engine.OnHostChanged(kMyNode);
-    h.Seed({{"All Attendees", 8}});
+    h.Seed("All Attendees 8");
     std::vector<Person> people;
     for (std::uint32_t i = 1; i <= 21; ++i)
         people.push_back({200 + i, "u" + std::to_string(i)});
     h.Enroll(people);
-    EXPECT_EQ(h.Titles(), Strings({"All Attendees"}));  // picked attendees only
+    EXPECT_EQ(h.Menu(), "All Attendees");  // picked attendees only
 
     for (std::uint32_t i = 1; i <= 20; ++i)
         EXPECT_TRUE(h.engine.SelectUserByNodeID(200 + i, false, true));
     h.Commands();
     EXPECT_TRUE(h.engine.SelectUserByNodeID(221, false, true));
-    EXPECT_EQ(h.Commands(), Strings({"remove 20", "insert 1 u21", "select 1"}));
-    ASSERT_EQ(h.Titles().size(), 21u);
-    EXPECT_EQ(h.Titles()[1], "*u21");
-    EXPECT_EQ(h.Titles()[20], "u2");
-    EXPECT_EQ(h.engine.GetIndexOfMenuByNodeID(201), -1);
+    EXPECT_EQ(h.Seen(), "remove 20|insert 1 u21|select 1");
+    std::string menu = "All Attendees|*u21";
+    for (int i = 20; i >= 2; --i)
+        menu += "|u" + std::to_string(i);
+    EXPECT_EQ(h.Menu(), menu);
 
     // Picking again moves the entry to the top.
     EXPECT_TRUE(h.engine.SelectUserByNodeID(205, false, true));
-    EXPECT_EQ(h.Commands(), Strings({"remove 17", "insert 1 u5", "select 1"}));
+    EXPECT_EQ(h.Seen(), "remove 17|insert 1 u5|select 1");
 }
 
 TEST(RecentEntries, GoBelowTheSeparatorsUnderAllAttendees) {
@@ -316,39 +256,32 @@ TEST(RecentEntries, GoBelowTheSeparatorsUnderAllAttendees) {
         SCOPED_TRACE(meetingType);
         MenuHarness h({meetingType, true});
         h.engine.OnHostChanged(kMyNode);
-        h.Seed({{"All Attendees", 8}, {"---", 0}, {"Host", 1}});
+        h.Seed("All Attendees 8|---|Host 1");
         h.Enroll({{201, "ann"}});
         h.Commands();
         EXPECT_TRUE(h.engine.SelectUserByNodeID(201, false, true));
-        EXPECT_EQ(h.Commands(), Strings({"insert 2 ann", "select 2"}));
+        EXPECT_EQ(h.Seen(), "insert 2 ann|select 2");
     }
 }
 
 TEST(RecentEntries, PanelMeetingWithoutEveryoneWalksDownFromAllAttendees) {
-    const std::string below = "CChatClient::InsertRecentUserName item below'all attendee'";
+    const std::string below = "item below'all attendee'";
     for (const bool attendees : {false, true}) {
         SCOPED_TRACE(attendees);
         MenuHarness h({3});
         h.engine.SetRosters(ROLE_PANELIST, 1);
-        if (attendees) h.Seed({{"All Attendees", 8}, {"Select an Attendee...", 16}});
+        if (attendees) h.Seed("All Attendees 8|Select an Attendee... 16");
         h.Enroll({{201, ""}, {202, "bo"}});
         h.Commands();
         TraceCapture trace;
         h.engine.SelectUserByNodeID(201, false, true);
         h.engine.SelectUserByNodeID(202, false, true);
-        Strings log;
-        for (const TraceLine& line : trace.Lines())
-            if (line.text.rfind("CChatClient::InsertRecentUserName", 0) == 0)
-                log.push_back(line.text);
-        if (!attendees) {
-            EXPECT_EQ(log, Strings(2, "CChatClient::InsertRecentUserName indexStart== -1"));
-            EXPECT_EQ(h.Commands(), Strings());
-            continue;
-        }
         // Every entry passed is logged, an untitled one with the short form.
-        EXPECT_EQ(log, Strings({below + ", Select an Attendee...", below + " ",
-                                below + ", Select an Attendee..."}));
-        EXPECT_EQ(h.Commands(), Strings({"insert 6 ", "select 6", "insert 7 bo", "select 7"}));
+        EXPECT_EQ(Traced(trace, "CChatClient::InsertRecentUserName "),
+                  attendees ? below + ", Select an Attendee...|" + below + " |" + below +
+                                  ", Select an Attendee..."
+                            : "indexStart== -1|indexStart== -1");
+        EXPECT_EQ(h.Seen(), attendees ? "insert 6 |select 6|insert 7 bo|select 7" : "");
     }
 }
 
@@ -363,28 +296,28 @@ TEST(RecentEntries, PanelMeetingSectionAndDepartures) {
     // A separator already stood above the picker: the new one doubles it.
     EXPECT_TRUE(trace.Has(TraceLevel::Warn, kDoubledSeparator));
     EXPECT_TRUE(h.engine.SelectUserByNodeID(202, false, true));
-    EXPECT_EQ(h.Commands(),
-              Strings({"insert 7 ---", "insert 8 a1", "select 8", "insert 8 a2", "select 8"}));
+    EXPECT_EQ(h.Seen(), "insert 7 ---|insert 8 a1|select 8|insert 8 a2|select 8");
     h.Leave({201, "a1"});
-    EXPECT_EQ(h.Commands(), Strings({"remove 9"}));
+    EXPECT_EQ(h.Seen(), "remove 9");
     h.Leave({202, "a2"});
-    EXPECT_EQ(h.Commands(), Strings({"remove 8", "remove 8", "select 6"}));
-    EXPECT_EQ(h.Titles(), Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists",
-                                   "---", "*All Participants", "---", "Select an Attendee..."}));
+    EXPECT_EQ(h.Seen(), "remove 8|remove 8|select 6");
+    EXPECT_EQ(h.Menu(),
+              "Host|Presenter|Host & Presenter|---|All Panelists|---|*All "
+              "Participants|---|Select an Attendee...");
 }
 
 TEST(RecentEntries, PanelMeetingSeparatorGoesBetweenEveryoneAndThePickerBelowIt) {
     MenuHarness h({3});
     h.engine.SetRosters(ROLE_PANELIST, 1);
-    h.Seed({{"---", 0}, {"All Participants", 15}, {"Select an Attendee...", 16}, {"---", 0}});
+    h.Seed("---|All Participants 15|Select an Attendee... 16|---");
     h.Enroll({{201, "a1"}});
     h.Commands();
     TraceCapture trace;
     EXPECT_TRUE(h.engine.SelectUserByNodeID(201, false, true));
-    EXPECT_EQ(h.Titles(),
-              Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists", "---",
-                       "All Participants", "---", "*a1", "Select an Attendee...", "---"}));
-    EXPECT_EQ(h.Commands(), Strings({"insert 7 ---", "insert 8 a1", "select 8"}));
+    EXPECT_EQ(h.Menu(),
+              "Host|Presenter|Host & Presenter|---|All Panelists|---|All "
+              "Participants|---|*a1|Select an Attendee...|---");
+    EXPECT_EQ(h.Seen(), "insert 7 ---|insert 8 a1|select 8");
     EXPECT_TRUE(trace.Has("CChatClient::InsertRecentUserName : add sep"));
     EXPECT_FALSE(trace.Has(TraceLevel::Warn, kDoubledSeparator));
 }
@@ -393,31 +326,27 @@ TEST(SelectUserByNodeID, FollowsRolesEntriesAndTestOnly) {
     MenuHarness h({1});
     h.engine.OnHostChanged(300);
     h.engine.OnPresenterChanged(301);
-    h.Seed({{"Host", 1}, {"Presenter", 2}, {"All Attendees", 8}});
+    h.Seed("Host 1|Presenter 2|All Attendees 8");
     h.Enroll({{300, "hank", ROLE_HOST}, {301, "pia", ROLE_PRESENTER}, {201, "ann"}, {202, "bea"}});
     h.engine.RemoveChatUserName("bea", 202, 0);
-    ASSERT_EQ(h.Titles(), Strings({"Host", "Presenter", "All Attendees", "ann"}));
+    ASSERT_EQ(h.Menu(), "Host|Presenter|All Attendees|ann");
     h.Commands();
 
     struct Case {
         std::uint32_t node;
         bool testOnly, select, result;
-        Strings commands;
+        const char* commands;
     };
     const Case cases[] = {
-        {300, false, true, true, {"select 0"}},
-        {301, false, true, true, {"select 1"}},
-        {201, false, true, true, {"select 3"}},
-        {201, false, true, true, {}},
-        {300, true, true, true, {}},
-        {201, false, false, false, {}},
-        {202, true, true, false, {}},
-        {999, false, true, false, {}},
+        {300, false, true, true, "select 0"}, {301, false, true, true, "select 1"},
+        {201, false, true, true, "select 3"}, {201, false, true, true, ""},
+        {300, true, true, true, ""},          {201, false, false, false, ""},
+        {202, true, true, false, ""},         {999, false, true, false, ""},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.node);
         EXPECT_EQ(h.engine.SelectUserByNodeID(c.node, c.testOnly, c.select), c.result);
-        EXPECT_EQ(h.Commands(), c.commands);
+        EXPECT_EQ(h.Seen(), c.commands);
     }
     EXPECT_TRUE(h.engine.CanChatWith(301, false));
     h.engine.SetGroupMenuEnable(2, false);
@@ -429,10 +358,10 @@ TEST(SelectUserByNodeID, QMCombinedHolderSelectsItsRoleEntry) {
     h.engine.OnHostChanged(300);
     h.engine.OnPresenterChanged(300);  // the combined role entry takes the place of "Host"
     h.Enroll({{300, "hank", ROLE_HOST}});
-    EXPECT_EQ(h.Titles(), Strings({"Everyone", "hank (Host & Presenter)"}));
+    EXPECT_EQ(h.Menu(), "Everyone|hank (Host & Presenter)");
     h.Commands();
     EXPECT_TRUE(h.engine.SelectUserByNodeID(300, false, true));
-    EXPECT_EQ(h.Commands(), Strings({"select+input 1"}));
+    EXPECT_EQ(h.Seen(), "select+input 1");
 }
 
 TEST(CanChatWith, PanelMeetingMenuOnlyPracticeAndAttendeeTest) {
@@ -463,20 +392,9 @@ TEST(EveryoneOnly, SelectionAlwaysLandsOnEveryone) {
     h.Commands();
     h.engine.SelectMenuItemByIndex(0);
     h.engine.SelectMenuItemByIndex(8);
-    EXPECT_EQ(h.Commands(), Strings({"select 6", "select 6"}));
+    EXPECT_EQ(h.Seen(), "select 6|select 6");
     EXPECT_FALSE(h.engine.CanChatWith(201, false));
     EXPECT_FALSE(h.engine.CanChatWith(201, true));
-}
-
-TEST(SelectMenuItemByIndex, IgnoresIndicesOutsideTheMenu) {
-    MenuHarness h({1});
-    h.Seed({{"All Attendees", 8}});
-    h.engine.SelectMenuItemByIndex(0);
-    h.Commands();
-    h.engine.SelectMenuItemByIndex(5);
-    h.engine.SelectMenuItemByIndex(-1);
-    EXPECT_EQ(h.Commands(), Strings());
-    EXPECT_EQ(h.Titles(), Strings({"*All Attendees"}));
 }
 
 TEST(ExternalInternalTags, MarkFollowsTheTaggingMode) {
@@ -484,22 +402,22 @@ TEST(ExternalInternalTags, MarkFollowsTheTaggingMode) {
         std::int32_t mode;
         std::uint32_t tag;
         const char* title;
+        const char* mark;
     };
-    const Case cases[] = {{0, 1, "ann"},
-                          {1, 1, "ann (internal)"},
-                          {1, 2, "ann"},
-                          {2, 2, "ann (external)"},
-                          {2, 1, "ann"}};
+    const Case cases[] = {{0, 1, "ann", ""},
+                          {1, 1, "ann (internal)", ", internal"},
+                          {1, 2, "ann", ""},
+                          {2, 2, "ann (external)", ", external"},
+                          {2, 1, "ann", ""}};
     for (const Case& c : cases) {
         SCOPED_TRACE(c.title);
         MenuHarness h({1, false, c.mode});
         h.engine.OnHostChanged(300);
-        h.Seed({{"All Attendees", 8}});
+        h.Seed("All Attendees 8");
         h.Enroll({{201, "ann", 0, c.tag}, {300, "hank", ROLE_HOST, c.tag}});
         h.engine.InsertExternalInternalChatUserName("hank", 300, c.tag);  // hosts go unmarked
-        EXPECT_EQ(h.Titles(), Strings({"All Attendees", c.title, "hank"}));
-        EXPECT_EQ(h.engine.GetUserExternalInternalString(c.tag, 1),
-                  std::string(c.title) == "ann" ? "" : (c.tag == 1 ? ", internal" : ", external"));
+        EXPECT_EQ(h.Menu(), "All Attendees|" + std::string(c.title) + "|hank");
+        EXPECT_EQ(h.engine.GetUserExternalInternalString(c.tag, 1), c.mark);
     }
 }
 
@@ -509,14 +427,14 @@ TEST(WindowReentry, SelectionReportsFromInsideCommandsEndOnTheRightEntry) {
     Options normal{1};
     normal.answerBack = true;
     MenuHarness h(normal);
-    h.Seed({{"All Participants", 15}, {"All Attendees", 8}});
+    h.Seed("All Participants 15|All Attendees 8");
     EXPECT_EQ(h.Commands().front(), "report 0");
     h.Enroll({{201, "bob"}});
     h.Commands();
     EXPECT_TRUE(h.engine.SelectUserByNodeID(201, false, true));
     h.Leave({201, "bob"});  // the fallback selection is reported back too
-    EXPECT_EQ(h.Commands(), Strings({"select 2", "report 2", "remove 2", "select 0", "report 0"}));
-    EXPECT_EQ(h.Titles(), Strings({"*All Participants", "All Attendees"}));
+    EXPECT_EQ(h.Seen(), "select 2|report 2|remove 2|select 0|report 0");
+    EXPECT_EQ(h.Menu(), "*All Participants|All Attendees");
 
     Options qm{1, false, 0, kQM};
     qm.answerBack = true;
@@ -525,11 +443,10 @@ TEST(WindowReentry, SelectionReportsFromInsideCommandsEndOnTheRightEntry) {
     q.Commands();
     EXPECT_TRUE(q.engine.SelectUserByNodeID(202, false, true));
     q.Leave({202, "carl"});  // the window shows the departed audience and reports -1
-    EXPECT_EQ(q.Titles(), Strings({"Everyone", "---", "bob"}));
+    EXPECT_EQ(q.Menu(), "Everyone|---|bob");
     EXPECT_TRUE(q.engine.SelectUserByNodeID(201, false, true));
-    EXPECT_EQ(q.Commands(), Strings({"select+input 3", "report 3", "left 3", "report -1", "input 0",
-                                     "select+input 2", "report 2"}));
-    EXPECT_EQ(q.Titles(), Strings({"Everyone", "---", "*bob"}));
+    EXPECT_EQ(q.Seen(), "select+input 3|report 3|left 3|report -1|input 0|select+input 2|report 2");
+    EXPECT_EQ(q.Menu(), "Everyone|---|*bob");
 }
 
 // The model's indexed answers against a plain walk of its entries, through random insertions
