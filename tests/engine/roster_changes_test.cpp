@@ -2,16 +2,13 @@
 // lays them out, including enroll data that no honest participant would send.
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <cstdint>
-#include <memory>
 #include <string>
 #include <vector>
 
 #include "pdu/xml_limits.h"
-#include "platform/inproc_conference.h"
 #include "platform/string_table.h"
-#include "platform/virtual_run_loop.h"
+#include "tests/engine/chat_room.h"
 #include "tests/engine/menu_harness.h"
 #include "tests/support/german_host.h"
 #include "tests/support/trace_capture.h"
@@ -19,8 +16,6 @@
 using namespace menutest;
 
 namespace {
-
-using Strings = std::vector<std::string>;
 
 constexpr const char* kPrivilegeReapplied =
     "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65615";
@@ -33,7 +28,7 @@ const UserItem* Find(const MenuHarness& h, std::uint32_t node) {
 
 TEST(ApeRosterChanged, WalksOnlyRecordsOfTheOwnSession) {
     MenuHarness h({1});
-    h.Seed({{"All Attendees", 8}});
+    h.Seed("All Attendees 8");
     h.Commands();
     RosterReport report;
     report.Record(kSession + 1, {EntryFor({201, "other"})})
@@ -42,14 +37,14 @@ TEST(ApeRosterChanged, WalksOnlyRecordsOfTheOwnSession) {
     EXPECT_EQ(h.engine.ApeRosterChanged(1, 0, 3, 0, 0, report.Records()), 0);
     EXPECT_EQ(Find(h, 201), nullptr);
     EXPECT_EQ(h.engine.UserList().GetCount(), 3u);
-    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "amy", "bob", "cy"}));
-    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "insert 1 amy", "insert -1 cy"}));
+    EXPECT_EQ(h.Menu(), "All Attendees|amy|bob|cy");
+    EXPECT_EQ(h.Seen(), "insert -1 bob|insert 1 amy|insert -1 cy");
     EXPECT_EQ(h.engine.ApeRosterChanged(1, 0, 1, 1, 1, nullptr), 0);
 }
 
 TEST(ApeRosterChanged, AddsThenDeletesThenModifiesInOneCallback) {
     MenuHarness h({1});
-    h.Seed({{"All Attendees", 8}});
+    h.Seed("All Attendees 8");
     h.Enroll({{201, "ann"}});
     h.Commands();
     RosterReport report;
@@ -62,22 +57,21 @@ TEST(ApeRosterChanged, AddsThenDeletesThenModifiesInOneCallback) {
     EXPECT_EQ(Find(h, 202)->dwRoles, ROLE_PANELIST);
     EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
     // bob's new panelist role re-applies the privilege: his entry is re-created as a panelist's.
-    EXPECT_EQ(h.Titles(), Strings({"*All Attendees", "bob"}));
-    EXPECT_EQ(h.Commands(),
-              Strings({"insert -1 bob", "remove 1", "remove 1", "insert -1 bob", "remove 1",
-                       "insert -1 bob", "select 0", "msg_EnableUserList", "input 1",
-                       "msg_CloseAttendeeWarning", "msg_CloseAttendeeDialog"}));
+    EXPECT_EQ(h.Menu(), "*All Attendees|bob");
+    EXPECT_EQ(h.Seen(),
+              "insert -1 bob|remove 1|remove 1|insert -1 bob|remove 1|insert -1 bob|select "
+              "0|msg_EnableUserList|input 1|msg_CloseAttendeeWarning|msg_CloseAttendeeDialog");
     EXPECT_TRUE(h.engine.Menu()[1].bPanelist);
 }
 
 TEST(ProcessAddEnrollInfo, IgnoresDuplicatesAndTheRecorder) {
     MenuHarness h({1});
-    h.Seed({{"All Attendees", 8}});
+    h.Seed("All Attendees 8");
     h.Enroll({{201, "ann"}});
     h.Enroll({{201, "ann"}});
     h.Enroll({{202, "KVO_SSR_987_RECORDER-654"}, {203, "Kvo_Ssr_987_Recorder-654"}});
     EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
-    EXPECT_EQ(h.Titles(), Strings({"All Attendees", "ann"}));
+    EXPECT_EQ(h.Menu(), "All Attendees|ann");
 }
 
 TEST(ProcessAddEnrollInfo, PanelMeetingListsPanelistsNotAttendees) {
@@ -85,9 +79,8 @@ TEST(ProcessAddEnrollInfo, PanelMeetingListsPanelistsNotAttendees) {
     h.Commands();
     h.Enroll({{201, "carl"}, {202, "zoe", ROLE_PANELIST}, {203, "Adam", ROLE_PANELIST}});
     EXPECT_EQ(h.engine.UserList().GetCount(), 3u);
-    EXPECT_EQ(h.Titles(), Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists",
-                                   "Adam", "zoe"}));
-    EXPECT_EQ(h.Commands(), Strings({"insert 5 zoe", "insert 5 Adam"}));
+    EXPECT_EQ(h.Menu(), "Host|Presenter|Host & Presenter|---|All Panelists|Adam|zoe");
+    EXPECT_EQ(h.Seen(), "insert 5 zoe|insert 5 Adam");
     EXPECT_TRUE(h.engine.Menu()[5].bPanelist);
 }
 
@@ -97,22 +90,22 @@ TEST(ProcessAddEnrollInfo, PrivateChatPrivilegeOrHostGivesEntries) {
         std::int32_t meetingType;
         std::uint32_t privilege;
         bool host;
-        Strings menu;
+        const char* menu;
     };
     const Case cases[] = {
-        {"type 1 attendee without private chat", 1, 0x1, false, {"All Attendees"}},
-        {"type 1 attendee with private chat", 1, 0x8, false, {"All Attendees", "ann"}},
-        {"type 1 host whatever the privilege", 1, 0, true, {"All Attendees", "ann"}},
-        {"type 2 host whatever the privilege", 2, 0, true, {"All Attendees", "ann"}},
+        {"type 1 attendee without private chat", 1, 0x1, false, "All Attendees"},
+        {"type 1 attendee with private chat", 1, 0x8, false, "All Attendees|ann"},
+        {"type 1 host whatever the privilege", 1, 0, true, "All Attendees|ann"},
+        {"type 2 host whatever the privilege", 2, 0, true, "All Attendees|ann"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
         MenuHarness h({c.meetingType});
         if (c.host) h.engine.OnHostChanged(kMyNode);
         h.engine.OnPrivilegeChanged(c.privilege, 0);
-        h.Seed({{"All Attendees", 8}});
+        h.Seed("All Attendees 8");
         h.Enroll({{201, "ann"}});
-        EXPECT_EQ(h.Titles(), c.menu);
+        EXPECT_EQ(h.Menu(), c.menu);
     }
 }
 
@@ -121,72 +114,64 @@ TEST(ProcessAddEnrollInfo, OwnRecordReappliesThePrivilege) {
         SCOPED_TRACE(scheme2);
         MenuHarness h({1, false, 0, scheme2 ? FEATURE_GROUP_SCHEME2 : 0u});
         TraceCapture trace;
-        h.Report({{kMyNode, kMyUser, EnrollBytes({kMyNode, "me"}), true}}, 1, 0, 0);
+        h.Enroll({{kMyNode, "me"}});
         EXPECT_EQ(trace.Has(kPrivilegeReapplied), !scheme2);
         EXPECT_EQ(h.engine.GetIndexOfMenuByNodeID(kMyNode), -1);
     }
 }
 
 TEST(ProcessAddEnrollInfo, QMHostReturnsToEveryoneForEachArrivalAfterItsOwnRecord) {
-    const ReportEntry own{kMyNode, kMyUser, EnrollBytes({kMyNode, "me", ROLE_HOST}), true};
-    const ReportEntry bob = EntryFor({201, "bob"});
-    struct Case {
-        const char* scenario;
-        std::vector<ReportEntry> report;
-        Strings commands;
-    };
+    const Person own{kMyNode, "me", ROLE_HOST};
+    const Person bob{201, "bob"};
     // The own record re-applies the privilege: everyone stays selected, and an attendee's entry
     // is re-created below the separator that opens the participant section.
-    const Strings reapplied = {"select 0", "msg_EnableUserList",       "input 1",
-                               "select 0", "msg_CloseAttendeeWarning", "msg_CloseAttendeeDialog"};
-    const Strings bobAgain = {"remove 2", "remove 1", "insert -1 ---", "insert -1 bob"};
-    const auto join = [](Strings a, const Strings& b) {
-        a.insert(a.end(), b.begin(), b.end());
-        return a;
+    const std::string reapplied =
+        "|select 0|msg_EnableUserList|input 1|select 0|msg_CloseAttendeeWarning|"
+        "msg_CloseAttendeeDialog";
+    const std::string bobAgain = "|remove 2|remove 1|insert -1 ---|insert -1 bob";
+    struct Case {
+        const char* scenario;
+        std::vector<Person> report;
+        std::string commands;
     };
     const Case cases[] = {
-        {"own record alone", {own}, join({"select+input 0"}, reapplied)},
+        {"own record alone", {own}, "select+input 0" + reapplied},
         {"an arrival after the own record",
          {own, bob},
-         join(
-             join({"select+input 0", "insert -1 ---", "insert -1 bob", "select+input 0"}, bobAgain),
-             reapplied)},
+         "select+input 0|insert -1 ---|insert -1 bob|select+input 0" + bobAgain + reapplied},
         {"an arrival before the own record",
          {bob, own},
-         join(join({"insert -1 ---", "insert -1 bob", "select+input 0"}, bobAgain), reapplied)},
+         "insert -1 ---|insert -1 bob|select+input 0" + bobAgain + reapplied},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
         MenuHarness h({1, false, 0, FEATURE_QM_MODE});
         h.engine.OnHostChanged(kMyNode);
         h.Commands();
-        h.Report(c.report, 1, 0, 0);
-        EXPECT_EQ(h.Commands(), c.commands);
+        h.Enroll(c.report);
+        EXPECT_EQ(h.Seen(), c.commands);
         EXPECT_EQ(h.Titles()[0], "*Everyone");
     }
 }
 
 TEST(RosterChanges, BeforeHostChangeReappliesThePrivilegeWithForce) {
-    // The QM trace shows the force flag of each re-application.
-    const std::string reapplied =
-        "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65615, bDefault = ";
     struct Case {
         const char* scenario;
         std::int32_t meetingType;
         bool modify;  // else an add
         Person person;
-        Strings forces;  // of the re-applications, in order
+        const char* forces;  // of the re-applications, in order
     };
     const Case cases[] = {
         {"type 3: the host's arrival ends the before-host state",
          3,
          false,
          {300, "hank", ROLE_HOST},
-         {"1"}},
-        {"type 3: an attendee's arrival changes nothing", 3, false, {201, "ann"}, {}},
-        {"type 1: the host's arrival re-applies nothing", 1, false, {300, "hank", ROLE_HOST}, {}},
-        {"modify to host", 1, true, {201, "ann", ROLE_HOST}, {"1"}},
-        {"modify keeping the before-host state", 1, true, {201, "anne"}, {"0"}},
+         "1"},
+        {"type 3: an attendee's arrival changes nothing", 3, false, {201, "ann"}, ""},
+        {"type 1: the host's arrival re-applies nothing", 1, false, {300, "hank", ROLE_HOST}, ""},
+        {"modify to host", 1, true, {201, "ann", ROLE_HOST}, "1"},
+        {"modify keeping the before-host state", 1, true, {201, "anne"}, "0"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
@@ -198,10 +183,8 @@ TEST(RosterChanges, BeforeHostChangeReappliesThePrivilegeWithForce) {
         } else {
             h.Enroll({c.person});
         }
-        Strings forces;
-        for (const std::string& text : trace.Texts())
-            if (text.rfind(reapplied, 0) == 0) forces.push_back(text.substr(reapplied.size()));
-        EXPECT_EQ(forces, c.forces);
+        // The QM trace shows the force flag of each re-application.
+        EXPECT_EQ(Traced(trace, std::string(kPrivilegeReapplied) + ", bDefault = "), c.forces);
     }
 }
 
@@ -210,8 +193,8 @@ TEST(ProcessAddEnrollInfo, QMPresenterEntryIsRetitled) {
     h.engine.OnPresenterChanged(301);  // brings the role entry, titled once pia is in
     h.Commands();
     h.Enroll({{301, "pia", ROLE_PRESENTER}});
-    EXPECT_EQ(h.Commands(), Strings({"rename 0 pia (Presenter)"}));
-    EXPECT_EQ(h.Titles(), Strings({"pia (Presenter)"}));
+    EXPECT_EQ(h.Seen(), "rename 0 pia (Presenter)");
+    EXPECT_EQ(h.Menu(), "pia (Presenter)");
 }
 
 // The component's table translates "Host" for a German host.
@@ -220,10 +203,10 @@ TEST_F(GermanHost, QMHostEntryTitleIsTranslatedButTheRoleWordIsNot) {
     MenuHarness h({1, false, 1, FEATURE_QM_MODE});
     h.Commands();
     h.engine.OnHostChanged(300);  // the role entry comes with the role, titled once known
-    EXPECT_EQ(h.Commands(), Strings({"insert -1 Gastgeber"}));
+    EXPECT_EQ(h.Seen(), "insert -1 Gastgeber");
     h.Enroll({{300, "Hank", ROLE_HOST, 1}});
-    EXPECT_EQ(h.Commands(), Strings({"rename 1 Hank (Host, internal)"}));
-    EXPECT_EQ(h.Titles(), Strings({"Everyone", "Hank (Host, internal)"}));
+    EXPECT_EQ(h.Seen(), "rename 1 Hank (Host, internal)");
+    EXPECT_EQ(h.Menu(), "Everyone|Hank (Host, internal)");
 }
 
 TEST(ProcessAddEnrollInfo, QMPrivateOnlyOpensAndClosesTheUserList) {
@@ -232,9 +215,9 @@ TEST(ProcessAddEnrollInfo, QMPrivateOnlyOpensAndClosesTheUserList) {
     h.engine.OnPrivilegeChanged(0x8, 0);
     h.Commands();
     h.Enroll({{201, "bob"}});
-    EXPECT_EQ(h.Commands(), Strings({"insert -1 bob", "input 1", "msg_EnableUserList"}));
+    EXPECT_EQ(h.Seen(), "insert -1 bob|input 1|msg_EnableUserList");
     h.Leave({201, "bob"});
-    EXPECT_EQ(h.Commands(), Strings({"remove 0", "input 0", "msg_DisableUserList"}));
+    EXPECT_EQ(h.Seen(), "remove 0|input 0|msg_DisableUserList");
     EXPECT_EQ(h.engine.UserList().GetCount(), 0u);
 }
 
@@ -299,43 +282,39 @@ TEST(ProcessDeleteEnrollInfo, ParticipantWithoutANodeIdLeavesTheMenuAsItWas) {
     // carry it), so it must not get an entry that could not be taken out again.
     struct Case {
         const char* scenario;
-        Options options;
-        std::uint32_t host;
-        bool picked;  // the host picks the participant in the attendee picker
-        Strings menu;
+        std::uint32_t features;
+        std::uint32_t host;  // the local participant picks node 0 in the attendee picker
+        const char* menu;
     };
     const Case cases[] = {
-        {"normal rules", {1}, 300, false, {"All Attendees", "---", "Host"}},
-        {"QM rules: the role entries come with the roles",
-         {1, false, 0, FEATURE_QM_MODE},
-         300,
-         false,
-         {"Everyone", "Host", "Presenter", "All Attendees", "---", "Host"}},
-        {"picked by the host", {1, true}, kMyNode, true, {"All Attendees", "---", "Host"}},
+        {"normal rules", 0, 300, "All Attendees|---|Host"},
+        {"QM rules: the role entries come with the roles", FEATURE_QM_MODE, 300,
+         "Everyone|Host|Presenter|All Attendees|---|Host"},
+        {"picked by the host", 0, kMyNode, "All Attendees|---|Host"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
-        MenuHarness h(c.options);
+        MenuHarness h({1, c.host == kMyNode, 0, c.features});
         h.engine.OnHostChanged(c.host);
         h.engine.OnPresenterChanged(301);
-        h.Seed({{"All Attendees", 8}, {"---", 0}, {"Host", 1}});
+        h.Seed("All Attendees 8|---|Host 1");
         h.Commands();
         h.Enroll({{0, "ghost"}});
-        if (c.picked) {
+        if (c.host == kMyNode) {
             EXPECT_FALSE(h.engine.SelectUserByNodeID(0, false, true));
         }
         EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
-        EXPECT_EQ(h.Titles(), c.menu);
-        EXPECT_EQ(h.Commands(), Strings());
+        EXPECT_EQ(h.Menu(), c.menu);
+        EXPECT_EQ(h.Seen(), "");
         h.Leave({0, "ghost"});
         EXPECT_EQ(h.engine.UserList().GetCount(), 0u);
-        EXPECT_EQ(h.Titles(), c.menu);
+        EXPECT_EQ(h.Menu(), c.menu);
     }
 }
 
 TEST(ProcessModifyEnrollInfo, UpdatesTheItemButNotTheTitle) {
     MenuHarness h({1});
-    h.Seed({{"All Attendees", 8}});
+    h.Seed("All Attendees 8");
     h.Enroll({{201, "ann"}});
     TraceCapture trace;
     h.Modify({201, "anne", ROLE_PANELIST, 2});
@@ -346,7 +325,7 @@ TEST(ProcessModifyEnrollInfo, UpdatesTheItemButNotTheTitle) {
     EXPECT_EQ(ann->dwExternalTag, 2u);
     // The modify keeps the title, but the privilege it re-applies re-creates the entry, now a
     // panelist's, from the roster's name.
-    EXPECT_EQ(h.Titles(), Strings({"*All Attendees", "anne"}));
+    EXPECT_EQ(h.Menu(), "*All Attendees|anne");
     EXPECT_TRUE(trace.Has(kPrivilegeReapplied));
 
     trace.Clear();
@@ -354,84 +333,47 @@ TEST(ProcessModifyEnrollInfo, UpdatesTheItemButNotTheTitle) {
     EXPECT_FALSE(trace.Has(kPrivilegeReapplied));
 }
 
-namespace {
-
 // Participants on one in-process conference, each an engine with its own service object.
-class ConferenceRoster : public ::testing::Test {
-protected:
-    void SetUp() override { RecordingWindow::Install(); }
-    void TearDown() override {
-        members.clear();
-        RecordingWindow::Uninstall();
-    }
-
-    CChatClient& Join(std::uint32_t node, const char* name, std::int32_t meetingType) {
-        members.push_back(std::make_unique<CChatClient>());
-        ChatData data{};
-        data.pArmClient = conference.CreateClient(loop, node);
-        data.wConferenceID = conference.ConferenceId();
-        data.dwSessionID = kSession;
-        data.lpszUserName = name;
-        data.dwNodeID = node;
-        data.lMeetingType = meetingType;
-        members.back()->Initialize(data);
-        loop.RunUntilIdle();
-        return *members.back();
-    }
-    void Leave(const CChatClient& engine) {
-        members.erase(std::find_if(members.begin(), members.end(),
-                                   [&engine](const auto& m) { return m.get() == &engine; }));
-        loop.RunUntilIdle();
-    }
-
-    VirtualRunLoop loop;
-    ScopedCurrentRunLoop current{&loop};
-    InProcessConference conference;
-    std::vector<std::unique_ptr<CChatClient>> members;
-};
-
-}  // namespace
-
-TEST_F(ConferenceRoster, PrivateChatEntriesFollowArrivalsAndDepartures) {
+TEST(ConferenceRoster, PrivateChatEntriesFollowArrivalsAndDepartures) {
+    chatroom::ChatRoom room(1);
     // The host allows private chat once each participant is in.
-    CChatClient& alice = Join(7, "Alice", 1);
+    CChatClient& alice = room.Join({"Alice", 7, 0}).engine;
     alice.OnPrivilegeChanged(0x4F, 0);
-    CChatClient& bob = Join(9, "Bob", 1);
+    CChatClient& bob = room.Join({"Bob", 9, 0}).engine;
     bob.OnPrivilegeChanged(0x4F, 0);
-    CChatClient& carl = Join(11, "Carl", 1);
-    carl.OnPrivilegeChanged(0x4F, 0);
-    Join(13, kRecorderName, 1);
+    room.Join({"Carl", 11, 0}).engine.OnPrivilegeChanged(0x4F, 0);
+    room.Join({kRecorderName, 13, 0});
     EXPECT_EQ(alice.UserList().GetCount(), 3u);
-    EXPECT_EQ(Titles(alice), Strings({"Bob", "Carl"}));
+    EXPECT_EQ(Join(Titles(alice)), "Bob|Carl");
     // The own record's privilege re-application selects the first entry there is.
-    EXPECT_EQ(Titles(bob), Strings({"*Alice", "Carl"}));
-    EXPECT_EQ(Titles(carl), Strings({"*Alice", "Bob"}));
+    EXPECT_EQ(Join(Titles(bob)), "*Alice|Carl");
+    EXPECT_EQ(Join(Titles(room.members[2]->engine)), "*Alice|Bob");
 
-    Leave(carl);
-    EXPECT_EQ(Titles(alice), Strings({"Bob"}));
-    EXPECT_EQ(Titles(bob), Strings({"*Alice"}));
+    room.members.erase(room.members.begin() + 2);  // Carl leaves
+    room.Run();
+    EXPECT_EQ(Join(Titles(alice)), "Bob");
+    EXPECT_EQ(Join(Titles(bob)), "*Alice");
     EXPECT_EQ(alice.UserList().GetUserItemFromNodeId(11), nullptr);
 }
 
-TEST_F(ConferenceRoster, PanelistRoleReachesOthersAndLateJoiners) {
-    CChatClient& alice = Join(7, "Alice", 3);
-    CChatClient& bob = Join(9, "Bob", 3);
-    EXPECT_EQ(Titles(alice),
-              Strings({"Host", "Presenter", "Host & Presenter", "---", "All Panelists"}));
+TEST(ConferenceRoster, PanelistRoleReachesOthersAndLateJoiners) {
+    chatroom::ChatRoom room(3);
+    CChatClient& alice = room.Join({"Alice", 7, 0}).engine;
+    CChatClient& bob = room.Join({"Bob", 9, 0}).engine;
+    EXPECT_EQ(Join(Titles(alice)), "Host|Presenter|Host & Presenter|---|All Panelists");
 
     bob.SetRosters(ROLE_PANELIST, 0);  // enrolls again with the new roles
-    loop.RunUntilIdle();
+    room.Run();
     const UserItem* seen = alice.UserList().GetUserItemFromNodeId(9);
     ASSERT_NE(seen, nullptr);
     EXPECT_EQ(seen->dwRoles, ROLE_PANELIST);
 
-    CChatClient& dana = Join(13, "Dana", 3);
-    EXPECT_EQ(Titles(dana),
-              Strings({"Host", "Presenter", "Host & Presenter", "---", "*All Panelists", "Bob"}));
+    CChatClient& dana = room.Join({"Dana", 13, 0}).engine;
+    EXPECT_EQ(Join(Titles(dana)), "Host|Presenter|Host & Presenter|---|*All Panelists|Bob");
     EXPECT_EQ(dana.UserList().GetCount(), 3u);
 
-    Leave(bob);
-    EXPECT_EQ(Titles(dana),
-              Strings({"Host", "Presenter", "Host & Presenter", "---", "*All Panelists"}));
+    room.members.erase(room.members.begin() + 1);  // Bob leaves
+    room.Run();
+    EXPECT_EQ(Join(Titles(dana)), "Host|Presenter|Host & Presenter|---|*All Panelists");
     EXPECT_EQ(alice.UserList().GetCount(), 2u);
 }
