@@ -14,25 +14,23 @@ namespace {
 
 constexpr const char* kEnrollTrace = "Enter CChatClient::Enroll";
 
-using Strings = std::vector<std::string>;
-
-// Groups as "type:id:name" ("-" for no name), in list order.
-Strings Groups(const CUsersGroupList& list) {
-    Strings rows;
+// Groups as "type:id:name" ("-" for no name), in list order, joined with "|".
+std::string Groups(const CUsersGroupList& list) {
+    std::vector<std::string> rows;
     for (std::int32_t i = 0; i < list.GetGroupsCount(); ++i) {
         const CUsersGroup* g = list.GetGroupByIndex(i);
         rows.push_back(std::to_string(g->GetGroupType()) + ":" + std::to_string(g->GetGroupId()) +
                        ":" + (g->GetGrpName() ? g->GetGrpName() : "-"));
     }
-    return rows;
+    return Join(rows);
 }
 
-// Menu entries as "title/group id", separators as "---".
-Strings Entries(const MenuStatusList& menu) {
-    Strings entries;
+// Menu entries as "title/group id", separators as "---", joined with "|".
+std::string Entries(const MenuStatusList& menu) {
+    std::vector<std::string> entries;
     for (const MenuStatus& e : menu)
         entries.push_back(e.bSeparator ? "---" : e.strTitle + "/" + std::to_string(e.nGroupID));
-    return entries;
+    return Join(entries);
 }
 
 // The service grants the enrolment.
@@ -48,19 +46,17 @@ TEST(RosterOps, DefaultGroupsByMeetingTypeAndQMMode) {
     struct Case {
         std::int32_t meetingType;
         std::uint32_t features;
-        Strings groups;
-        Strings menu;
+        const char* groups;
+        const char* menu;
     };
     const Case cases[] = {
-        {3,
-         0,
-         {"1:1:Host", "1:2:Presenter", "1:3:Host & Presenter", "2:0:-", "1:8:All Attendees",
-          "1:4:All Panelists", "2:0:-", "1:15:All Participants", "2:0:-",
-          "1:16:Select an Attendee..."},
-         {"Host/1", "Presenter/2", "Host & Presenter/3", "---", "All Panelists/4"}},
-        {1, 0, {}, {}},
-        {1, FEATURE_QM_MODE, {"1:15:Everyone"}, {"Everyone/15"}},
-        {2, FEATURE_QM_MODE, {}, {}},
+        {3, 0,
+         "1:1:Host|1:2:Presenter|1:3:Host & Presenter|2:0:-|1:8:All Attendees|1:4:All "
+         "Panelists|2:0:-|1:15:All Participants|2:0:-|1:16:Select an Attendee...",
+         "Host/1|Presenter/2|Host & Presenter/3|---|All Panelists/4"},
+        {1, 0, "", ""},
+        {1, FEATURE_QM_MODE, "1:15:Everyone", "Everyone/15"},
+        {2, FEATURE_QM_MODE, "", ""},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(std::to_string(c.meetingType) + (c.features ? " QM" : ""));
@@ -78,8 +74,8 @@ TEST(RosterOps, MatchingRoleGroupIsUpdatedButGetsASecondMenuEntry) {
     EXPECT_FALSE(capture.Has("/---- CMainChatDlg::AddRoleGroup New Group ----/"));
     EXPECT_EQ(h.engine.GroupList().GetGroupsCount(), 10);
     EXPECT_STREQ(h.engine.GroupList().GetGroupByIndex(0)->GetGrpName(), "HOST");
-    EXPECT_EQ(Entries(h.engine.Menu()), Strings({"Host/1", "HOST/1", "Presenter/2",
-                                                 "Host & Presenter/3", "---", "All Panelists/4"}));
+    EXPECT_EQ(Entries(h.engine.Menu()),
+              "Host/1|HOST/1|Presenter/2|Host & Presenter/3|---|All Panelists/4");
 
     // A separator is never matched: it always becomes a new group.
     capture.Clear();
@@ -108,10 +104,8 @@ TEST(RosterOps, HostGroupsWithOddValuesStillLandInListAndMenu) {
     AddGroup(h.engine, 0xFFFFFFFFu, 1, 8, "All Attendees");
     AddGroup(h.engine, 40, 1, 4, "All Panelists");
     AddGroup(h.engine, 0, 9, 99, "unknown type");
-    EXPECT_EQ(Entries(h.engine.Menu()),
-              Strings({"unknown type/99", "/30", "All Attendees/8", "All Panelists/4"}));
-    EXPECT_EQ(Groups(h.engine.GroupList()),
-              Strings({"3:30:-", "1:8:All Attendees", "1:4:All Panelists"}));
+    EXPECT_EQ(Entries(h.engine.Menu()), "unknown type/99|/30|All Attendees/8|All Panelists/4");
+    EXPECT_EQ(Groups(h.engine.GroupList()), "3:30:-|1:8:All Attendees|1:4:All Panelists");
     // Every add, even one the list refuses, has the window rebuild its menu.
     ASSERT_EQ(h.window->Ids(), std::vector<int>(4, msg_RebuildMenu));
     EXPECT_EQ(Entries(h.window->Commands()[3].menu), Entries(h.engine.Menu()));
@@ -121,17 +115,14 @@ TEST(RosterOps, GroupSchemesPlaceGroupsAndMarkThemForTheRecording) {
     struct Case {
         const char* what;
         std::uint32_t features;
-        Strings groups;
-        std::vector<int> sendGroupInfo;
+        const char* groups;
+        const char* sendGroupInfo;  // each group's mark, in list order
     };
     const Case cases[] = {
         // At the index; an index past the end appends.
-        {"first scheme", 0, {"1:1:HOST", "1:8:All Attendees", "3:30:ids"}, {1, 1, 0}},
+        {"first scheme", 0, "1:1:HOST|1:8:All Attendees|3:30:ids", "110"},
         // After the group whose sequence number is the index; an unknown one goes to the front.
-        {"second scheme",
-         FEATURE_GROUP_SCHEME2,
-         {"3:30:ids", "1:1:HOST", "1:8:All Attendees"},
-         {0, 0, 0}},
+        {"second scheme", FEATURE_GROUP_SCHEME2, "3:30:ids|1:1:HOST|1:8:All Attendees", "000"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.what);
@@ -143,9 +134,10 @@ TEST(RosterOps, GroupSchemesPlaceGroupsAndMarkThemForTheRecording) {
         AddGroup(other, 7, 3, 30, "ids", 0);
         AddGroup(other, 2, 1, 1, "HOST", 0);  // matches the host group, which is updated
         EXPECT_EQ(Groups(other.GroupList()), c.groups);
-        std::vector<int> sendGroupInfo;
+        std::string sendGroupInfo;
         for (std::int32_t i = 0; i < other.GroupList().GetGroupsCount(); ++i)
-            sendGroupInfo.push_back(other.GroupList().GetGroupByIndex(i)->GetNeedSendGroupInfo());
+            sendGroupInfo +=
+                std::to_string(other.GroupList().GetGroupByIndex(i)->GetNeedSendGroupInfo());
         EXPECT_EQ(sendGroupInfo, c.sendGroupInfo);
     }
 }
