@@ -1,6 +1,6 @@
 // Chat history recovery on its own, against an engine stand-in: when it starts, what it asks
 // the service for, in which order restored lines are shown, which copies are dropped, what is
-// backed up, and how it ends when the service refuses a retrieval.
+// backed up, and how it ends when the everyone group's cache cannot be read.
 #include <gtest/gtest.h>
 
 #include <cstdint>
@@ -22,7 +22,6 @@ using Strings = std::vector<std::string>;
 constexpr std::uint32_t kUserInfoCache = 501;
 constexpr std::uint32_t kCustomerCache = 502;
 constexpr std::uint32_t kEveryoneCache = 515;
-constexpr std::uint32_t kAttendeesCache = 508;
 constexpr std::uint32_t kRecovering = FEATURE_GROUP_MSG_RECOVERY | FEATURE_QM_MODE;
 
 std::string UserInfo(std::uint32_t userId, const std::string& name) {
@@ -53,17 +52,27 @@ std::string PrivateLine(std::uint32_t sendId, std::uint32_t receiveId, const std
     return pdu.ToWireText();
 }
 
-// The engine as recovery sees it: memory handles holding texts, the caches of groups 8 and 15,
-// a live roster, and a record of what was requested, shown and copied. Showing a private line
-// asks the manager for its title, as the engine does for a line between two others.
-class FakeEngine final : public IChatDataCmdProcess {
+// A recovery manager wired to a stand-in for the engine: memory handles holding texts, the
+// everyone group's cache, a live roster, and a record of what was requested, shown and copied.
+// Showing a private line asks the manager for its title, as the engine does for a line between
+// two others.
+class Recovery final : public IChatDataCmdProcess {
 public:
-    explicit FakeEngine(ChatRecoveryMgr& mgr) : m_mgr(mgr) {}
+    explicit Recovery(std::uint32_t features = kRecovering) { mgr.InitParameters(this, features); }
 
-    // A memory handle holding text.
-    std::uint32_t Mem(const std::string& text) {
-        memory[++m_lastMem] = text;
-        return m_lastMem;
+    bool Start() { return mgr.CheckUpdate4CustomRecovery(kUserInfoCache, kCustomerCache); }
+    void Roster(const std::string& text) { mgr.HandleHistoryUserRoster(Mem(text)); }
+    void Customer(const std::string& text, tagCacheAction action = CACHE_REPLY_ITEM,
+                  short result = 0) {
+        mgr.HandleCustomerRecovery(0, kCustomerCache, Mem(text), result, action);
+    }
+    // One delivery on the everyone cache, offered as the engine offers it; false when the
+    // manager left it to the live path.
+    bool Everyone(std::uint32_t cacheId, const std::string& text,
+                  tagCacheAction action = CACHE_REPLY_ITEM, std::uint32_t senderId = 0) {
+        if (!mgr.CheckUpdate4GroupRecovery(kEveryoneCache)) return false;
+        mgr.HandleGroupRecovery(cacheId, kEveryoneCache, Mem(text), 0, action, senderId);
+        return true;
     }
 
     int ParseATMemHandle(std::uint32_t, char*, std::uint32_t*) override { return 0; }
@@ -71,8 +80,7 @@ public:
                                 short maxItems) override {
         requests.push_back(std::to_string(cacheHandle) + ":" + std::to_string(type) + ":" +
                            std::to_string(maxItems));
-        const auto refusal = refuse.find(cacheHandle);
-        return refusal == refuse.end() ? 0 : refusal->second;
+        return cacheHandle == kEveryoneCache ? everyoneResult : 0;
     }
     void SendCopyToCustomerCache(CKvoChatXMLPDU* pdu) override {
         copies.push_back(pdu->ToWireText());
@@ -80,26 +88,23 @@ public:
     void SetCustomerCache() override { ++customerCacheSets; }
     void ParseAndShowGroupMessages(CGroupMessagePDU* pdu, std::uint32_t cacheHandle) override {
         std::string name = pdu->GetSenderName();
-        if (name.empty()) m_mgr.ParseGroupSenderName(pdu, name);
+        if (name.empty()) mgr.ParseGroupSenderName(pdu, name);
         shown.push_back(name + "@" + pdu->GetGroupID() + ":" + pdu->GetMessageContent());
         EXPECT_EQ(cacheHandle, 0u);
     }
     int ParseAndShowPrivateMessages(CPrivateMessagePDU* pdu, int) override {
         std::string title;
-        if (!m_mgr.ParsePrivateMsgTitle(pdu, title)) return -1;
+        if (!mgr.ParsePrivateMsgTitle(pdu, title)) return -1;
         shown.push_back(title + ":" + pdu->GetMessageContent());
         return 0;
     }
     bool AllocStringForMemoryHandle(std::uint32_t memHandle, std::string& out) override {
-        const auto found = memory.find(memHandle);
-        if (found == memory.end() || found->second.empty()) return false;
-        out = found->second;
+        if (memHandle == 0 || memHandle > m_memory.size()) return false;
+        out = m_memory[memHandle - 1];
         return true;
     }
     std::uint32_t GetGroupIdFormCacheName(const char*) override { return 0; }
-    std::uint32_t GetGroupIdFormCacheHandle(std::uint32_t cacheHandle) override {
-        return cacheHandle == kEveryoneCache ? 15 : cacheHandle == kAttendeesCache ? 8 : 0;
-    }
+    std::uint32_t GetGroupIdFormCacheHandle(std::uint32_t) override { return 0; }
     std::uint32_t GetCacheHandleFormGroupId(std::uint32_t groupId) override {
         return groupId == 15 ? everyoneCache : 0;
     }
@@ -111,45 +116,24 @@ public:
         return 1;
     }
 
-    std::map<std::uint32_t, std::string> memory;
-    std::map<std::uint32_t, int> refuse;  // cache handle -> request result
+    ChatRecoveryMgr mgr;
     std::map<std::uint32_t, std::string> liveRoster;
     std::uint32_t everyoneCache = kEveryoneCache;
+    int everyoneResult = 0;  // the service's answer when the everyone group's cache is asked for
     Strings requests;
     Strings shown;
     Strings copies;
     int customerCacheSets = 0;
 
 private:
-    ChatRecoveryMgr& m_mgr;
-    std::uint32_t m_lastMem = 0;
-};
-
-// A manager wired to a fake engine, with a customer cache and the QM and recovery bits.
-struct Recovery {
-    explicit Recovery(std::uint32_t features = kRecovering) {
-        mgr.InitParameters(&engine, features);
-        mgr.SetCustomerId(77);
-    }
-    bool Start() { return mgr.CheckUpdate4CustomRecovery(kUserInfoCache, kCustomerCache); }
-    void Roster(const std::string& text) { mgr.HandleHistoryUserRoster(engine.Mem(text)); }
-    void Customer(const std::string& text, tagCacheAction action = CACHE_REPLY_ITEM,
-                  short result = 0) {
-        mgr.HandleCustomerRecovery(0, kCustomerCache, text.empty() ? 0 : engine.Mem(text), result,
-                                   action);
-    }
-    // One delivery on the everyone cache, offered as the engine offers it; false when the
-    // manager left it to the live path.
-    bool Everyone(std::uint32_t cacheId, const std::string& text,
-                  tagCacheAction action = CACHE_REPLY_ITEM, std::uint32_t senderId = 0) {
-        if (!mgr.CheckUpdate4GroupRecovery(kEveryoneCache)) return false;
-        mgr.HandleGroupRecovery(cacheId, kEveryoneCache, text.empty() ? 0 : engine.Mem(text), 0,
-                                action, senderId);
-        return true;
+    // A memory handle holding text: n for the nth text kept, 0 for none.
+    std::uint32_t Mem(const std::string& text) {
+        if (text.empty()) return 0;
+        m_memory.push_back(text);
+        return static_cast<std::uint32_t>(m_memory.size());
     }
 
-    ChatRecoveryMgr mgr;
-    FakeEngine engine{mgr};
+    std::vector<std::string> m_memory;
 };
 
 }  // namespace
@@ -166,14 +150,14 @@ TEST(Recovery, StartsOnlyInQMModeWithGroupRecoveryAndOnlyOnce) {
         Recovery r(c.features);
         EXPECT_EQ(r.Start(), c.starts);
         EXPECT_FALSE(r.Start());
-        EXPECT_EQ(r.engine.requests, c.starts ? Strings({"501:1:255", "502:1:255"}) : Strings());
+        EXPECT_EQ(r.requests, c.starts ? Strings({"501:1:255", "502:1:255"}) : Strings());
         EXPECT_EQ(r.mgr.CheckUpdate4GroupRecovery(kEveryoneCache), c.starts);
     }
 }
 
 TEST(Recovery, PrivateHistoryIsTitledWithBothNamesWhileTheCustomerCacheIsRestored) {
     Recovery r;
-    r.engine.liveRoster[11] = "Ann";
+    r.liveRoster[11] = "Ann";
     r.Start();
     r.Roster(UserInfo(12, "Bob (left)"));
     r.Roster(UserInfo(12, "Bob again"));  // the first record of an id names it
@@ -183,43 +167,39 @@ TEST(Recovery, PrivateHistoryIsTitledWithBothNamesWhileTheCustomerCacheIsRestore
     r.Customer("\n" + PrivateLine(11, 12, "printed otherwise"));  // read the long way
     r.Customer(std::string(2, '\0'));  // the block the cache was initialised with
     r.Customer("", CACHE_REPLY_LAST);
-    EXPECT_EQ(r.engine.shown, Strings({"from Ann to Bob (left) (privately):hi Bob",
-                                       "from Bob (left) to  (privately):to nobody known",
-                                       "from Ann to Bob (left) (privately):printed otherwise"}));
+    EXPECT_EQ(r.shown, Strings({"from Ann to Bob (left) (privately):hi Bob",
+                                "from Bob (left) to  (privately):to nobody known",
+                                "from Ann to Bob (left) (privately):printed otherwise"}));
     // Outside the customer cache a line between two others has no title and is not shown.
     CPrivateMessagePDU live;
     live.SetSendID(11u);
     live.SetReveID(12u);
     std::string title;
     EXPECT_EQ(r.mgr.ParsePrivateMsgTitle(&live, title), 0);
-    EXPECT_EQ(r.engine.requests.back(), "515:1:255");
+    EXPECT_EQ(r.requests.back(), "515:1:255");
 }
 
 TEST(Recovery, EveryoneHistoryIsShownInCacheIdOrderAfterTheCustomerCache) {
     Recovery r;
-    r.engine.liveRoster[11] = "Ann";
+    r.liveRoster[11] = "Ann";
     r.Start();
     r.Roster(UserInfo(12, "Bob"));
     r.Customer(GroupLine(11, 15, 5, "five"));
     // A later attendees line with a higher id of its own cache says nothing about group 15.
     r.Customer(GroupLine(12, 8, 12, "attendees"));
     r.Customer("", CACHE_REPLY_LAST);
-    EXPECT_TRUE(r.mgr.IsInGroupCacheRecoveryProgress());
     EXPECT_TRUE(r.Everyone(7, GroupLine(12, 15, 0, "seven")));
     r.Everyone(5, GroupLine(11, 15, 0, "five"));
     r.Everyone(9, GroupLine(11, 15, 0, "nine"), CACHE_REPLY_LAST);
-    EXPECT_EQ(r.engine.shown,
-              Strings({"Ann@15:five", "Bob@8:attendees", "Bob@15:seven", "Ann@15:nine"}));
+    EXPECT_EQ(r.shown, Strings({"Ann@15:five", "Bob@8:attendees", "Bob@15:seven", "Ann@15:nine"}));
     // Each restored everyone line is backed up without names, with its cache id.
-    EXPECT_EQ(r.engine.copies,
-              Strings({GroupLine(12, 15, 7, "seven"), GroupLine(11, 15, 9, "nine")}));
-    EXPECT_FALSE(r.mgr.IsInGroupCacheRecoveryProgress());
+    EXPECT_EQ(r.copies, Strings({GroupLine(12, 15, 7, "seven"), GroupLine(11, 15, 9, "nine")}));
     EXPECT_FALSE(r.mgr.CheckUpdate4GroupRecovery(kEveryoneCache));  // live from now on
 }
 
 TEST(Recovery, EachLineIsShownOnceWhateverHoldsCopiesOfIt) {
     Recovery r;
-    r.engine.liveRoster = {{11, "Ann"}, {12, "Bob"}};
+    r.liveRoster = {{11, "Ann"}, {12, "Bob"}};
     r.Start();
     r.mgr.NoteLiveGroupMessage(8, 4);
     // Every receiver copied the attendees line 3 and the line 4 shown live; the sender and
@@ -239,9 +219,9 @@ TEST(Recovery, EachLineIsShownOnceWhateverHoldsCopiesOfIt) {
     r.Everyone(21, GroupLine(12, 15, 0, "live"));
     r.Everyone(21, GroupLine(12, 15, 0, "live"), CACHE_APPEND);
     r.Everyone(22, GroupLine(12, 15, 0, "after"), CACHE_REPLY_LAST);
-    EXPECT_EQ(r.engine.shown, Strings({"Ann@8:three", "from Ann to Bob (privately):ok",
-                                       "from Ann to Bob (privately):ok", "Ann@15:old",
-                                       "Bob@15:live", "Bob@15:after"}));
+    EXPECT_EQ(r.shown, Strings({"Ann@8:three", "from Ann to Bob (privately):ok",
+                                "from Ann to Bob (privately):ok", "Ann@15:old", "Bob@15:live",
+                                "Bob@15:after"}));
 }
 
 TEST(Recovery, PrivateCopiesAreMatchedWithinTheLastSixteenLines) {
@@ -253,50 +233,27 @@ TEST(Recovery, PrivateCopiesAreMatchedWithinTheLastSixteenLines) {
     EXPECT_TRUE(filter.FirstShowOfPrivateMessage(2, 1, "3"));   // the other direction
 }
 
-TEST(Recovery, ARefusedOrMissingRetrievalEndsOnlyWhatItWouldHaveRead) {
-    const struct {
-        const char* scenario;
-        std::map<std::uint32_t, int> refuse;
-        std::uint32_t everyoneCache;
-        Strings requests;
-        bool groupRecovery;
-        const char* warning;
-    } cases[] = {
-        {"everyone cache refused",
-         {{kEveryoneCache, 1103}},
-         kEveryoneCache,
-         {"501:1:255", "502:1:255", "515:1:255"},
-         false,
-         "ChatRecoveryMgr: cache of group 15 (handle 515) not read (result 1103); recovery "
-         "ends"},
-        {"everyone group without a cache",
-         {},
-         0,
-         {"501:1:255", "502:1:255"},
-         false,
-         "ChatRecoveryMgr: cache of group 15 (handle 0) not read (result 0); recovery ends"},
-    };
-    for (const auto& c : cases) {
-        SCOPED_TRACE(c.scenario);
+TEST(Recovery, AnEveryoneCacheThatCannotBeReadEndsRecoveryAndShowsWhatWasHeld) {
+    // The everyone group's cache is refused, or the group has none.
+    for (const std::uint32_t everyoneCache : {kEveryoneCache, 0u}) {
+        SCOPED_TRACE(everyoneCache);
         TraceCapture trace;
         Recovery r;
-        r.engine.refuse = c.refuse;
-        r.engine.everyoneCache = c.everyoneCache;
-        r.engine.liveRoster[11] = "Ann";
+        r.everyoneCache = everyoneCache;
+        r.everyoneResult = 1103;
         r.Start();
         // Only an everyone group with a cache has deliveries to hold.
-        EXPECT_EQ(r.Everyone(30, GroupLine(11, 15, 0, "held while the customer cache is read"),
-                             CACHE_APPEND),
-                  c.everyoneCache != 0);
+        EXPECT_EQ(r.Everyone(30, GroupLine(11, 15, 0, "held"), CACHE_APPEND), everyoneCache != 0);
         r.Customer("", CACHE_REPLY_LAST);
-        EXPECT_EQ(r.engine.requests, c.requests);
-        EXPECT_EQ(r.mgr.IsInGroupCacheRecoveryProgress(), c.groupRecovery);
-        EXPECT_TRUE(trace.Has(TraceLevel::Warn, c.warning));
+        EXPECT_FALSE(r.mgr.IsRecoveryRunning());
+        EXPECT_TRUE(
+            trace.Has(TraceLevel::Warn, everyoneCache != 0
+                                            ? "ChatRecoveryMgr: cache of group 15 (handle 515) "
+                                              "not read (result 1103); recovery ends"
+                                            : "ChatRecoveryMgr: cache of group 15 (handle 0) "
+                                              "not read (result 0); recovery ends"));
         // Nothing is lost: what was held is shown once recovery can no longer add to it.
-        const bool held = !c.groupRecovery && c.everyoneCache != 0;
-        EXPECT_EQ(r.engine.shown,
-                  held ? Strings({"Ann@15:held while the customer cache is read"}) : Strings());
-        EXPECT_EQ(r.mgr.IsRecoveryRunning(), c.groupRecovery);
+        EXPECT_EQ(r.shown, everyoneCache != 0 ? Strings({"@15:held"}) : Strings());
     }
 }
 
@@ -304,12 +261,12 @@ TEST(Recovery, ACustomerCacheNeverSetIsSetOnceAndForgedLinesAreDropped) {
     Recovery r;
     r.Start();
     r.Customer(PrivateLine(11, 12, "unread"), CACHE_REPLY_LAST, kArmRetry);
-    EXPECT_EQ(r.engine.customerCacheSets, 1);
-    EXPECT_TRUE(r.engine.shown.empty());
+    EXPECT_EQ(r.customerCacheSets, 1);
+    EXPECT_TRUE(r.shown.empty());
     TraceCapture trace;
     r.Everyone(3, GroupLine(11, 15, 0, "forged"), CACHE_APPEND, 12);
     r.Everyone(4, GroupLine(11, 15, 0, "kept"), CACHE_REPLY_LAST, 11);
-    EXPECT_EQ(r.engine.shown, Strings({"@15:kept"}));
+    EXPECT_EQ(r.shown, Strings({"@15:kept"}));
     EXPECT_TRUE(trace.Has(TraceLevel::Warn,
                           "CChatClient::SharedDataReceivedEx,CACHE_APPEND or CACHE_SET,Detect "
                           "faked group message, senderId:12, senderId in PDU:11"));
