@@ -207,20 +207,6 @@ TEST(Commands, EveryoneOnlyHidesTheListAndSendsToEveryoneWhateverTheWindowReport
     EXPECT_EQ(room.Holders("from Hana to All Participants|to host"), (Strings{"Hana", "Ann"}));
 }
 
-TEST(Commands, RecordingStatusesZeroAndThreeOweEveryGroupItsDescription) {
-    for (const std::uint32_t status : {0u, 1u, 2u, 3u, 4u}) {
-        MenuHarness h({3});
-        h.engine.SetAllCacheSendGroupInfoStatus(0);
-        EXPECT_EQ(h.engine.SetNBRStatus(status, 5, 6), 0);
-        const bool marked = status == 0 || status == 3;
-        for (const std::uint32_t group :
-             {GROUP_HOST, GROUP_PRESENTER, GROUP_ATTENDEES, GROUP_EVERYONE}) {
-            EXPECT_EQ(h.engine.GetNeedSendGroupInfoStatus(group), marked)
-                << "status " << status << ", group " << group;
-        }
-    }
-}
-
 TEST(Commands, ConfigurationKindsAndTheirRefusals) {
     const char* customer = "<chat ver=\"1.0\"><mtype>11</mtype><customerid>555</customerid></chat>";
     const char* faq = "<chat ver=\"1.0\"><mtype>8</mtype><lname>Lee</lname></chat>";
