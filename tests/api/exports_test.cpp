@@ -2,6 +2,7 @@
 // from ChNewInstance to ChDeleteInstance through them.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <functional>
 #include <string>
 #include <vector>
@@ -10,7 +11,8 @@
 #include "engine/chat_client.h"
 #include "platform/inproc_conference.h"
 #include "platform/virtual_run_loop.h"
-#include "tests/support/recording_window.h"
+#include "tests/api/logging_window.h"
+#include "tests/engine/chat_room.h"
 #include "tests/support/trace_capture.h"
 
 namespace {
@@ -81,80 +83,42 @@ TEST(Exports, WholeLifeThroughTheExportedFunctions) {
     VirtualRunLoop loop;
     ScopedCurrentRunLoop current(&loop);
     InProcessConference conference;
-    RecordingWindow::Install();
+    std::vector<std::string> log;
+    SetChatWindowFactory([&log] { return new LoggingWindow(&log); });
 
     ChatHandle handle = ChNewInstance();
     EXPECT_EQ(ChInitialize(handle, nullptr), -1);  // without a record nothing starts
     EXPECT_EQ(static_cast<CChatClient*>(handle)->State(), kStateIdle);
-    _tagChatData data{};
-    data.pArmClient = conference.CreateClient(loop, 7);
-    data.wConferenceID = conference.ConferenceId();
-    data.dwSessionID = 3;
-    data.lpszUserName = "Alice";
-    data.dwNodeID = 7;
-    data.lMeetingType = 3;
+    _tagChatData data = chatroom::StartRecord(conference.CreateClient(loop, 7),
+                                              conference.ConferenceId(), 3, "Alice", 7, 3);
     EXPECT_EQ(ChInitialize(handle, &data), 0);
     loop.RunUntilIdle();
     EXPECT_EQ(static_cast<CChatClient*>(handle)->State(), kStateEnrolled);
-    EXPECT_EQ(ChHasContent(handle), 0);
-    EXPECT_EQ(ChIsModified(handle), 0);
     EXPECT_EQ(ChSelectFeature(handle, 0x8000, 0, 0, 0, 0, nullptr), 0);
     EXPECT_EQ(SetNBR2Status(handle, 1, 1, 0), 0);
     EXPECT_EQ(ChSetConfig(handle, 7, "anything"), 0);
 
-    RecordingWindow* window = RecordingWindow::Latest();
-    ASSERT_NE(window, nullptr);
     // A second start keeps the window and moves it into the view the new record names.
     int otherView = 0;
     data.hParentView = &otherView;
+    log.clear();
     EXPECT_EQ(ChInitialize(handle, &data), 0);
     loop.RunUntilIdle();
-    EXPECT_EQ(RecordingWindow::Latest(), window);
-    EXPECT_EQ(window->SuperView(), &otherView);
-    window->Clear();
+    const auto command = [](const std::string& entry) { return entry.rfind("msg_", 0) == 0; };
+    log.erase(std::remove_if(log.begin(), log.end(), command), log.end());
+    EXPECT_EQ(log, std::vector<std::string>{"view " + Hex(&otherView)});
+    log.clear();
     EXPECT_EQ(ChSwitchTarget(handle), 0);
     EXPECT_EQ(ChCloseAllDlg(handle), 0);
-    // The picker closes before the selection and the input takes the focus after it.
     EXPECT_EQ(ChSelectUserByNodeId(handle, 99), 0);
-    EXPECT_EQ(window->Ids(), (std::vector<int>{msg_FocusInput, msg_CloseAllDialogs,
-                                               msg_CloseAttendeeDialog, msg_FocusInput}));
-
     EXPECT_EQ(ChDeleteInstance(handle), 0);
-    EXPECT_EQ(RecordingWindow::Latest(), nullptr);
+    // The picker closes before the selection and the input takes the focus after it; a deleted
+    // component clears its window while it still exists, takes the sink away, then ends it.
+    EXPECT_EQ(log, (std::vector<std::string>{"msg_FocusInput", "msg_CloseAllDialogs",
+                                             "msg_CloseAttendeeDialog", "msg_FocusInput",
+                                             "msg_ClearChat", "sink 0x0", "end"}));
     loop.AdvanceBy(5.0);
     EXPECT_EQ(conference.ClientCount(), 0u);
-    RecordingWindow::Uninstall();
-}
-
-// A window that logs command ids and its own end into a list the test keeps.
-class LoggingWindow final : public IChatWindow {
-public:
-    explicit LoggingWindow(std::vector<int>* log) : m_log(log) {}
-    ~LoggingWindow() override { m_log->push_back(-1); }
-    void SetSuperView(void*) override {}
-    void SetSink(IChatCommSinkForChatUI* sink) override {
-        if (!sink) m_log->push_back(0);
-    }
-    int HandleCommand(int command, void*, void*) override {
-        m_log->push_back(command);
-        return 0;
-    }
-
-private:
-    std::vector<int>* m_log;
-};
-
-TEST(Exports, DeleteClearsTheWindowBeforeTheEngineGoes) {
-    std::vector<int> log;
-    SetChatWindowFactory([&log] { return new LoggingWindow(&log); });
-    ChatHandle handle = ChNewInstance();
-    _tagChatData data{};
-    data.lMeetingType = 1;
-    ChInitialize(handle, &data);
-    log.clear();
-    EXPECT_EQ(ChDeleteInstance(handle), 0);
-    // Clear, then the sink is taken away, then the window is destroyed.
-    EXPECT_EQ(log, (std::vector<int>{msg_ClearChat, 0, -1}));
     SetChatWindowFactory(nullptr);
 }
 

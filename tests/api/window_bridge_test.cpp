@@ -2,50 +2,26 @@
 // ids have names.
 #include <gtest/gtest.h>
 
-#include <cstdint>
-#include <cstdio>
 #include <string>
 #include <vector>
 
 #include "api/ui_protocol.h"
 #include "api/window_bridge.h"
+#include "tests/api/logging_window.h"
 #include "tests/support/trace_capture.h"
 
 namespace {
 
-std::string Hex(const void* address) {
-    char text[32];
-    std::snprintf(text, sizeof text, "0x%x",
-                  static_cast<unsigned>(reinterpret_cast<std::uintptr_t>(address)));
-    return text;
-}
-
 std::vector<std::string> Scoped(const std::string& text) {
     return {"Enter " + text, "Leave " + text};
 }
-
-// A window that remembers what the bridge gave it and whether it still has a sink.
-class ProbeWindow final : public IChatWindow {
-public:
-    explicit ProbeWindow(bool* sinkClearedBeforeEnd) : m_cleared(sinkClearedBeforeEnd) {}
-    ~ProbeWindow() override { *m_cleared = m_sink == nullptr; }
-    void SetSuperView(void* view) override { superView = view; }
-    void SetSink(IChatCommSinkForChatUI* sink) override { m_sink = sink; }
-    int HandleCommand(int command, void*, void*) override { return command == 2101 ? 0 : 7; }
-    IChatCommSinkForChatUI* Sink() const { return m_sink; }
-    void* superView = nullptr;
-
-private:
-    IChatCommSinkForChatUI* m_sink = nullptr;
-    bool* m_cleared;
-};
 
 class NullSink final : public IChatCommSinkForChatUI {
 public:
     int HandleUIMessage(int, void*, void*) override { return 0; }
 };
 
-TEST(WindowBridge, EachBridgeCallOpensAScopedTrace) {
+TEST(WindowBridge, WithoutAWindowEachCallTracesAndCommandsAnswerThree) {
     SetChatWindowFactory(nullptr);
     ChatUIHandle handle = nullptr;
     int view = 0;
@@ -60,10 +36,7 @@ TEST(WindowBridge, EachBridgeCallOpensAScopedTrace) {
     capture.Clear();
     InstallCallback();
     EXPECT_EQ(capture.Texts(), Scoped("InstallCallback"));
-}
-
-TEST(WindowBridge, AMissingWindowAnswersThreeAndNothingHappens) {
-    TraceCapture capture;
+    capture.Clear();
     EXPECT_EQ(NotifyCocoaUI(nullptr, msg_FocusInput, nullptr, nullptr), 3);
     EXPECT_TRUE(capture.Lines().empty());
     EXPECT_EQ(DestoryUI(nullptr), 3);
@@ -71,26 +44,24 @@ TEST(WindowBridge, AMissingWindowAnswersThreeAndNothingHappens) {
 }
 
 TEST(WindowBridge, TheWindowGetsViewAndSinkAndLosesTheSinkBeforeItEnds) {
-    bool sinkClearedBeforeEnd = false;
-    ProbeWindow* made = nullptr;
-    SetChatWindowFactory([&] { return made = new ProbeWindow(&sinkClearedBeforeEnd); });
+    std::vector<std::string> log;
+    SetChatWindowFactory([&log] { return new LoggingWindow(&log); });
     ChatUIHandle handle = nullptr;
     int view = 0;
     NullSink sink;
-    ASSERT_EQ(CreateUI(&handle, &view, &sink), 0);
+    IChatCommSinkForChatUI* face = &sink;
+    ASSERT_EQ(CreateUI(&handle, &view, face), 0);
     SetChatWindowFactory(nullptr);
-    ASSERT_NE(made, nullptr);
-    EXPECT_EQ(handle, made);
-    EXPECT_EQ(made->superView, &view);
-    EXPECT_EQ(made->Sink(), &sink);
+    ASSERT_NE(handle, nullptr);
     // Whatever the window answers is the bridge's answer.
     EXPECT_EQ(NotifyCocoaUI(handle, msg_SendDone, nullptr, nullptr), 0);
     EXPECT_EQ(NotifyCocoaUI(handle, msg_ShowChat, nullptr, nullptr), 7);
 
     TraceCapture capture;
     EXPECT_EQ(DestoryUI(handle), 0);
-    EXPECT_TRUE(sinkClearedBeforeEnd);
     EXPECT_EQ(capture.Texts(), Scoped("DestoryUI, control = " + Hex(handle)));
+    EXPECT_EQ(log, (std::vector<std::string>{"view " + Hex(&view), "sink " + Hex(face),
+                                             "msg_SendDone", "msg_ShowChat", "sink 0x0", "end"}));
 }
 
 TEST(UiProtocol, OnlyKnownIdsHaveNames) {
