@@ -11,6 +11,8 @@
 #include "hostpanel/host_panel.h"
 #include "platform/inproc_conference.h"
 #include "platform/virtual_run_loop.h"
+#include "tests/engine/chat_room.h"
+#include "tests/engine/menu_harness.h"
 
 namespace {
 
@@ -23,8 +25,6 @@ protected:
         SetChatWindowFactory(nullptr);
         Join("Hana Host", kHana, ROLE_HOST);
         Join("Amy Attendee", kAmy, 0);
-        for (const auto& [name, handle, node] : people)
-            ChSetHost(handle, kHana);
         for (int tick = 0; tick < 20; ++tick) {
             loop.AdvanceBy(0.5);
             loop.RunUntilIdle();
@@ -47,15 +47,11 @@ protected:
 
     void Join(const char* name, std::uint32_t node, std::uint32_t roles) {
         ChatHandle handle = ChNewInstance();
-        _tagChatData data{};
-        data.pArmClient = conference.CreateClient(loop, node);
-        data.wConferenceID = conference.ConferenceId();
-        data.dwSessionID = 1;
-        data.lpszUserName = name;
-        data.dwNodeID = node;
-        data.lMeetingType = 3;
+        const _tagChatData data = chatroom::StartRecord(
+            conference.CreateClient(loop, node), conference.ConferenceId(), 1, name, node, 3);
         ChInitialize(handle, &data);
         ChSetRosters(handle, roles);
+        ChSetHost(handle, kHana);
         people.push_back({name, handle, node});
         loop.RunUntilIdle();
     }
@@ -63,15 +59,8 @@ protected:
     static CChatClient& Engine(const HostPanel::Member& p) {
         return *static_cast<CChatClient*>(p.handle);
     }
-
-    // A send-to list as titles, "*" before the selected one, "~" before disabled ones.
     static std::vector<std::string> Menu(const HostPanel::Member& p) {
-        std::vector<std::string> titles;
-        for (const MenuStatus& entry : Engine(p).Menu())
-            titles.push_back(entry.bSeparator ? "-"
-                                              : std::string(entry.bSelected ? "*" : "") +
-                                                    (entry.bEnabled ? "" : "~") + entry.strTitle);
-        return titles;
+        return menutest::Titles(Engine(p));
     }
 
     VirtualRunLoop loop;
