@@ -1,14 +1,21 @@
 // The networked conference: the contract suite against a real server, and what belongs to
-// this service alone: refusals at the server, an unreachable server.
+// this service alone: what the server refuses a raw client with credentials of its own, an
+// unreachable server, unusable options, and participants whose process dies or that are
+// released while they reconnect.
 #include <nats/nats.h>
 
+#include <algorithm>
 #include <chrono>
-#include <cstring>
+#include <condition_variable>
+#include <mutex>
+#include <string>
 #include <thread>
+#include <vector>
 
 #include "netconf/conference_subjects.h"
 #include "netconf/netconf_results.h"
 #include "platform/conference_results.h"
+#include "tests/netconf/child_process.h"
 #include "tests/netconf/nats_harness.h"
 #include "tests/support/trace_capture.h"
 
@@ -21,6 +28,77 @@ INSTANTIATE_TEST_SUITE_P(Nats, ConferenceContract,
 
 namespace {
 
+// A client that speaks NATS directly, counting the refusals the server sends it.
+class RawClient {
+public:
+    RawClient(const NatsServer& server, const std::string& user) {
+        natsOptions* options = nullptr;
+        natsOptions_Create(&options);
+        natsOptions_SetURL(options, server.Url().c_str());
+        natsOptions_SetUserInfo(options, user.c_str(), FixturePassword(user).c_str());
+        natsOptions_SetErrorHandler(options, &RawClient::OnError, this);
+        m_status = natsConnection_Connect(&m_connection, options);
+        natsOptions_Destroy(options);
+    }
+    ~RawClient() {
+        for (natsSubscription* sub : m_subs)
+            natsSubscription_Destroy(sub);
+        natsConnection_Destroy(m_connection);
+    }
+    bool Connected() const { return m_status == NATS_OK; }
+
+    void Publish(const std::string& subject, const std::string& data,
+                 const std::vector<std::pair<const char*, const char*>>& headers = {},
+                 const char* reply = nullptr) {
+        natsMsg* msg = nullptr;
+        natsMsg_Create(&msg, subject.c_str(), reply, data.data(), static_cast<int>(data.size()));
+        for (const auto& [key, value] : headers)
+            natsMsgHeader_Set(msg, key, value);
+        natsConnection_PublishMsg(m_connection, msg);
+        natsMsg_Destroy(msg);
+    }
+    void Listen(const std::string& subject) {
+        natsSubscription* sub = nullptr;
+        if (natsConnection_SubscribeSync(&sub, m_connection, subject.c_str()) == NATS_OK) {
+            m_subs.push_back(sub);
+        }
+    }
+    // Messages that reached the subscriptions after a flush round trip.
+    int Received() {
+        natsConnection_FlushTimeout(m_connection, 5000);
+        int total = 0;
+        for (natsSubscription* sub : m_subs) {
+            int msgs = 0, bytes = 0;
+            if (natsSubscription_GetPending(sub, &msgs, &bytes) == NATS_OK) total += msgs;
+        }
+        return total;
+    }
+    // Waits until the server refused count requests; the refusals counted by then.
+    int WaitForRefusals(int count) {
+        natsConnection_FlushTimeout(m_connection, 5000);
+        std::unique_lock<std::mutex> lock(m_mutex);
+        m_changed.wait_for(lock, std::chrono::seconds(10), [&] { return m_refusals >= count; });
+        return m_refusals;
+    }
+
+private:
+    static void OnError(natsConnection*, natsSubscription*, natsStatus status, void* closure) {
+        auto* self = static_cast<RawClient*>(closure);
+        {
+            const std::lock_guard<std::mutex> lock(self->m_mutex);
+            if (status == NATS_NOT_PERMITTED) ++self->m_refusals;
+        }
+        self->m_changed.notify_all();
+    }
+
+    natsStatus m_status = NATS_ERR;
+    natsConnection* m_connection = nullptr;
+    std::vector<natsSubscription*> m_subs;
+    std::mutex m_mutex;
+    std::condition_variable m_changed;
+    int m_refusals = 0;
+};
+
 class NatsConferenceTest : public testing::Test, protected ConferenceDriver {
 protected:
     using ConferenceDriver::Run;  // not the test's own Run
@@ -29,6 +107,87 @@ protected:
 };
 
 }  // namespace
+
+TEST_F(NatsConferenceTest, AHostileClientCanNeitherSpeakForOthersListenToThemNorTakeIdsOrHandles) {
+    ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
+    ASSERT_EQ(0, Enroll(a, "alpha"));
+    ASSERT_EQ(0, Enroll(b, "beta"));
+    const std::uint32_t cache = Handle(b, "1_chat_cache_15");
+    ASSERT_EQ(0, Request(b, cache, CACHE_REQUEST_SUBSCRIBE));
+    Run();
+    b.sink->Clear();
+
+    RawClient mallory(Harness().Server(), "mallory");
+    ASSERT_TRUE(mallory.Connected());
+    const ConferenceSubjects subjects(kNatsConference);
+    const std::vector<std::pair<const char*, const char*>> action = {{"Qc-Action", "1"},
+                                                                     {"Qc-Flags", "0"}};
+    // Speaking for p11: a cache line, private data, a farewell, a consumer on p12's mailbox.
+    mallory.Publish(subjects.CacheAction(cache, "p11"), "forged line", action);
+    mallory.Publish(subjects.Private("p12", "p11"), "forged private");
+    mallory.Publish(subjects.Presence("p11"), "", {{"Qc-State", "left"}});
+    mallory.Publish("$JS.API.CONSUMER.CREATE." + subjects.MailboxStream("p12"), "{}", {},
+                    "_INBOX_mallory.x");
+    // Listening to p12's private data and replies.
+    mallory.Listen(subjects.Mailbox("p12"));
+    mallory.Listen(ConferenceSubjects::InboxPrefix("p12") + ".>");
+    // Under its own name it may send, and is known by its own id whatever the text says.
+    mallory.Publish(subjects.Private("p12", "mallory"), "I am p11");
+    // p13's user id claimed first under mallory's name, and the handle's name claimed again.
+    mallory.Publish(subjects.UserIdClaim(ConferenceUserId("p13")), "mallory");
+    mallory.Publish(subjects.NameNumber("1_chat_cache_15"), "name");
+    EXPECT_EQ(7, mallory.WaitForRefusals(7));
+
+    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.userId, 1, "hello", 5, 1, 1));
+    const std::vector<std::uint8_t> line = ContractBytes("true line");
+    ASSERT_EQ(0, Write(a, cache, CACHE_APPEND, &line));
+    Run();
+    EXPECT_EQ(0, mallory.Received());
+
+    const std::vector<ArmEvent> privates = b.sink->Named("ApeDataIndication");
+    ASSERT_EQ(2u, privates.size());
+    EXPECT_EQ(ConferenceUserId("mallory"), privates[0].userId);
+    EXPECT_EQ(ContractBytes("I am p11"), privates[0].data);
+    EXPECT_EQ(a.userId, privates[1].userId);
+    EXPECT_EQ(ContractBytes("hello"), privates[1].data);
+    const std::vector<ArmEvent> lines = b.sink->Named("SharedDataReceivedEx");
+    ASSERT_EQ(1u, lines.size());
+    EXPECT_EQ(a.userId, lines[0].userId);
+    EXPECT_EQ(line, lines[0].data);
+    EXPECT_TRUE(b.sink->Named("ApeRosterChanged").empty());
+
+    ContractParticipant& c = Attached(13);
+    EXPECT_EQ(ConferenceUserId("p13"), c.userId);
+    EXPECT_EQ(cache, Handle(c, "1_chat_cache_15"));
+}
+
+TEST_F(NatsConferenceTest, AParticipantWhoseProcessDiesLeavesTheRosterWithinTenSeconds) {
+    ContractParticipant& a = Attached(11);
+    ASSERT_EQ(0, Enroll(a, "alpha"));
+    Run();
+    // A participant of the load run that is never told to send only stays enrolled.
+    const std::string user = FixtureUser(20);
+    ChildProcess child({QC_NETCONF_LOAD_PARTICIPANT, Harness().Server().Url(), user,
+                        FixturePassword(user), "20", "0", "p11", "p11"});
+    const std::string entry = "[20:" + std::to_string(ConferenceUserId(user)) + ":p20]";
+    // How long until a's roster changes show change; more than limit when they do not.
+    const auto waitFor = [&](const std::string& change, std::chrono::seconds limit) {
+        const auto start = std::chrono::steady_clock::now();
+        for (;;) {
+            const auto took = std::chrono::steady_clock::now() - start;
+            std::vector<std::string> seen;
+            for (const ArmEvent& event : a.sink->Named("ApeRosterChanged"))
+                seen.push_back(DescribeRoster(event.roster));
+            if (std::count(seen.begin(), seen.end(), change) > 0 || took > limit) return took;
+            Run();
+        }
+    };
+    ASSERT_LT(waitFor("+7" + entry, std::chrono::seconds(10)), std::chrono::seconds(10))
+        << child.Output();
+    child.Wait(SIGKILL);
+    EXPECT_LT(waitFor("-7" + entry, std::chrono::seconds(12)), std::chrono::seconds(10));
+}
 
 TEST_F(NatsConferenceTest, AnUnreachableServerGivesAFinalConnectResultAndLogsWhy) {
     TraceCapture trace;
