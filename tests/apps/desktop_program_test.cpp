@@ -1,5 +1,5 @@
 // The desktop program as people run it: two processes chat through one nats-server, and a
-// conference that cannot be joined is told and ends the program.
+// conference that cannot be joined or a script line that never comes ends it with its status.
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
@@ -80,34 +80,33 @@ TEST_F(DesktopProgram, TwoParticipantsChatBothWaysAndPrivatelyThroughOneServer) 
     EXPECT_NE(bobRun.out.find("bob.chat: every expectation holds"), std::string::npos);
 }
 
-TEST_F(DesktopProgram, ALineThatNeverComesFailsOnceTheWaitIsOver) {
-    ASSERT_TRUE(server.Start()) << server.Log();
-    const std::string script = dir.File("alone.chat");
-    PutFile(script, "conference type=3\nexpect me line \"from Ann Host to Host\" \"hi\"\n");
-    QProcess bob;
-    Start(&bob, server.Url(), Creds("bob", "pw-bob"), "Bob Attendee", 12,
-          {"--wait", "1", "--script", QString::fromStdString(script)});
-    const Finished run = Finish(&bob);
-    EXPECT_EQ(run.exitCode, 1) << run.out;
-    EXPECT_NE(run.out.find("line 2: expect: timed out: me's transcript is empty"),
-              std::string::npos)
-        << run.out;
-}
-
-TEST_F(DesktopProgram, AConferenceThatCannotBeJoinedIsToldAndEndsTheProgram) {
+TEST_F(DesktopProgram, ARunThatCannotSucceedSaysWhyAndEndsWithItsStatus) {
     ASSERT_TRUE(server.Start()) << server.Log();
     const std::string nobody = "nats://127.0.0.1:" + std::to_string(FreeLoopbackPort());
+    const std::string script = dir.File("alone.chat");
+    PutFile(script, "conference type=3\nexpect me line \"from Ann Host to Host\" \"hi\"\n");
     const struct {
         std::string url;
         std::string password;
-    } cases[] = {{nobody, "pw-ann"}, {server.Url(), "wrong"}};
+        QStringList extra;
+        int exitCode;
+        std::string says;
+    } cases[] = {
+        {nobody, "pw-ann", {}, 3, "quintara-chat: cannot connect to " + nobody},
+        {server.Url(), "wrong", {}, 3, "quintara-chat: cannot connect to " + server.Url()},
+        // A line that never comes fails once the wait is over.
+        {server.Url(),
+         "pw-ann",
+         {"--wait", "1", "--script", QString::fromStdString(script)},
+         1,
+         "line 2: expect: timed out: me's transcript is empty"},
+    };
     for (const auto& c : cases) {
         QProcess ann;
-        Start(&ann, c.url, Creds("ann", c.password), "Ann Host", 11, {});
+        Start(&ann, c.url, Creds("ann", c.password), "Ann Host", 11, c.extra);
         const Finished run = Finish(&ann);
-        EXPECT_EQ(run.exitCode, 3) << c.url << "\n" << run.out;
-        EXPECT_NE(run.out.find("quintara-chat: cannot connect to " + c.url), std::string::npos)
-            << run.out;
+        EXPECT_EQ(run.exitCode, c.exitCode) << c.says << "\n" << run.out;
+        EXPECT_NE(run.out.find(c.says), std::string::npos) << run.out;
     }
 }
 

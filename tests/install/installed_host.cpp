@@ -44,10 +44,6 @@ struct Participant {
     // The window's widgets, as the host finds them in its view.
     QPlainTextEdit* Input() const { return view.findChild<QPlainTextEdit*>(); }
     QTextEdit* Transcript() const { return view.findChild<QTextEdit*>(); }
-    bool Shows(const std::string& text) const {
-        const QTextEdit* transcript = Transcript();
-        return transcript && transcript->toPlainText().contains(QString::fromStdString(text));
-    }
 };
 
 bool RunUntil(const std::function<bool()>& done) {
@@ -110,10 +106,12 @@ int main(int argc, char** argv) {
     QKeyEvent press(QEvent::KeyPress, Qt::Key_Return, Qt::NoModifier);
     QApplication::sendEvent(input, &press);
 
-    const std::string announced = std::string("Hana: ") + kLine;
-    if (!RunUntil([&] { return ann->Shows(kLine) && !ann->sink.lines.empty(); }))
+    QTextEdit* transcript = ann->Transcript();
+    if (!RunUntil(
+            [&] { return transcript->toPlainText().contains(kLine) && !ann->sink.lines.empty(); }))
         return Fail("Ann's window never showed the line");
-    if (ann->sink.lines.front() != announced) return Fail("Ann's host heard another line");
+    if (ann->sink.lines.front() != std::string("Hana: ") + kLine)
+        return Fail("Ann's host heard another line");
     if (!input->toPlainText().isEmpty()) return Fail("the sent line stayed in the input");
     std::printf("installed host: Ann's window shows \"%s\"\n", kLine);
     return 0;

@@ -54,8 +54,6 @@ public:
         Wait(SIGKILL);
         if (m_input >= 0) close(m_input);
     }
-    ChildProcess(const ChildProcess&) = delete;
-    ChildProcess& operator=(const ChildProcess&) = delete;
 
     // Whether the output shows text within seconds; false once the program ended without it.
     bool WaitFor(const std::string& text, double seconds) {

@@ -24,12 +24,9 @@ TEST(NatsFaultAndLoad, EveryLineArrivesOnceAndInOrderWhileAServerRestarts) {
         options.serverName = "s" + std::to_string(i + 1);
         options.clusterName = "quintara";
         options.clusterPort = clusterPorts[i];
-        for (int j = 0; j < 3; ++j) {
-            if (j != i) {
-                options.routes.push_back("nats-route://127.0.0.1:" +
-                                         std::to_string(clusterPorts[j]));
-            }
-        }
+        // Each server is given all three routes; the one to itself it ignores.
+        for (const int port : clusterPorts)
+            options.routes.push_back("nats-route://127.0.0.1:" + std::to_string(port));
         servers.push_back(std::make_unique<NatsServer>(options));
         urls += (urls.empty() ? "" : ",") + servers.back()->Url();
     }

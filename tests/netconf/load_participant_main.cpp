@@ -30,18 +30,17 @@ constexpr double kPatience = 45;
 
 class LoadParticipant final : public ArmNullSink {
 public:
-    LoadParticipant(IArmClient& client, PollRunLoop& loop, std::string user, int count,
-                    std::string next, std::size_t peers)
+    LoadParticipant(IArmClient& client, std::string user, int count, std::string next,
+                    std::size_t peers)
         : m_client(client),
-          m_loop(loop),
           m_user(std::move(user)),
           m_count(count),
           m_nextId(ConferenceUserId(next)),
           m_peers(peers) {}
 
-    void Go() {
+    void Go(PollRunLoop& loop) {
         m_going = true;
-        m_loop.AddTimer(kSendInterval, kSendInterval, [this] { SendOne(); });
+        loop.AddTimer(kSendInterval, kSendInterval, [this] { SendOne(); });
     }
     // Whether it was told to go and every line meant for it arrived.
     bool Complete() const {
@@ -87,11 +86,8 @@ public:
         for (std::uint32_t r = 0; r < added + deleted; ++r) {
             for (std::uint16_t u = 0; u < records[r].wUserCount; ++u) {
                 const std::uint32_t id = records[r].pUsers[u].dwUserID;
-                if (r < added) {
-                    m_members.insert(id);
-                } else {
-                    m_members.erase(id);
-                }
+                m_members.erase(id);
+                if (r < added) m_members.insert(id);
             }
         }
         CheckReady();
@@ -158,7 +154,6 @@ private:
     }
 
     IArmClient& m_client;
-    PollRunLoop& m_loop;
     const std::string m_user;
     const int m_count;
     const std::uint32_t m_nextId;
@@ -193,7 +188,7 @@ int main(int argc, char** argv) {
     PollRunLoop loop;
     IArmClient* client = CreateNatsArmClient(options, loop);
     if (client == nullptr) return 2;
-    LoadParticipant participant(*client, loop, options.user, std::atoi(argv[5]), argv[6],
+    LoadParticipant participant(*client, options.user, std::atoi(argv[5]), argv[6],
                                 static_cast<std::size_t>(argc - 7));
     if (client->Connect(&participant, options.user.c_str(), 0, 0, 0) != kArmConnectPending) {
         return 1;
@@ -201,19 +196,15 @@ int main(int argc, char** argv) {
     // "go" arrives on the input; the loop learns of it through a posted task.
     std::thread([&loop, &participant] {
         std::string word;
-        if (std::cin >> word && word == "go") loop.Post([&participant] { participant.Go(); });
+        if (std::cin >> word && word == "go") loop.Post([&] { participant.Go(loop); });
     }).detach();
-    bool done = false;
     loop.AddTimer(0.05, 0.05, [&] {
-        if (participant.Complete()) {
-            done = true;
-            loop.Quit();
-        }
+        if (participant.Complete()) loop.Quit();
     });
     loop.AddTimer(kPatience, 0, [&loop] { loop.Quit(); });
     loop.Run();
     participant.Report();
-    const bool clean = done && participant.Clean();
+    const bool clean = participant.Clean();
     client->Release();
     std::_Exit(clean ? 0 : 1);
 }
