@@ -47,12 +47,13 @@ public:
         return m_going && m_group == m_count / 2 * static_cast<int>(m_peers + 1) &&
                m_private == m_count / 2;
     }
-    void Report() const {
+    // Prints what came; whether all of it came, once and in order.
+    bool Report() const {
         std::printf("received group=%d private=%d duplicates=%d disorder=%d\n", m_group, m_private,
                     m_duplicates, m_disorder);
         std::fflush(stdout);
+        return Complete() && m_duplicates == 0 && m_disorder == 0;
     }
-    bool Clean() const { return Complete() && m_duplicates == 0 && m_disorder == 0; }
 
     int ConnectConfirm(short result, std::uint32_t) override {
         return result == 0 ? m_client.ConferenceJoin(0, kConference, this, 3) : Fail(result);
@@ -203,8 +204,7 @@ int main(int argc, char** argv) {
     });
     loop.AddTimer(kPatience, 0, [&loop] { loop.Quit(); });
     loop.Run();
-    participant.Report();
-    const bool clean = participant.Clean();
+    const bool clean = participant.Report();
     client->Release();
     std::_Exit(clean ? 0 : 1);
 }
