@@ -113,10 +113,9 @@ TEST_F(NatsConferenceTest, AHostileClientCanNeitherSpeakForOthersListenToThemNor
     RawClient mallory(Harness().Server(), "mallory");
     ASSERT_TRUE(mallory.Connected());
     const ConferenceSubjects subjects(kNatsConference);
-    const std::vector<std::pair<const char*, const char*>> action = {{"Qc-Action", "1"},
-                                                                     {"Qc-Flags", "0"}};
     // Speaking for p11: a cache line, private data, a farewell, a consumer on p12's mailbox.
-    mallory.Publish(subjects.CacheAction(cache, "p11"), "forged line", action);
+    mallory.Publish(subjects.CacheAction(cache, "p11"), "forged line",
+                    {{"Qc-Action", "1"}, {"Qc-Flags", "0"}});
     mallory.Publish(subjects.Private("p12", "p11"), "forged private");
     mallory.Publish(subjects.Presence("p11"), "", {{"Qc-State", "left"}});
     mallory.Publish("$JS.API.CONSUMER.CREATE." + subjects.MailboxStream("p12"), "{}", {},
