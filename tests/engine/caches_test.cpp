@@ -8,6 +8,8 @@
 #include <optional>
 #include <set>
 #include <string>
+#include <tuple>
+#include <utility>
 #include <vector>
 
 #include "engine/chat_client.h"
@@ -74,12 +76,10 @@ struct Participant {
 TEST(Caches, EachRoleSubscribesTheCachesItMayReadAndARoleChangeMovesThem) {
     Participant p;
     ASSERT_EQ(p.Subscribed(), (IdSet{15, 8}));
-    constexpr std::uint32_t kAsBefore = ~0u;  // no roster change: re-subscribe from the old role
-    const struct {
-        const char* role;
-        std::uint32_t hostId, presenterId, rosters;
-        IdSet subscribed;
-    } steps[] = {
+    constexpr std::uint32_t kAsBefore = ~0u;
+    // Each step: who holds host and presenter, the rosters (kAsBefore: no roster change, the
+    // subscriptions re-made from the role before), and the caches then subscribed.
+    const std::tuple<const char*, std::uint32_t, std::uint32_t, std::uint32_t, IdSet> steps[] = {
         // Becoming host re-subscribes by the new role at once: the attendees' cache goes, the
         // host's, host-and-presenter's and the panelists' come.
         {"attendee becomes host", kMyNode, 0, kAsBefore, {15, 1, 3, 4, 7}},
@@ -100,64 +100,57 @@ TEST(Caches, EachRoleSubscribesTheCachesItMayReadAndARoleChangeMovesThem) {
         {"attendee, no role held", 0, 0, 0, {15, 8}},
     };
     std::uint32_t host = 0, presenter = 0;
-    for (const auto& c : steps) {
-        SCOPED_TRACE(c.role);
+    for (const auto& [role, hostId, presenterId, rosters, subscribed] : steps) {
+        SCOPED_TRACE(role);
         // A re-subscription moves from the role before the one change the row makes.
-        const bool both = c.rosters != kAsBefore;
-        if (both || c.hostId != host) p.engine.OnHostChanged(host = c.hostId);
-        if (both || c.presenterId != presenter)
-            p.engine.OnPresenterChanged(presenter = c.presenterId);
-        if (c.rosters == kAsBefore) {
-            p.engine.ReSubscribeGroupCaches();
-        } else {
-            p.engine.SetRosters(c.rosters, 1);
+        const bool both = rosters != kAsBefore;
+        if (both || hostId != host) p.engine.OnHostChanged(host = hostId);
+        if (both || presenterId != presenter) p.engine.OnPresenterChanged(presenter = presenterId);
+        if (both) {
+            p.engine.SetRosters(rosters, 1);
             p.engine.SubscribeAllGroupCaches();
+        } else {
+            p.engine.ReSubscribeGroupCaches();
         }
-        EXPECT_EQ(p.Subscribed(), c.subscribed);
+        EXPECT_EQ(p.Subscribed(), subscribed);
     }
 }
 
 TEST(Caches, ARequestIsSentOnlyWhenItWouldChangeTheSubscription) {
     Participant p;
-    struct RequestCase {
-        const char* request;
-        std::uint32_t groupId;
-        bool subscribe;  // else unsubscribe
-        tagCacheRequestType type;
-        int result;
-        int subscribedAfter;
-        int requestTypeAfter;
-        bool refused = false;  // the service refuses the request: a later one may retry
-    };
-    const tagCacheRequestType kSub = CACHE_REQUEST_SUBSCRIBE, kUnsub = CACHE_REQUEST_UNSUBSCRIBE;
-    const RequestCase cases[] = {
-        {"subscribed with the same type", GROUP_EVERYONE, true, kSub, 0, 1, kSub},
-        {"subscribed, another type", GROUP_EVERYONE, true, CACHE_REQUEST_RETRIEVE, 1, 1,
-         CACHE_REQUEST_RETRIEVE},
-        {"refused unsubscribe", GROUP_EVERYONE, false, kUnsub, 1, 1, CACHE_REQUEST_RETRIEVE, true},
-        {"unsubscribe", GROUP_EVERYONE, false, kUnsub, 1, 0, kUnsub},
-        {"unsubscribe again", GROUP_EVERYONE, false, kUnsub, 0, 0, kUnsub},
-        {"subscribe after unsubscribing", GROUP_EVERYONE, true, kSub, 1, 1, kSub},
-        {"never subscribed, unsubscribe", GROUP_HOST, false, kUnsub, 0, 0, 0},
-    };
-    for (const RequestCase& c : cases) {
-        SCOPED_TRACE(c.request);
-        if (c.refused) p.client->FailNext(ArmOperation::ApeRequestSharedDataEx, 5);
+    const tagCacheRequestType kSub = CACHE_REQUEST_SUBSCRIBE, kUnsub = CACHE_REQUEST_UNSUBSCRIBE,
+                              kRead = CACHE_REQUEST_RETRIEVE;
+    // Each request: the group, subscribe (else unsubscribe) with which type, whether the
+    // service refuses it (a later request may retry), the result (1: sent), and the group's
+    // subscription and request type after it.
+    const std::tuple<const char*, std::uint32_t, bool, tagCacheRequestType, bool, int, int, int>
+        cases[] = {
+            {"subscribed with the same type", GROUP_EVERYONE, true, kSub, false, 0, 1, kSub},
+            {"subscribed, another type", GROUP_EVERYONE, true, kRead, false, 1, 1, kRead},
+            {"refused unsubscribe", GROUP_EVERYONE, false, kUnsub, true, 1, 1, kRead},
+            {"unsubscribe", GROUP_EVERYONE, false, kUnsub, false, 1, 0, kUnsub},
+            {"unsubscribe again", GROUP_EVERYONE, false, kUnsub, false, 0, 0, kUnsub},
+            {"subscribe after unsubscribing", GROUP_EVERYONE, true, kSub, false, 1, 1, kSub},
+            {"never subscribed, unsubscribe", GROUP_HOST, false, kUnsub, false, 0, 0, 0},
+        };
+    for (const auto& [request, groupId, subscribe, type, refused, sent, subscribedAfter,
+                      typeAfter] : cases) {
+        SCOPED_TRACE(request);
+        if (refused) p.client->FailNext(ArmOperation::ApeRequestSharedDataEx, 5);
         TraceCapture capture;
         const std::size_t before = p.spy->Count("ApeRequestSharedDataEx");
-        const int result = c.subscribe ? p.engine.SubscribeGroupCache(c.groupId, c.type)
-                                       : p.engine.UnSubscribeGroupCache(c.groupId);
-        EXPECT_EQ(result, c.result);
-        EXPECT_EQ(p.spy->Count("ApeRequestSharedDataEx") - before,
-                  static_cast<std::size_t>(c.result));
+        EXPECT_EQ(subscribe ? p.engine.SubscribeGroupCache(groupId, type)
+                            : p.engine.UnSubscribeGroupCache(groupId),
+                  sent);
+        EXPECT_EQ(p.spy->Count("ApeRequestSharedDataEx") - before, static_cast<std::size_t>(sent));
         int subscribed = 0, requestType = 0, cacheSet = 0;
-        ASSERT_TRUE(p.engine.GetGroupCacheStatus(c.groupId, subscribed, requestType, cacheSet));
-        EXPECT_EQ(subscribed, c.subscribedAfter);
-        EXPECT_EQ(requestType, c.requestTypeAfter);
+        ASSERT_TRUE(p.engine.GetGroupCacheStatus(groupId, subscribed, requestType, cacheSet));
+        EXPECT_EQ(subscribed, subscribedAfter);
+        EXPECT_EQ(requestType, typeAfter);
         EXPECT_EQ(
             capture.Has(TraceLevel::Warn,
                         "CChatClient::UnSubscribeGroupCache ApeRequestSharedDataEx return !0"),
-            c.refused);
+            refused);
     }
     // A group without a cache (a separator, an unknown id) is never asked for.
     const std::size_t before = p.spy->Count("ApeRequestSharedDataEx");
@@ -187,49 +180,44 @@ TEST(Caches, CachesNeverMarkedSetAreNeverSubscribed) {
 
 TEST(Caches, CacheActionConfirmationsDriveTheNextStep) {
     enum Entity { kUserInfo, kStatus, kGroupCache, kNoEntity };
-    struct ConfirmCase {
-        const char* confirmation;
-        Entity entity;
-        tagCacheAction action;
-        short result;
-        bool zeroApe;
-        bool recovering;
-        std::size_t writes;  // cache actions sent in answer
-        IdSet subscribed;    // the local participant became panelist just before
-        bool resubscribed;
-    };
+    // Each confirmation: its entity, action, result, whether the ape handle is 0 and whether
+    // recovery runs; then the cache actions sent in answer, the caches subscribed (the local
+    // participant became panelist just before) and whether they were re-subscribed.
     // The user info's set marks the status cache and writes the own info; either set then
     // subscribes by role, or only to everyone's cache while recovering.
-    const ConfirmCase cases[] = {
-        {"user info set", kUserInfo, CACHE_SET, 0, false, false, 2, {15, 4, 7}, true},
-        {"user info set, recovering", kUserInfo, CACHE_SET, 0, false, true, 2, {15, 8}, false},
-        {"status set", kStatus, CACHE_SET, 0, false, false, 0, {15, 4, 7}, false},
-        {"status set, recovering", kStatus, CACHE_SET, 0, false, true, 0, {15, 8}, false},
-        {"an append", kUserInfo, CACHE_APPEND, 0, false, false, 0, {15, 8}, false},
-        {"a refused set", kUserInfo, CACHE_SET, 3, false, false, 0, {15, 8}, false},
-        {"no ape handle", kUserInfo, CACHE_SET, 0, true, false, 0, {15, 8}, false},
-        {"no entity", kNoEntity, CACHE_SET, 0, false, false, 0, {15, 8}, false},
-        {"a group cache's set", kGroupCache, CACHE_SET, 0, false, false, 0, {15, 8}, false},
-    };
-    for (const ConfirmCase& c : cases) {
-        SCOPED_TRACE(c.confirmation);
+    const std::tuple<const char*, Entity, tagCacheAction, short, bool, bool, std::size_t, IdSet,
+                     bool>
+        cases[] = {
+            {"user info set", kUserInfo, CACHE_SET, 0, false, false, 2, {15, 4, 7}, true},
+            {"user info set, recovering", kUserInfo, CACHE_SET, 0, false, true, 2, {15, 8}, false},
+            {"status set", kStatus, CACHE_SET, 0, false, false, 0, {15, 4, 7}, false},
+            {"status set, recovering", kStatus, CACHE_SET, 0, false, true, 0, {15, 8}, false},
+            {"an append", kUserInfo, CACHE_APPEND, 0, false, false, 0, {15, 8}, false},
+            {"a refused set", kUserInfo, CACHE_SET, 3, false, false, 0, {15, 8}, false},
+            {"no ape handle", kUserInfo, CACHE_SET, 0, true, false, 0, {15, 8}, false},
+            {"no entity", kNoEntity, CACHE_SET, 0, false, false, 0, {15, 8}, false},
+            {"a group cache's set", kGroupCache, CACHE_SET, 0, false, false, 0, {15, 8}, false},
+        };
+    for (const auto& [confirmation, kind, action, result, zeroApe, recovering, writes, subscribed,
+                      resubscribed] : cases) {
+        SCOPED_TRACE(confirmation);
         Participant p;
-        if (c.recovering) p.engine.RecoveryMgr()->InitParameters(&p.engine, 0x400 | 0x200000);
+        if (recovering) p.engine.RecoveryMgr()->InitParameters(&p.engine, 0x400 | 0x200000);
         // Panelist now, but not yet subscribed as one.
         p.engine.SetRosters(ROLE_PANELIST, 1);
         ASSERT_EQ(p.Subscribed(), (IdSet{15, 8}));
 
         std::uint32_t entity = p.engine.GetCacheHandleFormGroupId(GROUP_HOST);
-        if (c.entity == kUserInfo) entity = p.engine.UserInfoCacheHandle().handle_value;
-        if (c.entity == kStatus) entity = p.engine.ChatStatusCacheHandle().handle_value;
-        if (c.entity == kNoEntity) entity = 0;
+        if (kind == kUserInfo) entity = p.engine.UserInfoCacheHandle().handle_value;
+        if (kind == kStatus) entity = p.engine.ChatStatusCacheHandle().handle_value;
+        if (kind == kNoEntity) entity = 0;
         TraceCapture capture;
         p.spy->ClearCalls();
-        p.engine.ApeCacheActionConfirmEx(c.zeroApe ? 0 : p.client->ApeHandle(), entity, c.action, 1,
-                                         1, c.result);
-        EXPECT_EQ(p.spy->Count("ApeSharedDataActionEx"), c.writes);
-        EXPECT_EQ(p.Subscribed(), c.subscribed);
-        EXPECT_EQ(capture.Has("Enter CChatClient::ReSubscribeGroupCaches"), c.resubscribed);
+        p.engine.ApeCacheActionConfirmEx(zeroApe ? 0 : p.client->ApeHandle(), entity, action, 1, 1,
+                                         result);
+        EXPECT_EQ(p.spy->Count("ApeSharedDataActionEx"), writes);
+        EXPECT_EQ(p.Subscribed(), subscribed);
+        EXPECT_EQ(capture.Has("Enter CChatClient::ReSubscribeGroupCaches"), resubscribed);
     }
 }
 
@@ -275,46 +263,40 @@ TEST(Caches, InitialisingSetsEveryCacheFromOneSharedBlock) {
 
 TEST(Caches, TheStatusCacheAnswerDecidesWhetherToInitialiseOrJoin) {
     const std::vector<std::uint8_t> mark = {'1', '\0'};
-    struct AnswerCase {
-        const char* answer;
-        tagCacheAction action;
-        short result;
-        std::optional<std::vector<std::uint8_t>> data;
-        bool initialises;
-        bool joins;  // own user info written, subscriptions by role
-        bool warns;
-    };
-    const AnswerCase cases[] = {
-        {"the mark", CACHE_REPLY_LAST, 0, mark, false, true, false},
-        {"nothing stored", CACHE_REPLY_LAST, 0, std::nullopt, true, false, false},
-        {"an empty item", CACHE_REPLY_LAST, 0, std::vector<std::uint8_t>{}, true, false, false},
-        {"never set", CACHE_REPLY_LAST, kArmRetry, std::nullopt, true, false, true},
-        {"another error", CACHE_REPLY_LAST, 5, std::nullopt, false, false, false},
-        {"not the last answer", CACHE_REPLY_ITEM, 0, mark, false, false, false},
-        {"an append", CACHE_APPEND, kArmRetry, std::nullopt, false, false, false},
-    };
-    for (const AnswerCase& c : cases) {
-        SCOPED_TRACE(c.answer);
+    // Each answer: its action, result and item; whether the engine then initialises every
+    // cache, joins (own user info written, subscriptions by role) and warns.
+    const std::tuple<const char*, tagCacheAction, short, std::optional<std::vector<std::uint8_t>>,
+                     bool, bool, bool>
+        cases[] = {
+            {"the mark", CACHE_REPLY_LAST, 0, mark, false, true, false},
+            {"nothing stored", CACHE_REPLY_LAST, 0, std::nullopt, true, false, false},
+            {"an empty item", CACHE_REPLY_LAST, 0, std::vector<std::uint8_t>{}, true, false, false},
+            {"never set", CACHE_REPLY_LAST, kArmRetry, std::nullopt, true, false, true},
+            {"another error", CACHE_REPLY_LAST, 5, std::nullopt, false, false, false},
+            {"not the last answer", CACHE_REPLY_ITEM, 0, mark, false, false, false},
+            {"an append", CACHE_APPEND, kArmRetry, std::nullopt, false, false, false},
+        };
+    for (const auto& [answer, action, result, data, initialises, joins, warns] : cases) {
+        SCOPED_TRACE(answer);
         Participant p;
         ArmCacheDelivery delivery;
         delivery.entityId = p.engine.ChatStatusCacheHandle().handle_value;
-        delivery.action = c.action;
-        delivery.result = c.result;
+        delivery.action = action;
+        delivery.result = result;
         TraceCapture capture;
         p.spy->ClearCalls();
-        ASSERT_TRUE(p.client->InjectCacheDelivery(delivery, c.data));
+        ASSERT_TRUE(p.client->InjectCacheDelivery(delivery, data));
         p.loop.RunUntilIdle();
         EXPECT_TRUE(capture.Has("CChatClient::SharedDataReceivedEx chat status cache ----/"));
-        EXPECT_EQ(capture.Has("Enter CChatClient::SetAllCaches"), c.initialises);
-        EXPECT_EQ(capture.Has("Enter CChatClient::SubscribeAllGroupCaches"),
-                  c.joins || c.initialises);
-        EXPECT_EQ(capture.Has("CChatClient::SetAllGroupCacheSetFlag()"), c.joins || c.initialises);
+        EXPECT_EQ(capture.Has("Enter CChatClient::SetAllCaches"), initialises);
+        EXPECT_EQ(capture.Has("Enter CChatClient::SubscribeAllGroupCaches"), joins || initialises);
+        EXPECT_EQ(capture.Has("CChatClient::SetAllGroupCacheSetFlag()"), joins || initialises);
         EXPECT_EQ(capture.Has(TraceLevel::Warn,
                               "CChatClient::SharedDataReceivedEx:entity_id == "
                               "m_ChatStatusCacheHandle.handle_value,result =19"),
-                  c.warns);
+                  warns);
         // Joining writes the own user info only; initialising sets every cache and more.
-        if (!c.initialises) EXPECT_EQ(p.spy->Count("ApeSharedDataActionEx"), c.joins ? 1u : 0u);
+        if (!initialises) EXPECT_EQ(p.spy->Count("ApeSharedDataActionEx"), joins ? 1u : 0u);
     }
 }
 
@@ -333,16 +315,13 @@ TEST(Caches, HandlesAndGroupIdsMapBothWays) {
 TEST(CacheNames, GroupIdIsTheNumberAfterTheLastUnderscore) {
     CChatClient engine;
     // Only eight characters after the underscore count.
-    const struct {
-        const char* name;
-        std::uint32_t groupId;
-    } cases[] = {
+    const std::pair<const char*, std::uint32_t> cases[] = {
         {"123_chat_cache_15", 15},     {"123_Chat_User_Info", 0},  {"123_chat_status", 0},
         {"123_chat_cache_4096", 4096}, {"123_chat_cache_4097", 0}, {"switch_cache_5000", 0},
         {"switch_cache_12", 12},       {"x_00000015", 15},         {"x_000000159", 15},
         {"123_chat_cache_", 0},        {"nounderscore15", 0},      {nullptr, 0}};
-    for (const auto& c : cases)
-        EXPECT_EQ(engine.GetGroupIdFormCacheName(c.name), c.groupId) << (c.name ? c.name : "null");
+    for (const auto& [name, groupId] : cases)
+        EXPECT_EQ(engine.GetGroupIdFormCacheName(name), groupId) << (name ? name : "null");
 }
 
 }  // namespace
