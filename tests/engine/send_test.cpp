@@ -5,6 +5,8 @@
 
 #include <algorithm>
 #include <string>
+#include <tuple>
+#include <utility>
 #include <vector>
 
 #include "engine/chat_client.h"
@@ -59,13 +61,8 @@ TEST(Sending, EveryAudienceOfAPanelMeetingReachesExactlyItsParticipants) {
     ChatRoom room(3);
     JoinPanel(room);
     const Names everybody{"Hana", "Pia", "Paul", "Ann", "Al"};
-    const struct {
-        const char* from;
-        std::int32_t groupId;
-        std::uint32_t node;
-        const char* title;
-        Names holders;
-    } rows[] = {
+    // Each line: who says it to which group (or to the node's entry), its title, who shows it.
+    const std::tuple<const char*, std::int32_t, std::uint32_t, const char*, Names> rows[] = {
         {"Ann", GROUP_ATTENDEES, 0, "from Ann to All Attendees", {"Ann", "Al"}},
         // An attendee does not read these caches: its own line is shown at once.
         {"Ann", GROUP_HOST, 0, "from Ann to Host (privately)", {"Hana", "Ann"}},
@@ -79,10 +76,10 @@ TEST(Sending, EveryAudienceOfAPanelMeetingReachesExactlyItsParticipants) {
         {"Hana", kPerson, kAl, "from Hana to Al (privately)", {"Hana", "Al"}},
     };
     int n = 0;
-    for (const auto& row : rows) {
+    for (const auto& [from, groupId, node, title, holders] : rows) {
         const std::string text = "line " + std::to_string(++n);
-        room.Say(ByName(room, row.from), text, row.groupId, row.node);
-        EXPECT_EQ(room.Holders(std::string(row.title) + "|" + text), row.holders) << row.title;
+        room.Say(ByName(room, from), text, groupId, node);
+        EXPECT_EQ(room.Holders(std::string(title) + "|" + text), holders) << title;
     }
     // Each line was shown once by each holder, and saved transcripts are marked modified.
     EXPECT_EQ(ChatRoom::Transcript(ByName(room, "Ann")).size(), 8u);
@@ -93,68 +90,59 @@ TEST(Sending, QMRulesSendToEveryoneOrPrivatelyToTheRoleHolder) {
     std::vector<int> telemetry;
     SetTelemetrySink([&telemetry](int id) { telemetry.push_back(id); });
     ChatRoom room(1, FEATURE_QM_MODE);
-    room.Join({"Hana", kHana, ROLE_HOST});
-    room.Join({"Pia", kPia, ROLE_PRESENTER});
-    room.Join({"Ann", kAnn, 0});
-    room.Join({"Al", kAl, 0});
-    room.SetHostAndPresenter(kHana, kPia);
+    JoinPanel(room);
     telemetry.clear();
-    const struct {
-        std::int32_t groupId;
-        std::uint32_t node;
-        const char* title;
-        Names holders;
-        int action;
-    } rows[] = {
-        {GROUP_EVERYONE, 0, "from Ann to Everyone", {"Hana", "Pia", "Ann", "Al"}, 908},
+    // Each line Ann says: to which group (or node), its title, who shows it, the action told.
+    const std::tuple<std::int32_t, std::uint32_t, const char*, Names, int> rows[] = {
+        {GROUP_EVERYONE, 0, "from Ann to Everyone", {"Hana", "Pia", "Paul", "Ann", "Al"}, 908},
         {GROUP_HOST, 0, "from Ann to Hana (privately)", {"Hana", "Ann"}, 904},
         {GROUP_HOST_PRESENTER, 0, "from Ann to Hana (privately)", {"Hana", "Ann"}, 905},
         {GROUP_PRESENTER, 0, "from Ann to Pia (privately)", {"Pia", "Ann"}, 903},
         {kPerson, kAl, "from Ann to Al (privately)", {"Ann", "Al"}, 909},
     };
     int n = 0;
-    for (const auto& row : rows) {
+    for (const auto& [groupId, node, title, holders, action] : rows) {
         const std::string text = "qm " + std::to_string(++n);
-        room.Say(ByName(room, "Ann"), text, row.groupId, row.node);
-        EXPECT_EQ(room.Holders(std::string(row.title) + "|" + text), row.holders) << row.title;
-        EXPECT_EQ(telemetry.back(), row.action) << row.title;
+        room.Say(ByName(room, "Ann"), text, groupId, node);
+        EXPECT_EQ(room.Holders(std::string(title) + "|" + text), holders) << title;
+        EXPECT_EQ(telemetry.back(), action) << title;
     }
     SetTelemetrySink(nullptr);
 }
 
 TEST(Sending, TheServiceIsGivenTheFlagsOfTheRecordCondition) {
-    const struct {
-        const char* condition;
-        std::uint32_t status, option, features;
-        int saveForReport;
-        std::uint32_t everyone, host, qm;
-    } rows[] = {
-        {"not recorded", 1, 1, 0, 0, 0x1000000, 0x1000000, 0x1000000},
-        {"not recorded, for report", 1, 1, 0, 1, 0x1000000, 0x1000000, 0x1000100},
-        {"recording", 0, 1, 0, 0, 0x1000090, 0x1000090, 0x1000090},
-        {"paused", 2, 1, 0, 0, 0x1000000, 0x1000000, 0x1000000},
-        {"recording without option", 3, 0, 0, 0, 0x1000090, 0x1000092, 0x1000090},
-        {"always recorded", 1, 0, FEATURE_ALWAYS_RECORD, 1, 0x1000090, 0x1000092, 0x1000290},
-        {"always recorded, paused", 2, 1, FEATURE_ALWAYS_RECORD, 0, 0x1000090, 0x1000090,
-         0x1000090},
-    };
-    for (const auto& row : rows) {
-        SCOPED_TRACE(row.condition);
-        ChatRoom room(3, row.features);
+    // Each condition: recording status and option, features, save-for-report; then the flags
+    // of an everyone line, of a host line and of the option a QM send gets.
+    const std::tuple<const char*, std::uint32_t, std::uint32_t, std::uint32_t, int, std::uint32_t,
+                     std::uint32_t, std::uint32_t>
+        rows[] = {
+            {"not recorded", 1, 1, 0, 0, 0x1000000, 0x1000000, 0x1000000},
+            {"not recorded, for report", 1, 1, 0, 1, 0x1000000, 0x1000000, 0x1000100},
+            {"recording", 0, 1, 0, 0, 0x1000090, 0x1000090, 0x1000090},
+            {"paused", 2, 1, 0, 0, 0x1000000, 0x1000000, 0x1000000},
+            {"recording without option", 3, 0, 0, 0, 0x1000090, 0x1000092, 0x1000090},
+            {"always recorded", 1, 0, FEATURE_ALWAYS_RECORD, 1, 0x1000090, 0x1000092, 0x1000290},
+            {"always recorded, paused", 2, 1, FEATURE_ALWAYS_RECORD, 0, 0x1000090, 0x1000090,
+             0x1000090},
+        };
+    for (const auto& [condition, status, option, features, saveForReport, toAll, toHost, qm] :
+         rows) {
+        SCOPED_TRACE(condition);
+        ChatRoom room(3, features);
         Member& hana = room.Join({"Hana", kHana, ROLE_HOST});
         room.SetHostAndPresenter(kHana, 0);
-        hana.engine.SetNBRStatus(row.status, row.option, 0);
-        hana.engine.SetSaveForReportFlag(row.saveForReport);
-        EXPECT_EQ(hana.engine.GetGroupSendPDUOption(), row.qm);
+        hana.engine.SetNBRStatus(status, option, 0);
+        hana.engine.SetSaveForReportFlag(saveForReport);
+        EXPECT_EQ(hana.engine.GetGroupSendPDUOption(), qm);
         room.Say(hana, "to all", GROUP_EVERYONE);
         room.Say(hana, "to me", GROUP_HOST);
         // After the cache's initial set, a recorded session gets the everyone group's
         // description before its first line.
         const std::vector<ArmEvent> everyone = CacheItems(room, hana, GROUP_EVERYONE);
-        const bool described = row.status == 0 || row.status == 3;
+        const bool described = status == 0 || status == 3;
         ASSERT_EQ(everyone.size(), described ? 3u : 2u);
-        EXPECT_EQ(everyone.back().value, row.everyone);
-        EXPECT_EQ(CacheItems(room, hana, GROUP_HOST).back().value, row.host);
+        EXPECT_EQ(everyone.back().value, toAll);
+        EXPECT_EQ(CacheItems(room, hana, GROUP_HOST).back().value, toHost);
         EXPECT_EQ(everyone[everyone.size() - 2].value, described ? 0x2000090u : 0x2000000u);
     }
 }
@@ -164,28 +152,23 @@ TEST(Sending, ALineTheServiceRefusesStaysTypedAndIsNotShown) {
     JoinPanel(room);
     Member& ann = ByName(room, "Ann");
     const std::uint32_t everyone = ann.engine.GetCacheHandleFormGroupId(GROUP_EVERYONE);
-    const struct {
-        const char* send;
-        ArmOperation op;
-        std::int32_t groupId;
-        std::uint32_t node;
-        std::string warning;
-    } rows[] = {
+    // Each send: the refused call, the group (or node) and the warning.
+    const std::tuple<const char*, ArmOperation, std::int32_t, std::uint32_t, std::string> rows[] = {
         {"group", ArmOperation::ApeSharedDataActionEx, GROUP_EVERYONE, 0,
          "CChatClient::SendChat:ApeSharedDataActionEx dwCacheHandle=" + std::to_string(everyone) +
              ",error =9"},
         {"private", ArmOperation::ApeSendData, kPerson, kHana,
          "CChatClient::SendChat:ApeSendData error =9"},
     };
-    for (const auto& row : rows) {
-        SCOPED_TRACE(row.send);
+    for (const auto& [send, op, groupId, node, warning] : rows) {
+        SCOPED_TRACE(send);
         const std::size_t before = ann.window->Commands().size();
         const std::size_t lines = ChatRoom::Transcript(ann).size();
         ann.engine.SetFileNeedSave(0);
-        ann.client->FailNext(row.op, 9);
+        ann.client->FailNext(op, 9);
         TraceCapture capture;
-        room.Say(ann, "again", row.groupId, row.node);
-        EXPECT_TRUE(capture.Has(TraceLevel::Warn, row.warning));
+        room.Say(ann, "again", groupId, node);
+        EXPECT_TRUE(capture.Has(TraceLevel::Warn, warning));
         EXPECT_EQ(Clears(ann, before), 0u);
         EXPECT_EQ(ChatRoom::Transcript(ann).size(), lines);
         EXPECT_EQ(ann.engine.FileNeedSave(), 0);
@@ -216,19 +199,16 @@ TEST(Sending, NothingLeavesForAnEntryThatCannotTakeTheLine) {
 }
 
 TEST(Sending, LineEndsLeaveAsCarriageReturnLineFeed) {
-    const struct {
-        const char* typed;
-        const char* sent;
-    } rows[] = {{"a\nb", "a\nb"},
-                {"a\n\nb", "a\r\nb"},
-                {"\n\n\n", "\r\r\n"},
-                {"a\rb", "a\r\nb"},
-                {"a\r\nb", "a\r\nb"},
-                {"a\n\rb", "a\r\nb"},
-                {"a\xE2\x80\xA8z", "a\r\nz"},
-                {"\r\r", "\r\r\r\n"}};
-    for (const auto& row : rows)
-        EXPECT_EQ(NormaliseLineEnds(row.typed), row.sent) << row.typed;
+    const std::pair<const char*, const char*> rows[] = {{"a\nb", "a\nb"},
+                                                        {"a\n\nb", "a\r\nb"},
+                                                        {"\n\n\n", "\r\r\n"},
+                                                        {"a\rb", "a\r\nb"},
+                                                        {"a\r\nb", "a\r\nb"},
+                                                        {"a\n\rb", "a\r\nb"},
+                                                        {"a\xE2\x80\xA8z", "a\r\nz"},
+                                                        {"\r\r", "\r\r\r\n"}};
+    for (const auto& [typed, sent] : rows)
+        EXPECT_EQ(NormaliseLineEnds(typed), sent) << typed;
     EXPECT_EQ(replace_all("aaa", "a", "aa"), "aaaaaa");
     EXPECT_EQ(replace_all("abab", "", "x"), "abab");
 }
@@ -244,17 +224,15 @@ TEST(Sending, PrivateAndChannelIdsByAudience) {
     Member& hana = room.Join({"Hana", kHana, ROLE_HOST});
     Member& ann = room.Join({"Ann", kAnn, 0});
     room.SetHostAndPresenter(kHana, 0);
-    const struct {
-        std::int32_t groupId;
-        std::uint32_t node;
-        std::int32_t channel;
-    } rows[] = {{GROUP_ATTENDEES, 0, 0},       {GROUP_HOST, 0, -1},    {GROUP_PRESENTER, 0, -3},
-                {GROUP_HOST_PRESENTER, 0, -2}, {GROUP_EVERYONE, 0, 0}, {kPerson, kAnn, 1}};
-    for (const auto& row : rows) {
-        ASSERT_TRUE(room.Select(hana, row.groupId, row.node));
-        const std::uint32_t channel =
-            row.channel == 1 ? ann.client->UserId() : static_cast<std::uint32_t>(row.channel);
-        EXPECT_EQ(hana.engine.GetSendUserChanelID(), channel) << row.groupId;
+    // Each entry (group, or node) and its channel (1: Ann's user id).
+    const std::tuple<std::int32_t, std::uint32_t, std::int32_t> rows[] = {
+        {GROUP_ATTENDEES, 0, 0},       {GROUP_HOST, 0, -1},    {GROUP_PRESENTER, 0, -3},
+        {GROUP_HOST_PRESENTER, 0, -2}, {GROUP_EVERYONE, 0, 0}, {kPerson, kAnn, 1}};
+    for (const auto& [groupId, node, channel] : rows) {
+        ASSERT_TRUE(room.Select(hana, groupId, node));
+        EXPECT_EQ(hana.engine.GetSendUserChanelID(),
+                  channel == 1 ? ann.client->UserId() : static_cast<std::uint32_t>(channel))
+            << groupId;
     }
     std::int32_t none = -1;
     hana.engine.HandleUIMessage(msg_SelectionChanged, &none, nullptr);

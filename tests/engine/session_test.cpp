@@ -6,6 +6,7 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "engine/chat_client.h"
@@ -194,46 +195,42 @@ TEST_F(SessionTest, AlreadyConnectedOrJoinedGoesOnWithinTheSameCall) {
 }
 
 TEST_F(SessionTest, AttachAndEnrollFailuresEndInIdle) {
-    struct Case {
-        const char* step;
-        std::optional<ArmOperation> call;
-        std::optional<ArmConfirmation> refusal;
-        int code;
-        std::size_t enrolls;
-        const char* error;
-    };
     const auto none = std::nullopt;
-    const Case cases[] = {
-        {"attach call", ArmOperation::ApeAttach, none, 5, 0,
-         "CChatClient::m_pArmClient->Attach user failed, nRetCode=5, nRetCode"},
-        {"attach confirmation", none, ArmConfirmation::ApeAttachConfirm, 3, 0, nullptr},
-        {"enroll call", ArmOperation::ApeEnroll, none, 9, 1,
-         "CChatClient::ApeEnroll failed. nRetCode = 9. "},
-        {"enroll confirmation", none, ArmConfirmation::ApeEnrollConfirm, 4, 1, nullptr},
-        {"resource status", none, ArmConfirmation::EnrollResourceStatus, 4, 1, nullptr},
-    };
+    // Each failure: the call that fails or the confirmation that refuses, with its code; the
+    // enrolls made by then and the error logged (none for a refusal).
+    const std::tuple<const char*, std::optional<ArmOperation>, std::optional<ArmConfirmation>, int,
+                     std::size_t, const char*>
+        cases[] = {
+            {"attach call", ArmOperation::ApeAttach, none, 5, 0,
+             "CChatClient::m_pArmClient->Attach user failed, nRetCode=5, nRetCode"},
+            {"attach confirmation", none, ArmConfirmation::ApeAttachConfirm, 3, 0, nullptr},
+            {"enroll call", ArmOperation::ApeEnroll, none, 9, 1,
+             "CChatClient::ApeEnroll failed. nRetCode = 9. "},
+            {"enroll confirmation", none, ArmConfirmation::ApeEnrollConfirm, 4, 1, nullptr},
+            {"resource status", none, ArmConfirmation::EnrollResourceStatus, 4, 1, nullptr},
+        };
     std::uint32_t node = 7;
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.step);
+    for (const auto& [step, call, refusal, code, enrolls, error] : cases) {
+        SCOPED_TRACE(step);
         InProcessArmClient* client = conference.CreateClient(loop, node);
         SpyArmClient spy(client);
-        if (c.call) client->FailNext(*c.call, c.code);
-        if (c.refusal) client->ConfirmNextWith(*c.refusal, c.code);
+        if (call) client->FailNext(*call, code);
+        if (refusal) client->ConfirmNextWith(*refusal, code);
         TraceCapture capture;
         CChatClient engine;
         engine.Initialize(Data(&spy, node++, "Bob"));
         loop.RunUntilIdle();
         EXPECT_EQ(engine.State(), kStateIdle);
         EXPECT_EQ(engine.Enrolled(), 0);
-        EXPECT_EQ(spy.Count("ApeEnroll"), c.enrolls);
+        EXPECT_EQ(spy.Count("ApeEnroll"), enrolls);
         EXPECT_EQ(spy.Count("AllocNameHandle"), 0u);
-        EXPECT_TRUE(!c.error || capture.Has(TraceLevel::Error, c.error));
-        if (!c.refusal) continue;
+        EXPECT_TRUE(!error || capture.Has(TraceLevel::Error, error));
+        if (!refusal) continue;
         EXPECT_TRUE(spy.Released());
         // Roles change after the refusal: the tick must not reach for the released service.
         engine.SetRosters(ROLE_HOST, 0);
         loop.AdvanceBy(5.0);
-        EXPECT_EQ(spy.Count("ApeEnroll"), c.enrolls);
+        EXPECT_EQ(spy.Count("ApeEnroll"), enrolls);
     }
 }
 
