@@ -7,6 +7,7 @@
 #include <cstdio>
 #include <optional>
 #include <string>
+#include <tuple>
 #include <type_traits>
 #include <vector>
 
@@ -87,13 +88,9 @@ protected:
 TEST_F(Receiving, AMessageReachesItsAudienceWithItsTitle) {
     const Names panel{"Hana", "Pia", "Paul"}, all{"Hana", "Pia", "Paul", "Ann"};
     constexpr bool kGroup = false, kPrivate = true;
-    const struct {
-        int from;  // 0 Hana, 3 Ann
-        bool privately;
-        std::int32_t to;  // group id, or receive id (1: Hana's user id)
-        const char* title;
-        Names holders;
-    } rows[] = {
+    // Each line: its sender (0 Hana, 3 Ann), group or private, the group id or receive id (1:
+    // Hana's user id), its title and who shows it.
+    const std::tuple<int, bool, std::int32_t, const char*, Names> rows[] = {
         // The attendees' chat is kept from host and presenter, not from panelists.
         {3, kGroup, GROUP_ATTENDEES, "from Ann to All Attendees", {"Paul", "Ann"}},
         {3, kGroup, GROUP_HOST, "from Ann to Host (privately)", {"Hana", "Ann"}},
@@ -117,17 +114,16 @@ TEST_F(Receiving, AMessageReachesItsAudienceWithItsTitle) {
         {3, kPrivate, -4, "from Ann to  (privately)", {"Ann"}},
     };
     int n = 0;
-    for (const auto& row : rows) {
+    for (const auto& [from, privately, toId, title, holders] : rows) {
         const std::string text = "line " + std::to_string(++n);
-        const char* name = row.from == 0 ? "Hana" : "Ann";
-        const std::uint32_t to =
-            row.privately && row.to == 1 ? Id(0) : static_cast<std::uint32_t>(row.to);
-        if (row.privately) {
-            Privately(PrivateLine(Id(row.from), name, to, text), Id(row.from));
+        const char* name = from == 0 ? "Hana" : "Ann";
+        const std::uint32_t to = privately && toId == 1 ? Id(0) : static_cast<std::uint32_t>(toId);
+        if (privately) {
+            Privately(PrivateLine(Id(from), name, to, text), Id(from));
         } else {
-            ToGroup(to, GroupLine(Id(row.from), name, to, text), Id(row.from));
+            ToGroup(to, GroupLine(Id(from), name, to, text), Id(from));
         }
-        EXPECT_EQ(room.Holders(std::string(row.title) + "|" + text), row.holders) << text;
+        EXPECT_EQ(room.Holders(std::string(title) + "|" + text), holders) << text;
     }
 }
 
@@ -283,25 +279,22 @@ TEST(Showing, ALineGoesToWindowTranscriptAndHostWithTheClocksTime) {
 }
 
 TEST(Showing, TheSoundModeDecidesWhichLinesPlayTheChosenFile) {
-    const struct {
-        PlaySoundMode mode;
-        std::uint32_t panel;
-        const char* file;
-        std::size_t plays;  // of three lines
-    } rows[] = {{0, 1, "/s", 0}, {1, 0, "/s", 0}, {1, 1, "/s", 3},
-                {2, 0, "/s", 1}, {3, 0, "/s", 3}, {3, 1, "", 0}};
-    for (const auto& row : rows) {
+    // Each row: the sound mode, the panel status, the file and how many of three lines play.
+    const std::tuple<PlaySoundMode, std::uint32_t, const char*, std::size_t> rows[] = {
+        {0, 1, "/s", 0}, {1, 0, "/s", 0}, {1, 1, "/s", 3},
+        {2, 0, "/s", 1}, {3, 0, "/s", 3}, {3, 1, "", 0}};
+    for (const auto& [mode, panel, file, plays] : rows) {
         Names played;
         SetSoundPlayer([&played](const char* path) { played.push_back(path); });
         CChatClient engine;
-        engine.SetSoundIncomingChat(row.mode);
-        FSRef file{};
-        std::snprintf(file.path, sizeof file.path, "%s", row.file);
-        engine.SetSoundFSSpec(file);
-        engine.SetPanelStatus(row.panel);
+        engine.SetSoundIncomingChat(mode);
+        FSRef sound{};
+        std::snprintf(sound.path, sizeof sound.path, "%s", file);
+        engine.SetSoundFSSpec(sound);
+        engine.SetPanelStatus(panel);
         for (int i = 0; i < 3; ++i)
             engine.PlaySoundIfNeed();
-        EXPECT_EQ(played, Names(row.plays, row.file)) << row.mode << "/" << row.panel << row.file;
+        EXPECT_EQ(played, Names(plays, file)) << mode << "/" << panel << file;
     }
     SetSoundPlayer(nullptr);
 }
