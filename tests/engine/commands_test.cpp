@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cstdint>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "engine/chat_client.h"
@@ -50,20 +51,16 @@ TEST(Commands, SelectionChangedMarksExactlyTheReportedEntry) {
     const int size = static_cast<int>(h.engine.Menu().size());
     // While a selected user has left the window reports -1; beyond the menu nothing is
     // selected either, and the previous choice is gone.
-    const struct {
-        std::int32_t index;
-        std::vector<int> selected;
-        std::vector<int> telemetry;
-    } cases[] = {
+    // Each report: the index, the entries then selected and the telemetry told.
+    const std::tuple<std::int32_t, std::vector<int>, std::vector<int>> cases[] = {
         {everyone, {everyone}, {902}}, {attendees, {attendees}, {}}, {-1, {}, {}}, {size, {}, {}}};
-    for (const auto& c : cases) {
-        std::int32_t before = c.index == attendees ? everyone : attendees;
+    for (auto [index, selected, actions] : cases) {
+        std::int32_t before = index == attendees ? everyone : attendees;
         ASSERT_EQ(h.engine.HandleUIMessage(msg_SelectionChanged, &before, nullptr), 0);
         TelemetryCapture telemetry;
-        std::int32_t index = c.index;
-        EXPECT_EQ(h.engine.HandleUIMessage(msg_SelectionChanged, &index, nullptr), 0) << c.index;
-        EXPECT_EQ(SelectedIndexes(h.engine), c.selected) << c.index;
-        EXPECT_EQ(telemetry.actions, c.telemetry) << c.index;
+        EXPECT_EQ(h.engine.HandleUIMessage(msg_SelectionChanged, &index, nullptr), 0) << index;
+        EXPECT_EQ(SelectedIndexes(h.engine), selected) << index;
+        EXPECT_EQ(telemetry.actions, actions) << index;
     }
 }
 
@@ -125,36 +122,31 @@ TEST(Commands, EventsNoWindowSendsChangeNothing) {
 }
 
 TEST(Commands, FeatureWordSetsModesAndTellsTheRecoveryManager) {
-    const struct {
-        std::uint32_t features;
-        bool meetingTypeAgain;
-        bool noSendToItems;
-        bool qm;
-        bool groupRecovery;
-    } cases[] = {
+    // Each feature word: whether the meeting type runs again, the window is told there are no
+    // send-to items, and the recovery manager learns of QM mode and of group recovery.
+    const std::tuple<std::uint32_t, bool, bool, bool, bool> cases[] = {
         {0, false, false, false, false},
         {FEATURE_QM_MODE | FEATURE_GROUP_MSG_RECOVERY, true, false, true, true},
         {FEATURE_EVERYONE_ONLY, false, true, false, false},
         {FEATURE_SAVE_FOR_REPORT | FEATURE_ALWAYS_RECORD, false, false, false, false},
     };
-    for (const auto& c : cases) {
+    for (const auto& [features, meetingTypeAgain, noSendToItems, qm, groupRecovery] : cases) {
+        SCOPED_TRACE(features);
         MenuHarness h({1});
         h.Commands();
         TraceCapture capture;
-        EXPECT_EQ(h.engine.SelectFeature(c.features, 0, 0, 0, 0, nullptr), 0);
-        EXPECT_EQ(capture.Has("Enter CChatClient::SetMeetingType = 1"), c.meetingTypeAgain)
-            << c.features;
+        EXPECT_EQ(h.engine.SelectFeature(features, 0, 0, 0, 0, nullptr), 0);
+        EXPECT_EQ(capture.Has("Enter CChatClient::SetMeetingType = 1"), meetingTypeAgain);
         const Strings commands = h.Commands();
         EXPECT_EQ(std::count(commands.begin(), commands.end(), "msg_NoSendToItems"),
-                  c.noSendToItems ? 1 : 0)
-            << c.features;
-        EXPECT_EQ(h.engine.RecoveryMgr()->GetQMFlag(), c.qm) << c.features;
-        EXPECT_EQ(h.engine.RecoveryMgr()->GetGroupMsgRecovery(), c.groupRecovery) << c.features;
+                  noSendToItems ? 1 : 0);
+        EXPECT_EQ(h.engine.RecoveryMgr()->GetQMFlag(), qm);
+        EXPECT_EQ(h.engine.RecoveryMgr()->GetGroupMsgRecovery(), groupRecovery);
         // Leaving QM mode does not run the meeting type again.
         TraceCapture leaving;
         h.engine.SelectFeature(0, 0, 0, 0, 0, nullptr);
-        EXPECT_FALSE(leaving.Has("Enter CChatClient::SetMeetingType = 1")) << c.features;
-        EXPECT_FALSE(h.engine.RecoveryMgr()->GetQMFlag()) << c.features;
+        EXPECT_FALSE(leaving.Has("Enter CChatClient::SetMeetingType = 1"));
+        EXPECT_FALSE(h.engine.RecoveryMgr()->GetQMFlag());
     }
 }
 
@@ -207,12 +199,9 @@ TEST(Commands, EveryoneOnlyHidesTheListAndSendsToEveryoneWhateverTheWindowReport
 TEST(Commands, ConfigurationKindsAndTheirRefusals) {
     const char* customer = "<chat ver=\"1.0\"><mtype>11</mtype><customerid>555</customerid></chat>";
     const char* faq = "<chat ver=\"1.0\"><mtype>8</mtype><lname>Lee</lname></chat>";
-    const struct {
-        std::uint32_t type;
-        const char* xml;
-        std::uint32_t customerId;
-        bool lastName;
-    } cases[] = {
+    // Each text: its kind, then the customer id (77 before) and whether the FAQ last name
+    // reaches the roster record.
+    const std::tuple<std::uint32_t, const char*, std::uint32_t, bool> cases[] = {
         {3, customer, 555, false},
         {3, "<chat ver=\"1.0\"><mtype>11</mtype><customerid>0</customerid></chat>", 0, false},
         {2, faq, 77, true},
@@ -225,16 +214,16 @@ TEST(Commands, ConfigurationKindsAndTheirRefusals) {
         {7, customer, 77, false},
         {7, faq, 77, false},
     };
-    for (const auto& c : cases) {
-        SCOPED_TRACE(std::to_string(c.type) + (c.xml ? c.xml : "null"));
+    for (const auto& [type, xml, customerId, lastName] : cases) {
+        SCOPED_TRACE(std::to_string(type) + (xml ? xml : "null"));
         MenuHarness h({1});
         h.engine.RecoveryMgr()->SetCustomerId(77);
-        EXPECT_EQ(h.engine.SetConfig(c.type, c.xml), 0);
-        EXPECT_EQ(h.engine.RecoveryMgr()->GetCustomerId(), c.customerId);
+        EXPECT_EQ(h.engine.SetConfig(type, xml), 0);
+        EXPECT_EQ(h.engine.RecoveryMgr()->GetCustomerId(), customerId);
         // The FAQ fields as the next roster record carries them.
         CRosterInfoPDU pdu;
         h.engine.MakeRosterInfoPDU(&pdu);
-        EXPECT_EQ(pdu.ToWireText().find("<LName>") != std::string::npos, c.lastName);
+        EXPECT_EQ(pdu.ToWireText().find("<LName>") != std::string::npos, lastName);
     }
     // After the tear-down there is nothing to configure.
     MenuHarness h({1});
