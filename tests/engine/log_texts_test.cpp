@@ -5,6 +5,7 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "engine/chat_client.h"
@@ -51,14 +52,10 @@ TEST(LogTexts, SessionWalkAndHostCommands) {
     VirtualRunLoop loop;
     ScopedCurrentRunLoop current{&loop};
     InProcessConference conference;
-    struct Step {
-        const char* step;
-        bool withService;  // started on a conference before the capture begins
-        std::function<void(Engine&)> act;
-        Strings lines;
-    };
     const std::string initialize = "CChatClient::Initialize";
-    const Step steps[] = {
+    // Each step: whether the engine was started on a conference before the capture begins,
+    // what it does, and the lines it logs.
+    const std::tuple<const char*, bool, std::function<void(Engine&)>, Strings> steps[] = {
         {"Initialize", false,
          [](Engine& e) {
              ChatData data{};
@@ -105,10 +102,10 @@ TEST(LogTexts, SessionWalkAndHostCommands) {
          Scoped("CChatClient::HandleFAQMacroInfoConfig()")},
     };
     std::uint32_t node = 7;
-    for (const Step& s : steps) {
-        SCOPED_TRACE(s.step);
+    for (const auto& [step, withService, act, lines] : steps) {
+        SCOPED_TRACE(step);
         Engine engine = std::make_unique<CChatClient>();
-        if (s.withService) {
+        if (withService) {
             engine->Initialize(chatroom::StartRecord(conference.CreateClient(loop, node),
                                                      conference.ConferenceId(), 42, "Alice", node,
                                                      0));
@@ -116,7 +113,7 @@ TEST(LogTexts, SessionWalkAndHostCommands) {
             loop.RunUntilIdle();
         }
         TraceCapture capture;
-        s.act(engine);
-        EXPECT_EQ(Matching(capture, s.lines), s.lines);
+        act(engine);
+        EXPECT_EQ(Matching(capture, lines), lines);
     }
 }
