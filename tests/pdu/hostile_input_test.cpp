@@ -114,7 +114,6 @@ TEST(HostileInput, AMegabyteMessageParsesAndAnOversizedTextIsRefused) {
     EXPECT_EQ(pdu.GetMessageContent(), Repeat("]] >", 1024 * 1024 / 3));
 
     const std::string huge = GroupMessageWith("<![CDATA[" + std::string(kMaxXmlBytes, 'x') + "]]>");
-    EXPECT_EQ(pdu.ParseXMLPDU(huge), 0);
     EXPECT_EQ(pdu.ParseXMLPDU(huge.data(), huge.size()), 0);
     EXPECT_EQ(pdu.GetPDUType(huge), 0);
 }

@@ -4,7 +4,6 @@
 #include <QLineEdit>
 #include <QPushButton>
 #include <QTableView>
-#include <QTimer>
 
 #include "platform/warning_window.h"
 #include "tests/ui/window_fixture.h"
@@ -27,7 +26,7 @@ protected:
 
     // Picks "Select an Attendee..." the way a user does and answers with attendees.
     ChatSelectAttdControl* Open(const std::vector<std::pair<std::string, std::uint32_t>>& people) {
-        engine.onEvent = [this, people](int id, std::int64_t) {
+        engine.onEvent = [this, people](int id) {
             if (id != msg_ShowAttendeeList) return;
             for (const auto& [name, node] : people) {
                 AttendeeRecord record{name, node};
@@ -123,53 +122,31 @@ TEST_F(AttendeeDialogTest, ChoosingAnotherTargetOrTheEngineClosesIt) {
     EXPECT_EQ(window->attendeeDialog(), nullptr);
 }
 
-TEST_F(AttendeeDialogTest, EngineClosesAShowingWarningBeforeTheDialog) {
+// The engine's tick asks the window to close the warning, then closes the dialog; a dialog closed
+// while its warning runs is freed only after the warning returns.
+TEST_F(AttendeeDialogTest, EngineClosesTheWarningAndTheDialogFreedAfterIt) {
     ChatSelectAttdControl* dialog = Open({{"Ann", 1}});
     QPointer<ChatSelectAttdControl> guard(dialog);
-    // The warning runs its own event loop until it is closed, as a real box does.
-    QEventLoop* box = nullptr;
-    SetWarningPresenter(
-        [&box](const char*, const char*) {
-            QEventLoop loop;
-            box = &loop;
-            loop.exec();
-            box = nullptr;
-        },
-        [&box] {
-            if (box) box->quit();
-        });
     std::vector<std::int32_t> answers;
-    // The engine's tick: ask to close the warning until it is gone, then close the dialog.
-    QTimer tick;
-    QObject::connect(&tick, &QTimer::timeout, [&] {
+    const auto tick = [&] {
         std::int32_t showing = -1;
         Command(msg_CloseAttendeeWarning, nullptr, &showing);
         answers.push_back(showing);
-        if (showing == 0) {
-            Command(msg_CloseAttendeeDialog);
-            tick.stop();
-        }
-    });
-    tick.start(1);
-    Find(dialog, " ");  // returns once the warning closed
-    EXPECT_FALSE(dialog->isShowingWarning());
-    while (tick.isActive())
-        QApplication::processEvents();
-    EXPECT_EQ(answers, (std::vector<std::int32_t>{1, 0}));
-    QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
-    EXPECT_TRUE(guard.isNull());
-}
-
-TEST_F(AttendeeDialogTest, DialogClosedDuringItsWarningIsFreedOnlyAfterTheWarning) {
-    ChatSelectAttdControl* dialog = Open({{"Ann", 1}});
-    QPointer<ChatSelectAttdControl> guard(dialog);
+    };
+    int closed = 0;
     bool aliveWhileShowing = false;
-    SetWarningPresenter([&](const char*, const char*) {
-        Command(msg_CloseAttendeeDialog);
-        QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
-        aliveWhileShowing = !guard.isNull();
-    });
-    Find(dialog, "");
+    SetWarningPresenter(
+        [&](const char*, const char*) {
+            tick();
+            Command(msg_CloseAttendeeDialog);
+            QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+            aliveWhileShowing = !guard.isNull();
+        },
+        [&closed] { ++closed; });
+    tick();
+    Find(dialog, " ");
+    EXPECT_EQ(answers, (std::vector<std::int32_t>{0, 1}));
+    EXPECT_EQ(closed, 1);
     EXPECT_TRUE(aliveWhileShowing);
     EXPECT_EQ(window->attendeeDialog(), nullptr);
     QApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);

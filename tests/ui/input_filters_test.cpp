@@ -15,8 +15,6 @@ TEST(MaxFilter, BeepsAtTheLimitAndCutsWholeCharacters) {
     const QString pasted(1200, 'b');
     EXPECT_TRUE(filter.isPartialStringValid(pasted));
     EXPECT_EQ(beeps, 1);
-    EXPECT_EQ(filter.getObjectValue(pasted), QString(1000, 'b'));
-    EXPECT_EQ(filter.getObjectValue("short"), "short");
 
     // A character outside the basic plane is one character and is never split.
     const QString clef = QString::fromUcs4(U"\U0001D11E");

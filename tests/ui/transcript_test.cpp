@@ -93,20 +93,7 @@ TEST_F(TranscriptTest, TitlesAndBodiesHaveTheirStylesAndPeerMarkupIsText) {
         EXPECT_FALSE(run.second) << run.first;
 }
 
-TEST_F(TranscriptTest, UrlWordsBecomeLinksWithoutUnderline) {
-    Show("see www.Example.com/A or ftp://nodot now");
-    const auto runs = Fragments(Document());
-    const std::vector<std::pair<std::string, bool>> expected = {
-        {"see ", false}, {"www.Example.com/A", true}, {" or ftp://nodot now", false}};
-    EXPECT_EQ(runs, expected);
-    QTextCursor cursor(Document());
-    cursor.setPosition(6);
-    EXPECT_EQ(cursor.charFormat().anchorHref(), "www.Example.com/A");
-    EXPECT_FALSE(cursor.charFormat().fontUnderline());
-    EXPECT_EQ(cursor.charFormat().foreground().color(), QColor(Qt::blue));
-}
-
-TEST_F(TranscriptTest, ClickedLinksOpenByScheme) {
+TEST_F(TranscriptTest, LinksShowAsLinksAndOpenByScheme) {
     auto panels = std::make_shared<ScriptedPanels>();
     SetChatPanelProvider(panels);
     NSTextViewWithLinks* view = window->textView();
@@ -122,11 +109,17 @@ TEST_F(TranscriptTest, ClickedLinksOpenByScheme) {
     EXPECT_EQ(panels->asked,
               (std::vector<std::string>{"file:///etc/passwd", "telnet:host.example"}));
 
-    // A real click on a link run goes the same way.
+    // URL words become link runs without underline; a real click on one goes the same way.
     panels->opened.clear();
-    Show("go www.a.com");
+    Show("go www.A.com or ftp://nodot");
+    EXPECT_EQ(Fragments(Document()),
+              (std::vector<std::pair<std::string, bool>>{
+                  {"go ", false}, {"www.A.com", true}, {" or ftp://nodot", false}}));
     QTextCursor cursor(view->document());
     cursor.setPosition(4);
+    EXPECT_EQ(cursor.charFormat().anchorHref(), "www.A.com");
+    EXPECT_FALSE(cursor.charFormat().fontUnderline());
+    EXPECT_EQ(cursor.charFormat().foreground().color(), QColor(Qt::blue));
     const QRect at = view->cursorRect(cursor);
     QTest::mouseClick(view->viewport(), Qt::LeftButton, {}, at.center() + QPoint(4, 0));
     EXPECT_EQ(panels->opened, (std::vector<std::string>{"http://www.a.com"}));

@@ -8,24 +8,16 @@ namespace {
 
 const std::string kPlaceholder = "--- Please Select ---";
 
-TEST_F(WindowTest, InsertAppendsWithoutOrPastAPositionAndMakesSeparators) {
-    MenuStatus a = Entry("Everyone", 15);
-    Command(msg_InsertMenuItem, &a, nullptr);
-    MenuStatus b = Entry("Bob");
-    std::int32_t far = 7;
-    Command(msg_InsertMenuItem, &b, &far);
-    MenuStatus c = Entry("Ann");
-    std::int32_t first = 0;
-    Command(msg_InsertMenuItem, &c, &first);
-    MenuStatus titledSeparator = SeparatorEntry("ignored");
-    std::int32_t second = 1;
-    Command(msg_InsertMenuItem, &titledSeparator, &second);
+// An insert appends without or past a position and makes any separator entry a separator; a
+// rebuild keeps titled separator entries as items and shows disabled entries grey.
+TEST_F(WindowTest, InsertAndRebuildMakeRowsWithoutReportingASelection) {
+    Insert(Entry("Everyone", 15));
+    Insert(Entry("Bob"), 7);
+    Insert(Entry("Ann"), 0);
+    Insert(SeparatorEntry("ignored"), 1);
     EXPECT_EQ(Rows(), (std::vector<std::string>{"Ann", "-", "Everyone", "Bob"}));
     EXPECT_TRUE(ChatMenuItem::From(window->userlist()->itemAtIndex(2))->isGroup());
-    EXPECT_TRUE(engine.events.empty());
-}
 
-TEST_F(WindowTest, RebuildKeepsTitledSeparatorEntriesAsItemsAndDisabledEntriesGrey) {
     Rebuild({Entry("Everyone", 15), SeparatorEntry(), SeparatorEntry("Panelists"),
              Entry("Carl", -1, false)});
     EXPECT_EQ(Rows(), (std::vector<std::string>{"Everyone", "-", "Panelists", "Carl"}));
@@ -33,7 +25,7 @@ TEST_F(WindowTest, RebuildKeepsTitledSeparatorEntriesAsItemsAndDisabledEntriesGr
     EXPECT_FALSE(carl->isEnabled());
     EXPECT_EQ(carl->foreground().color(), QColor(Qt::gray));
     EXPECT_TRUE(window->userlist()->itemAtIndex(0)->font().bold());
-    // Removing and selecting from code never reports a selection by itself.
+    // Removing from code never reports a selection by itself either.
     Command(msg_RemoveMenuItem, 9);
     Command(msg_RemoveMenuItem, -1);
     Command(msg_RemoveMenuItem, 1);
@@ -50,9 +42,8 @@ TEST_F(WindowTest, ThePopupShowsTheEnginesNewSelectionsOrNothing) {
     Rebuild({Entry("Everyone", 15), SeparatorEntry(), Entry("Ann"), bob});
     EXPECT_EQ(Selected(), 3);
     Rebuild({});
-    MenuStatus ann = Entry("Ann");
-    Command(msg_InsertMenuItem, &ann, nullptr);
-    Command(msg_InsertMenuItem, &bob, nullptr);
+    Insert(Entry("Ann"));
+    Insert(bob);
     EXPECT_EQ(Selected(), -1);
     EXPECT_TRUE(engine.events.empty());
     // The engine's own choice is shown and reported, the first row included, but only when it
@@ -83,8 +74,7 @@ TEST_F(WindowTest, SelectedUserLeftShowsThePlaceholderUntilATargetIsChosenAgain)
     std::string anna = "Anna";
     Command(msg_RenameMenuItem, &anna, reinterpret_cast<void*>(1));
     Command(msg_UpdateMenuItem, &renamed, reinterpret_cast<void*>(1));
-    MenuStatus carl = Entry("Carl");
-    Command(msg_InsertMenuItem, &carl, nullptr);
+    Insert(Entry("Carl"));
     Command(msg_SelectMenuItem, 0);
     std::int32_t allow = 1;
     Command(msg_AllowUserInput, &allow);
