@@ -8,19 +8,15 @@
 
 namespace {
 
-int g_items[40];
-
-void* Item(int i) {
-    return &g_items[i];
+// The vector never follows its pointers, so item n is stored as the address n + 1.
+void* Item(int n) {
+    return reinterpret_cast<void*>(static_cast<intptr_t>(n) + 1);
 }
 
-// The vector's pointers as item numbers (-1 for a pointer that is not an item).
 std::vector<int> Numbers(const CKyVector& v) {
     std::vector<int> numbers;
-    for (int32_t i = 0; i < v.GetCount(); ++i) {
-        const int* p = static_cast<const int*>(v[i]);
-        numbers.push_back(p >= g_items && p < g_items + 40 ? static_cast<int>(p - g_items) : -1);
-    }
+    for (int32_t i = 0; i < v.GetCount(); ++i)
+        numbers.push_back(static_cast<int>(reinterpret_cast<intptr_t>(v[i])) - 1);
     return numbers;
 }
 

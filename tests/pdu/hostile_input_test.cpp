@@ -28,6 +28,7 @@ const std::string kCrashDeep = Repeat("<a>", 100000);
 
 }  // namespace
 
+// Received bytes are read up to their length only: what follows in memory is never looked at.
 TEST(HostileInput, EveryCutOfAPduFailsAndOnlyTheWholeOneParses) {
     CGroupMessagePDU sent;
     sent.SetSenderName("Ann");
@@ -36,12 +37,16 @@ TEST(HostileInput, EveryCutOfAPduFailsAndOnlyTheWholeOneParses) {
     sent.SetMessageContent("hello");
     sent.GenerateXMLPDU();
     const std::string text = sent.ToWireText();
+    const std::string memory = text + "<broken";
     for (size_t length = 0; length < text.size(); ++length) {
         CGroupMessagePDU pdu;
-        EXPECT_EQ(pdu.ParseXMLPDU(text.data(), length), 0) << text.substr(0, length);
+        EXPECT_EQ(pdu.ParseXMLPDU(memory.data(), length), 0) << text.substr(0, length);
     }
     CGroupMessagePDU whole;
-    EXPECT_EQ(whole.ParseXMLPDU(text.data(), text.size()), 1);
+    EXPECT_EQ(whole.ParseXMLPDU(memory.data(), text.size()), 1);
+    EXPECT_EQ(whole.GetPDUType(memory.data(), text.size()), 3);
+    EXPECT_EQ(whole.ParseXMLPDU(memory.data(), memory.size()), 0);
+    EXPECT_EQ(whole.ParseXMLPDU(nullptr, 5), 0);
 }
 
 TEST(HostileInput, ANulEndsTheTextAsTheParserSeesIt) {
