@@ -5,15 +5,17 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <functional>
 #include <set>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "api/ui_protocol.h"
 #include "engine/chat_recovery_mgr.h"
 #include "pdu/private_message_pdu.h"
+#include "platform/trace.h"
 #include "tests/engine/chat_room.h"
-#include "tests/support/trace_capture.h"
 
 using namespace chatroom;
 
@@ -41,47 +43,29 @@ void Leave(ChatRoom& room, const Member& member) {
     room.Run();
 }
 
-// A host that, when its participant shows the first line, has another participant send one
-// to everyone, without running the conference: it arrives while recovery is under way.
-class SayWhileRestoring final : public IHostChatSink {
+// At the nth retrieval the participant now joining asks for (1 user info, 2 customer cache,
+// 3 the everyone group's cache) runs action, by default making its service refuse it. Keeps
+// the texts logged meanwhile, warnings marked "W:".
+class AtNthRetrieval {
 public:
-    SayWhileRestoring(ChatRoom& room, Member& from, std::string text)
-        : m_room(room), m_from(from), m_text(std::move(text)) {}
-    void OnIncomingChat(const char*, const char*, std::uint32_t) override {
-        if (m_bSaid) return;
-        m_bSaid = true;
-        m_room.Select(m_from, GROUP_EVERYONE);
-        m_from.window->inputText = m_text;
-        m_from.engine.HandleUIMessage(msg_SendChat, nullptr, nullptr);
-    }
-    void OnChatShown() override {}
-    void OnChatModified(bool) override {}
-    void OnChatContentChanged(bool) override {}
-
-private:
-    ChatRoom& m_room;
-    Member& m_from;
-    std::string m_text;
-    bool m_bSaid = false;
-};
-
-// Makes the nth retrieval the participant asks for (1 user info, 2 customer cache, 3 the
-// everyone group's cache) be refused by its service, and keeps the warnings.
-class RefuseNthRetrieval {
-public:
-    RefuseNthRetrieval(ChatRoom& room, int nth) {
-        SetTraceSink([&room, nth, this](TraceLevel level, const char*, const char* text) {
-            if (level == TraceLevel::Warn) warnings.insert(text);
+    AtNthRetrieval(ChatRoom& room, int nth, std::function<void()> action = {}) {
+        if (!action) {
+            action = [&room] {
+                room.members.back()->client->FailNext(ArmOperation::ApeRequestSharedDataEx, 1104);
+            };
+        }
+        SetTraceSink([nth, action, this](TraceLevel level, const char*, const char* text) {
+            logged.insert((level == TraceLevel::Warn ? "W:" : "") + std::string(text));
             if (std::string(text) == "Enter CChatClient::ChatRequestSharedDataEx" &&
                 ++m_seen == nth)
-                room.members.back()->client->FailNext(ArmOperation::ApeRequestSharedDataEx, 1104);
+                action();
         });
     }
-    ~RefuseNthRetrieval() {
+    ~AtNthRetrieval() {
         SetTraceSink([](TraceLevel, const char*, const char*) {});
     }
 
-    std::set<std::string> warnings;
+    std::set<std::string> logged;
 
 private:
     int m_seen = 0;
@@ -99,10 +83,14 @@ TEST(LateJoiner, SeesPrivateAndEveryoneHistoryOnceInOrderNamedAlsoForThoseWhoLef
     room.Say(ann, "two", GROUP_EVERYONE);
     Leave(room, bob);
 
-    TraceCapture trace;
-    SayWhileRestoring host(room, ann, "during");
-    Member& cy = room.Join(kCy, &host);
-    EXPECT_TRUE(trace.Has(kStarted));
+    // Ann says one more line to everyone just before Cy asks for the everyone group's cache.
+    AtNthRetrieval during(room, 3, [&room, &ann] {
+        room.Select(ann, GROUP_EVERYONE);
+        ann.window->inputText = "during";
+        ann.engine.HandleUIMessage(msg_SendChat, nullptr, nullptr);
+    });
+    Member& cy = room.Join(kCy);
+    EXPECT_TRUE(during.logged.count(kStarted));
     // Every copy of a line (sender's, receivers', a late joiner's backup) is in the customer
     // cache, and a line sent while restoring is also in the everyone group's: each shows once.
     const Strings history{"from Ann to Bob (privately)|hi Bob", "from Bob to Everyone|one",
@@ -111,10 +99,10 @@ TEST(LateJoiner, SeesPrivateAndEveryoneHistoryOnceInOrderNamedAlsoForThoseWhoLef
     EXPECT_EQ(ChatRoom::Transcript(room.Join(kDee)), history);
 
     // Recovery never runs twice in one engine.
-    trace.Clear();
+    during.logged.clear();
     cy.engine.CheckChatStatus();
     room.Run();
-    EXPECT_FALSE(trace.Has(kStarted));
+    EXPECT_FALSE(during.logged.count(kStarted));
     room.Say(ann, "three", GROUP_EVERYONE);
     EXPECT_EQ(ChatRoom::Transcript(cy).size(), history.size() + 1);
 }
@@ -129,23 +117,20 @@ TEST(LateJoiner, BacksUpTheEveryoneHistoryIntoACustomerCacheNobodySetBefore) {
 
     // Dee cannot read the everyone group's cache: the backup, named from the history roster
     // since Ann has left, is all she has. She is told so in the log and chats on.
-    RefuseNthRetrieval refuse(room, 3);
+    AtNthRetrieval refuse(room, 3);
     Member& dee = room.Join(kDee);
     EXPECT_EQ(ChatRoom::Transcript(dee),
               Strings({"from Ann to Everyone|kept in the everyone cache only"}));
-    EXPECT_TRUE(refuse.warnings.count("ChatRecoveryMgr: cache of group 15 (handle " +
-                                      std::to_string(cy.engine.GetCacheHandleFormGroupId(15)) +
-                                      ") not read (result 1104); recovery ends"));
+    EXPECT_TRUE(refuse.logged.count("W:ChatRecoveryMgr: cache of group 15 (handle " +
+                                    std::to_string(cy.engine.GetCacheHandleFormGroupId(15)) +
+                                    ") not read (result 1104); recovery ends"));
     room.Say(cy, "still here", GROUP_EVERYONE);
     EXPECT_EQ(ChatRoom::Transcript(dee).back(), "from Cy to Everyone|still here");
 }
 
 TEST(LateJoiner, ARefusedReadLeavesTheRestOfTheHistoryAndALiveChat) {
-    const struct {
-        int nth;
-        const char* warning;  // with %u for the cache handle
-        Strings history;
-    } cases[] = {
+    // The retrieval refused, the warning (%u: the cache's handle) and the history still shown.
+    const std::tuple<int, const char*, Strings> cases[] = {
         {1,
          "ChatRecoveryMgr: user info cache %u not read (result 1104); senders who have left "
          "stay unnamed",
@@ -155,22 +140,22 @@ TEST(LateJoiner, ARefusedReadLeavesTheRestOfTheHistoryAndALiveChat) {
          "group only",
          {"from Ann to Everyone|one"}},
     };
-    for (const auto& c : cases) {
-        SCOPED_TRACE(c.nth);
+    for (const auto& [nth, format, history] : cases) {
+        SCOPED_TRACE(nth);
         ChatRoom room(1, kRecover);
         GiveCustomerId(room, kCustomerId);
         Member& ann = room.Join(kAnn);
         room.Join(kBob);
         room.Say(ann, "hi", -1, kBob.node);
         room.Say(ann, "one", GROUP_EVERYONE);
-        RefuseNthRetrieval refuse(room, c.nth);
+        AtNthRetrieval refuse(room, nth);
         Member& cy = room.Join(kCy);
         const std::uint32_t handles[] = {cy.engine.UserInfoCacheHandle().handle_value,
                                          cy.engine.CustomerCacheHandle().handle_value};
         char warning[256];
-        std::snprintf(warning, sizeof warning, c.warning, handles[c.nth - 1]);
-        EXPECT_TRUE(refuse.warnings.count(warning));
-        EXPECT_EQ(ChatRoom::Transcript(cy), c.history);
+        std::snprintf(warning, sizeof warning, format, handles[nth - 1]);
+        EXPECT_TRUE(refuse.logged.count(std::string("W:") + warning));
+        EXPECT_EQ(ChatRoom::Transcript(cy), history);
         room.Say(ann, "live", GROUP_EVERYONE);
         EXPECT_EQ(ChatRoom::Transcript(cy).back(), "from Ann to Everyone|live");
     }

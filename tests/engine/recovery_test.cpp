@@ -139,59 +139,48 @@ private:
 }  // namespace
 
 TEST(Recovery, StartsOnlyInQMModeWithGroupRecoveryAndOnlyOnce) {
-    const struct {
-        std::uint32_t features;
-        bool starts;
-    } cases[] = {{FEATURE_GROUP_MSG_RECOVERY, false},
-                 {FEATURE_QM_MODE, false},
-                 {kRecovering | 0x10000, true}};
-    for (const auto& c : cases) {
-        SCOPED_TRACE(c.features);
-        Recovery r(c.features);
-        EXPECT_EQ(r.Start(), c.starts);
+    for (const std::uint32_t features :
+         {FEATURE_GROUP_MSG_RECOVERY, FEATURE_QM_MODE, kRecovering | 0x10000}) {
+        SCOPED_TRACE(features);
+        const bool starts = (features & kRecovering) == kRecovering;
+        Recovery r(features);
+        EXPECT_EQ(r.Start(), starts);
         EXPECT_FALSE(r.Start());
-        EXPECT_EQ(r.requests, c.starts ? Strings({"501:1:255", "502:1:255"}) : Strings());
-        EXPECT_EQ(r.mgr.CheckUpdate4GroupRecovery(kEveryoneCache), c.starts);
+        EXPECT_EQ(r.requests, starts ? Strings({"501:1:255", "502:1:255"}) : Strings());
+        EXPECT_EQ(r.mgr.CheckUpdate4GroupRecovery(kEveryoneCache), starts);
     }
 }
 
-TEST(Recovery, PrivateHistoryIsTitledWithBothNamesWhileTheCustomerCacheIsRestored) {
+TEST(Recovery, HistoryIsTheCustomerCacheTitledWithBothNamesThenTheEveryoneGroupByCacheId) {
     Recovery r;
     r.liveRoster[11] = "Ann";
     r.Start();
     r.Roster(UserInfo(12, "Bob (left)"));
     r.Roster(UserInfo(12, "Bob again"));  // the first record of an id names it
-    r.Roster("not a record");
     r.Customer(PrivateLine(11, 12, "hi Bob"));
     r.Customer(PrivateLine(12, 13, "to nobody known"));
     r.Customer("\n" + PrivateLine(11, 12, "printed otherwise"));  // read the long way
     r.Customer(std::string(2, '\0'));  // the block the cache was initialised with
+    r.Customer(GroupLine(11, 15, 5, "five"));
+    // A later attendees line with a higher id of its own cache says nothing about group 15.
+    r.Customer(GroupLine(12, 8, 12, "attendees"));
     r.Customer("", CACHE_REPLY_LAST);
-    EXPECT_EQ(r.shown, Strings({"from Ann to Bob (left) (privately):hi Bob",
-                                "from Bob (left) to  (privately):to nobody known",
-                                "from Ann to Bob (left) (privately):printed otherwise"}));
+    EXPECT_EQ(r.requests.back(), "515:1:255");
     // Outside the customer cache a line between two others has no title and is not shown.
     CPrivateMessagePDU live;
     live.SetSendID(11u);
     live.SetReveID(12u);
     std::string title;
     EXPECT_EQ(r.mgr.ParsePrivateMsgTitle(&live, title), 0);
-    EXPECT_EQ(r.requests.back(), "515:1:255");
-}
 
-TEST(Recovery, EveryoneHistoryIsShownInCacheIdOrderAfterTheCustomerCache) {
-    Recovery r;
-    r.liveRoster[11] = "Ann";
-    r.Start();
-    r.Roster(UserInfo(12, "Bob"));
-    r.Customer(GroupLine(11, 15, 5, "five"));
-    // A later attendees line with a higher id of its own cache says nothing about group 15.
-    r.Customer(GroupLine(12, 8, 12, "attendees"));
-    r.Customer("", CACHE_REPLY_LAST);
     EXPECT_TRUE(r.Everyone(7, GroupLine(12, 15, 0, "seven")));
     r.Everyone(5, GroupLine(11, 15, 0, "five"));
     r.Everyone(9, GroupLine(11, 15, 0, "nine"), CACHE_REPLY_LAST);
-    EXPECT_EQ(r.shown, Strings({"Ann@15:five", "Bob@8:attendees", "Bob@15:seven", "Ann@15:nine"}));
+    EXPECT_EQ(r.shown,
+              Strings({"from Ann to Bob (left) (privately):hi Bob",
+                       "from Bob (left) to  (privately):to nobody known",
+                       "from Ann to Bob (left) (privately):printed otherwise", "Ann@15:five",
+                       "Bob (left)@8:attendees", "Bob (left)@15:seven", "Ann@15:nine"}));
     // Each restored everyone line is backed up without names, with its cache id.
     EXPECT_EQ(r.copies, Strings({GroupLine(12, 15, 7, "seven"), GroupLine(11, 15, 9, "nine")}));
     EXPECT_FALSE(r.mgr.CheckUpdate4GroupRecovery(kEveryoneCache));  // live from now on

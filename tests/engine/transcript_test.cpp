@@ -82,12 +82,6 @@ protected:
         window->Clear();
         host.events.clear();
     }
-    std::vector<std::string> Shown() const {
-        std::vector<std::string> shown;
-        for (const RecordedCommand& c : window->Commands())
-            if (c.id == msg_ShowTitle || c.id == msg_ShowText) shown.push_back(c.text);
-        return shown;
-    }
 
     TempDir dir;
     HostRecorder host;
@@ -104,9 +98,13 @@ TEST_F(TranscriptTest, OpeningShowsEveryEntryAndMarksOnlyATranscriptThatHadEntri
     }
     Load("a.txt", kTwoEntries);
     EXPECT_TRUE(engine.IsChatHaveContent());
-    EXPECT_EQ(Shown(),
-              (std::vector<std::string>{"from Ann to All Participants:\r", "hello",
-                                        "from Bo to Host (privately):\r", "see \xC3\xA9 you"}));
+    // The open panel (2601), then each title (2201) and text (2200) in a command of its own.
+    std::vector<std::string> shown;
+    for (const RecordedCommand& c : window->Commands())
+        shown.push_back(std::to_string(c.id) + ":" + c.text);
+    EXPECT_EQ(shown, (std::vector<std::string>{"2601:", "2201:from Ann to All Participants:\r",
+                                               "2200:hello", "2201:from Bo to Host (privately):\r",
+                                               "2200:see \xC3\xA9 you"}));
     EXPECT_EQ(host.events, std::vector<std::string>{"content 1"});
     host.events.clear();
     Load("c.kcf", kThird);
@@ -212,19 +210,19 @@ TEST_F(TranscriptTest, AFailedSaveKeepsTheOldFileAndTheFlagAndWarns) {
 
 TEST_F(TranscriptTest, AFileWithoutTheRightPrivilegesIsNotReplaced) {
     LoadThree();
-    for (const int prompt : {0, 1}) {
-        FailingFileServices files;
-        files.Fail(FileOp::Open, kFilePermission, "/c.txt");
-        window->Clear();
-        window->dialogConfirmed = 0;
-        warnings.clear();
-        engine.SaveChatFile(prompt);
-        EXPECT_EQ(warnings, std::vector<std::string>{"Korvo Chat: Your cannot replace\"c.txt\" "
-                                                     "because you do not have the right "
-                                                     "privileges."});
-        EXPECT_EQ(window->Ids(), prompt ? std::vector<int>{msg_SaveChatPanel} : std::vector<int>{});
-        EXPECT_EQ(engine.FileNeedSave(), 1);
-    }
+    FailingFileServices files;
+    files.Fail(FileOp::Open, kFilePermission, "/c.txt");
+    // Refused, the host's save offers the save panel; the same file chosen there is refused
+    // again without another panel.
+    window->dialogPath = dir.File("c.txt");
+    engine.SaveChatFile(1);
+    EXPECT_EQ(warnings, std::vector<std::string>(2,
+                                                 "Korvo Chat: Your cannot replace\"c.txt\" "
+                                                 "because you do not have the right "
+                                                 "privileges."));
+    EXPECT_EQ(window->Ids(), std::vector<int>{msg_SaveChatPanel});
+    EXPECT_EQ(FileBytes(dir.File("c.txt")), "\xEF\xBB\xBF" + kThird);
+    EXPECT_EQ(engine.FileNeedSave(), 1);
 }
 
 TEST_F(TranscriptTest, SaveIntoAFolderAnswersWhetherChatTxtHoldsTheTranscript) {
