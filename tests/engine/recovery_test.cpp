@@ -53,7 +53,8 @@ std::string PrivateLine(std::uint32_t sendId, std::uint32_t receiveId, const std
 }
 
 // A recovery manager wired to a stand-in for the engine: memory handles holding texts, the
-// everyone group's cache, a live roster, and a record of what was requested, shown and copied.
+// everyone group's cache, a live roster, and a record of what was requested (retrievals and
+// the customer cache's setting), shown and copied.
 // Showing a private line asks the manager for its title, as the engine does for a line between
 // two others.
 class Recovery final : public IChatDataCmdProcess {
@@ -85,7 +86,7 @@ public:
     void SendCopyToCustomerCache(CKvoChatXMLPDU* pdu) override {
         copies.push_back(pdu->ToWireText());
     }
-    void SetCustomerCache() override { ++customerCacheSets; }
+    void SetCustomerCache() override { requests.push_back("set customer cache"); }
     void ParseAndShowGroupMessages(CGroupMessagePDU* pdu, std::uint32_t cacheHandle) override {
         std::string name = pdu->GetSenderName();
         if (name.empty()) mgr.ParseGroupSenderName(pdu, name);
@@ -123,7 +124,6 @@ public:
     Strings requests;
     Strings shown;
     Strings copies;
-    int customerCacheSets = 0;
 
 private:
     // A memory handle holding text: n for the nth text kept, 0 for none.
@@ -250,7 +250,7 @@ TEST(Recovery, ACustomerCacheNeverSetIsSetOnceAndForgedLinesAreDropped) {
     Recovery r;
     r.Start();
     r.Customer(PrivateLine(11, 12, "unread"), CACHE_REPLY_LAST, kArmRetry);
-    EXPECT_EQ(r.customerCacheSets, 1);
+    EXPECT_EQ(r.requests, Strings({"501:1:255", "502:1:255", "set customer cache", "515:1:255"}));
     EXPECT_TRUE(r.shown.empty());
     TraceCapture trace;
     r.Everyone(3, GroupLine(11, 15, 0, "forged"), CACHE_APPEND, 12);

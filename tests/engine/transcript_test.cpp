@@ -21,6 +21,7 @@
 namespace {
 
 namespace fs = std::filesystem;
+using Strings = std::vector<std::string>;
 
 const std::string kTwoEntries =
     "\xEF\xBB\xBF"
@@ -38,8 +39,8 @@ std::string SaveFailed(const std::string& name) {
 }
 
 // The names in folder, sorted.
-std::vector<std::string> Names(const std::string& folder) {
-    std::vector<std::string> names;
+Strings Names(const std::string& folder) {
+    Strings names;
     for (const auto& entry : fs::directory_iterator(folder))
         names.push_back(entry.path().filename().string());
     std::sort(names.begin(), names.end());
@@ -87,7 +88,7 @@ protected:
     HostRecorder host;
     CChatClient engine;
     RecordingWindow* window = nullptr;
-    std::vector<std::string> warnings;
+    Strings warnings;
 };
 
 TEST_F(TranscriptTest, OpeningShowsEveryEntryAndMarksOnlyATranscriptThatHadEntries) {
@@ -99,16 +100,15 @@ TEST_F(TranscriptTest, OpeningShowsEveryEntryAndMarksOnlyATranscriptThatHadEntri
     Load("a.txt", kTwoEntries);
     EXPECT_TRUE(engine.IsChatHaveContent());
     // The open panel (2601), then each title (2201) and text (2200) in a command of its own.
-    std::vector<std::string> shown;
+    Strings shown;
     for (const RecordedCommand& c : window->Commands())
         shown.push_back(std::to_string(c.id) + ":" + c.text);
-    EXPECT_EQ(shown, (std::vector<std::string>{"2601:", "2201:from Ann to All Participants:\r",
-                                               "2200:hello", "2201:from Bo to Host (privately):\r",
-                                               "2200:see \xC3\xA9 you"}));
-    EXPECT_EQ(host.events, std::vector<std::string>{"content 1"});
+    EXPECT_EQ(shown, (Strings{"2601:", "2201:from Ann to All Participants:\r", "2200:hello",
+                              "2201:from Bo to Host (privately):\r", "2200:see \xC3\xA9 you"}));
+    EXPECT_EQ(host.events, Strings{"content 1"});
     host.events.clear();
     Load("c.kcf", kThird);
-    EXPECT_EQ(host.events, (std::vector<std::string>{"modified 1", "content 1"}));
+    EXPECT_EQ(host.events, (Strings{"modified 1", "content 1"}));
 }
 
 TEST_F(TranscriptTest, SavedFileHoldsExactlyTheTranscriptAndOpensBackTheSame) {
@@ -122,10 +122,9 @@ TEST_F(TranscriptTest, SavedFileHoldsExactlyTheTranscriptAndOpensBackTheSame) {
     const std::string expected = kTwoEntries + kThird;  // one mark, then the entries as read
     EXPECT_EQ(FileBytes(saved), expected);
     EXPECT_EQ(fs::status(saved).permissions(), fs::perms(0640));  // a new file: 0666 less umask
-    EXPECT_EQ(host.events, std::vector<std::string>{"modified 0"});
+    EXPECT_EQ(host.events, Strings{"modified 0"});
     EXPECT_EQ(FileBytes(dir.File(".saved.txt.saving")), "mine");
-    EXPECT_EQ(Names(dir.Path()),
-              (std::vector<std::string>{".saved.txt.saving", "a.txt", "c.txt", "saved.txt"}));
+    EXPECT_EQ(Names(dir.Path()), (Strings{".saved.txt.saving", "a.txt", "c.txt", "saved.txt"}));
 
     // Opened after the entries it holds and saved again where it was opened from, the file
     // has its own entries twice and keeps the mode it had.
@@ -157,7 +156,7 @@ TEST_F(TranscriptTest, AFileThatCannotBeOpenedChangesNeitherTranscriptNorWindow)
         EXPECT_EQ(window->Ids(), std::vector<int>{msg_OpenChatPanel});  // nothing shown
         EXPECT_EQ(engine.ChatContent().GetTimeCount(), 2u);
         EXPECT_EQ(engine.FileNeedSave(), 0);
-        EXPECT_EQ(warnings, std::vector<std::string>{"Korvo Chat: " + kOpenFailed});
+        EXPECT_EQ(warnings, Strings{"Korvo Chat: " + kOpenFailed});
         EXPECT_EQ(engine.ChatFilePath(), "");
     }
 }
@@ -202,8 +201,8 @@ TEST_F(TranscriptTest, AFailedSaveKeepsTheOldFileAndTheFlagAndWarns) {
         EXPECT_EQ(FileBytes(dir.File("c.txt")),
                   replaced ? kTwoEntries + kThird : "\xEF\xBB\xBF" + kThird);
         EXPECT_EQ(engine.FileNeedSave(), 1);
-        EXPECT_EQ(warnings, std::vector<std::string>{"Korvo Chat: " + SaveFailed("c.txt")});
-        EXPECT_EQ(Names(dir.Path()), (std::vector<std::string>{"a.txt", "c.txt"}));
+        EXPECT_EQ(warnings, Strings{"Korvo Chat: " + SaveFailed("c.txt")});
+        EXPECT_EQ(Names(dir.Path()), (Strings{"a.txt", "c.txt"}));
     }
     EXPECT_TRUE(host.events.empty());
 }
@@ -216,10 +215,10 @@ TEST_F(TranscriptTest, AFileWithoutTheRightPrivilegesIsNotReplaced) {
     // again without another panel.
     window->dialogPath = dir.File("c.txt");
     engine.SaveChatFile(1);
-    EXPECT_EQ(warnings, std::vector<std::string>(2,
-                                                 "Korvo Chat: Your cannot replace\"c.txt\" "
-                                                 "because you do not have the right "
-                                                 "privileges."));
+    EXPECT_EQ(warnings, Strings(2,
+                                "Korvo Chat: Your cannot replace\"c.txt\" "
+                                "because you do not have the right "
+                                "privileges."));
     EXPECT_EQ(window->Ids(), std::vector<int>{msg_SaveChatPanel});
     EXPECT_EQ(FileBytes(dir.File("c.txt")), "\xEF\xBB\xBF" + kThird);
     EXPECT_EQ(engine.FileNeedSave(), 1);
@@ -252,7 +251,7 @@ TEST_F(TranscriptTest, TheTickMarksTheTranscriptModifiedWhenItsSavedFileGoes) {
     ASSERT_EQ(::remove(dir.File("saved.txt").c_str()), 0);
     engine.CheckSavedFileStillThere();
     engine.CheckSavedFileStillThere();  // already modified: once only
-    EXPECT_EQ(host.events, std::vector<std::string>{"modified 1"});
+    EXPECT_EQ(host.events, Strings{"modified 1"});
     EXPECT_TRUE(trace.Has("CChatClient::OnTick() SetFileNeedSave(true)"));
 
     SaveAs(dir.File("saved.txt"));
