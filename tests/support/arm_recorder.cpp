@@ -4,14 +4,6 @@
 
 namespace {
 
-ArmEvent Event(const char* name, std::uint32_t apeHandle = 0, short result = 0) {
-    ArmEvent event;
-    event.name = name;
-    event.apeHandle = apeHandle;
-    event.result = result;
-    return event;
-}
-
 std::vector<std::uint8_t> Bytes(const void* data, std::int64_t length) {
     if (data == nullptr || length <= 0) return {};
     const auto* bytes = static_cast<const std::uint8_t*>(data);
@@ -23,15 +15,13 @@ std::vector<RosterRecord> CopyRecords(const ARMApeRoster* records, std::uint32_t
                                       std::uint32_t count) {
     std::vector<RosterRecord> copies;
     for (std::uint32_t i = first; i < first + count; ++i) {
-        const ARMApeRoster record = records[i];
-        RosterRecord copy;
-        copy.sessionId = record.dwSessionID;
-        for (std::uint16_t u = 0; u < record.wUserCount && record.pUsers != nullptr; ++u) {
-            const ARMApeUser user = record.pUsers[u];
+        RosterRecord& copy = copies.emplace_back();
+        copy.sessionId = records[i].dwSessionID;
+        for (std::uint16_t u = 0; u < records[i].wUserCount && records[i].pUsers != nullptr; ++u) {
+            const ARMApeUser& user = records[i].pUsers[u];
             copy.users.push_back(
                 {user.dwNodeID, user.dwUserID, Bytes(user.pEnrollInfo, user.nEnrollInfoLen)});
         }
-        copies.push_back(std::move(copy));
     }
     return copies;
 }
@@ -52,55 +42,41 @@ std::vector<ArmEvent> ArmRecorder::Named(const std::string& name) const {
     return found;
 }
 
-int ArmRecorder::ConnectConfirm(short result, std::uint32_t value) {
-    ArmEvent event = Event("ConnectConfirm", 0, result);
-    event.value = value;
-    return Record(std::move(event));
+int ArmRecorder::ConnectConfirm(short result, std::uint32_t) {
+    return Record(ArmEvent("ConnectConfirm", 0, result));
 }
 
-int ArmRecorder::ConferenceJoinConfirm(std::uint16_t conferenceId, const char*, short result,
-                                       std::uint32_t value) {
-    ArmEvent event = Event("ConferenceJoinConfirm", 0, result);
-    event.entityId = conferenceId;
-    event.value = value;
-    return Record(std::move(event));
+int ArmRecorder::ConferenceJoinConfirm(std::uint16_t, const char*, short result, std::uint32_t) {
+    return Record(ArmEvent("ConferenceJoinConfirm", 0, result));
 }
 
 int ArmRecorder::ApeAttachConfirm(std::uint32_t apeHandle, short result, std::uint32_t userId) {
-    ArmEvent event = Event("ApeAttachConfirm", apeHandle, result);
-    event.userId = userId;
-    return Record(std::move(event));
+    return Record(ArmEvent("ApeAttachConfirm", apeHandle, result, userId));
 }
 
 int ArmRecorder::ApeEnrollConfirm(std::uint32_t apeHandle, short result, short resourceNumber,
                                   ARMSessionResource* resources) {
-    ArmEvent event = Event("ApeEnrollConfirm", apeHandle, result);
-    event.value = static_cast<std::uint32_t>(resourceNumber);
+    ArmEvent event("ApeEnrollConfirm", apeHandle, result);
     for (short i = 0; i < resourceNumber && resources != nullptr; ++i) {
-        const ARMSessionResource resource = resources[i];
+        const ARMSessionResource& resource = resources[i];
         event.resources.push_back({resource.pszName == nullptr ? "" : resource.pszName,
-                                   resource.wResourceType, resource.dwCount, resource.dwValue,
-                                   resource.wStatus});
+                                   resource.dwValue, resource.wStatus});
     }
     return Record(std::move(event));
 }
 
-int ArmRecorder::ApeDataIndication(std::uint32_t apeHandle, std::uint32_t senderId,
-                                   std::uint32_t value, std::uint16_t flags, const void* data,
-                                   std::uint32_t length) {
-    ArmEvent event = Event("ApeDataIndication", apeHandle);
-    event.userId = senderId;
-    event.value = value;
+int ArmRecorder::ApeDataIndication(std::uint32_t apeHandle, std::uint32_t senderId, std::uint32_t,
+                                   std::uint16_t flags, const void* data, std::uint32_t length) {
+    ArmEvent event("ApeDataIndication", apeHandle, 0, senderId);
     event.flags = flags;
     event.data = Bytes(data, length);
     return Record(std::move(event));
 }
 
-int ArmRecorder::ApeRosterChanged(std::uint32_t serviceId, std::uint16_t value,
-                                  std::uint32_t addedCount, std::uint32_t deletedCount,
-                                  std::uint32_t modifiedCount, ARMApeRoster* records) {
-    ArmEvent event = Event("ApeRosterChanged", serviceId);
-    event.flags = value;
+int ArmRecorder::ApeRosterChanged(std::uint32_t serviceId, std::uint16_t, std::uint32_t addedCount,
+                                  std::uint32_t deletedCount, std::uint32_t modifiedCount,
+                                  ARMApeRoster* records) {
+    ArmEvent event("ApeRosterChanged", serviceId);
     if (records != nullptr) {
         event.roster.added = CopyRecords(records, 0, addedCount);
         event.roster.deleted = CopyRecords(records, addedCount, deletedCount);
@@ -110,12 +86,11 @@ int ArmRecorder::ApeRosterChanged(std::uint32_t serviceId, std::uint16_t value,
 }
 
 int ArmRecorder::ApeCacheActionConfirmEx(std::uint32_t apeHandle, std::uint32_t entityId,
-                                         tagCacheAction action, std::uint32_t requestIdx,
+                                         tagCacheAction action, std::uint32_t,
                                          std::uint32_t cacheId, short result) {
-    ArmEvent event = Event("ApeCacheActionConfirmEx", apeHandle, result);
+    ArmEvent event("ApeCacheActionConfirmEx", apeHandle, result);
     event.entityId = entityId;
     event.action = action;
-    event.requestIdx = requestIdx;
     event.cacheId = cacheId;
     return Record(std::move(event));
 }
@@ -124,28 +99,29 @@ int ArmRecorder::SharedDataReceivedEx(std::uint32_t apeHandle, std::uint32_t cac
                                       std::uint32_t entityId, std::uint32_t memHandle, short result,
                                       tagCacheAction action, std::uint32_t senderId,
                                       std::uint32_t value, std::uint16_t flags) {
-    ArmEvent event = Event("SharedDataReceivedEx", apeHandle, result);
+    ArmEvent event("SharedDataReceivedEx", apeHandle, result, senderId);
+    event.value = value;
+    event.flags = flags;
     event.cacheId = cacheId;
     event.entityId = entityId;
     event.memHandle = memHandle;
     event.action = action;
-    event.userId = senderId;
-    event.value = value;
-    event.flags = flags;
-    ReadMemory(event);
+    // The delivered memory handle lives for this callback only: keep a copy of its bytes.
+    std::uint32_t size = 0;
+    if (m_pClient != nullptr && memHandle != 0 &&
+        m_pClient->GetMemHandleSize(memHandle, &size) == 0) {
+        event.data.resize(size);
+        if (m_pClient->ReadMemHandle(memHandle, 0, event.data.data(), &size) != 0) size = 0;
+        event.data.resize(size);
+    }
     return Record(std::move(event));
 }
 
 int ArmRecorder::AllocNameHandleConfirm(std::uint32_t apeHandle, std::uint32_t count,
-                                        NameHandle* handles, short result, std::uint32_t reserved) {
-    ArmEvent event = Event("AllocNameHandleConfirm", apeHandle, result);
-    event.value = reserved;
+                                        NameHandle* handles, short result, std::uint32_t) {
+    ArmEvent event("AllocNameHandleConfirm", apeHandle, result);
     if (handles != nullptr) event.handles.assign(handles, handles + count);
     return Record(std::move(event));
-}
-
-int ArmRecorder::Other(const char* name) {
-    return Record(Event(name));
 }
 
 int ArmRecorder::Record(ArmEvent event) {
@@ -153,19 +129,4 @@ int ArmRecorder::Record(ArmEvent event) {
     // The hook gets its own copy: it may clear the recorder.
     if (m_hook) m_hook(event);
     return 0;
-}
-
-void ArmRecorder::ReadMemory(ArmEvent& event) const {
-    std::uint32_t size = 0;
-    if (m_pClient == nullptr || event.memHandle == 0 ||
-        m_pClient->GetMemHandleSize(event.memHandle, &size) != 0) {
-        return;
-    }
-    event.data.resize(size);
-    if (m_pClient->ReadMemHandle(event.memHandle, 0, event.data.data(), &size) != 0) {
-        event.data.clear();
-        return;
-    }
-    event.data.resize(size);
-    event.memReadable = true;
 }

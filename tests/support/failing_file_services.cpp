@@ -23,53 +23,12 @@ std::string FailingFileServices::PathOf(FileId file) const {
     return found == m_openPaths.end() ? std::string() : found->second;
 }
 
-FileResult FailingFileServices::Resolve(const std::string& path) {
-    const FileResult injected = Injected(FileOp::Resolve, path);
-    return injected != kFileOk ? injected : m_posix.Resolve(path);
-}
-
-FileResult FailingFileServices::GetInfo(const std::string& path, FileInfo* info) {
-    const FileResult injected = Injected(FileOp::GetInfo, path);
-    return injected != kFileOk ? injected : m_posix.GetInfo(path, info);
-}
-
 FileResult FailingFileServices::Open(const std::string& path, FilePermission permission,
                                      FileId* file) {
-    const FileResult injected = Injected(FileOp::Open, path);
-    if (injected != kFileOk) return injected;
-    const FileResult result = m_posix.Open(path, permission, file);
+    const FileResult result =
+        Unless(FileOp::Open, path, [&] { return m_posix.Open(path, permission, file); });
     if (result == kFileOk) m_openPaths[*file] = path;
     return result;
-}
-
-FileResult FailingFileServices::Read(FileId file, void* buffer, std::size_t size) {
-    const FileResult injected = Injected(FileOp::Read, PathOf(file));
-    return injected != kFileOk ? injected : m_posix.Read(file, buffer, size);
-}
-
-FileResult FailingFileServices::Write(FileId file, const void* data, std::size_t size) {
-    const FileResult injected = Injected(FileOp::Write, PathOf(file));
-    return injected != kFileOk ? injected : m_posix.Write(file, data, size);
-}
-
-FileResult FailingFileServices::GetSize(FileId file, std::uint64_t* size) {
-    const FileResult injected = Injected(FileOp::GetSize, PathOf(file));
-    return injected != kFileOk ? injected : m_posix.GetSize(file, size);
-}
-
-FileResult FailingFileServices::Truncate(FileId file, std::uint64_t size) {
-    const FileResult injected = Injected(FileOp::Truncate, PathOf(file));
-    return injected != kFileOk ? injected : m_posix.Truncate(file, size);
-}
-
-FileResult FailingFileServices::Sync(FileId file) {
-    const FileResult injected = Injected(FileOp::Sync, PathOf(file));
-    return injected != kFileOk ? injected : m_posix.Sync(file);
-}
-
-FileResult FailingFileServices::SyncFolder(const std::string& folder) {
-    const FileResult injected = Injected(FileOp::SyncFolder, folder);
-    return injected != kFileOk ? injected : m_posix.SyncFolder(folder);
 }
 
 FileResult FailingFileServices::Close(FileId file) {
@@ -80,27 +39,11 @@ FileResult FailingFileServices::Close(FileId file) {
     return injected != kFileOk ? injected : result;
 }
 
-FileResult FailingFileServices::Delete(const std::string& path) {
-    const FileResult injected = Injected(FileOp::Delete, path);
-    return injected != kFileOk ? injected : m_posix.Delete(path);
-}
-
-FileResult FailingFileServices::Rename(const std::string& from, const std::string& to) {
-    const FileResult injected = Injected(FileOp::Rename, to);
-    return injected != kFileOk ? injected : m_posix.Rename(from, to);
-}
-
-FileResult FailingFileServices::Create(const std::string& folder, const std::string& name,
-                                       std::uint32_t type, std::uint32_t creator) {
-    const FileResult injected = Injected(FileOp::Create, PathInFolder(folder, name));
-    return injected != kFileOk ? injected : m_posix.Create(folder, name, type, creator);
-}
-
 FileResult FailingFileServices::CreateUnique(const std::string& folder, const std::string& stem,
                                              std::uint32_t mode, std::string* name, FileId* file) {
-    const FileResult injected = Injected(FileOp::CreateUnique, PathInFolder(folder, stem));
-    if (injected != kFileOk) return injected;
-    const FileResult result = m_posix.CreateUnique(folder, stem, mode, name, file);
+    const FileResult result = Unless(FileOp::CreateUnique, PathInFolder(folder, stem), [&] {
+        return m_posix.CreateUnique(folder, stem, mode, name, file);
+    });
     if (result == kFileOk) m_openPaths[*file] = PathInFolder(folder, *name);
     return result;
 }

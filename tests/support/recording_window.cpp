@@ -115,10 +115,6 @@ int RecordingWindow::HandleCommand(int command, void* inParam, void* outParam) {
     return 0;
 }
 
-std::vector<int> RecordingWindow::Ids() const {
-    return IdsSince(0);
-}
-
 std::vector<int> RecordingWindow::IdsSince(std::size_t first) const {
     std::vector<int> ids;
     for (std::size_t i = first; i < m_commands.size(); ++i)

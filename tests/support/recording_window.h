@@ -47,7 +47,7 @@ public:
 
     const std::vector<RecordedCommand>& Commands() const { return m_commands; }
     // The ids alone, in order.
-    std::vector<int> Ids() const;
+    std::vector<int> Ids() const { return IdsSince(0); }
     // Ids from the given position on.
     std::vector<int> IdsSince(std::size_t first) const;
     void Clear() { m_commands.clear(); }
