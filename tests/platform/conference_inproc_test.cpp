@@ -2,6 +2,7 @@
 // injection, refusals and choices that belong to this implementation.
 #include <cstring>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "platform/conference_results.h"
@@ -86,12 +87,6 @@ TEST_F(InProcessConferenceTest, FailedCallsReturnTheChosenResultAndDoNothing) {
     EXPECT_EQ(0u, Ctl(a)->MemHandleCount());
     EXPECT_EQ(0, a.client->AllocMemHandle(4, &mem));
 
-    Ctl(a)->FailAlways(ArmOperation::ApeSendData, 9);
-    for (int i = 0; i < 3; ++i)
-        EXPECT_EQ(9, a.client->ApeSendData(a.ape, 1001, 1, "x", 1, 1, 1));
-    Ctl(a)->ClearFaults();
-    EXPECT_EQ(0, a.client->ApeSendData(a.ape, a.userId, 1, "x", 1, 1, 1));
-
     // A result of 0 claims success, but no answer ever comes.
     ContractParticipant& b = Fresh(12);
     Ctl(b)->FailNext(ArmOperation::Connect, 0);
@@ -163,14 +158,7 @@ TEST_F(InProcessConferenceTest, InjectedDeliveriesArriveExactlyAsCrafted) {
     const std::vector<std::uint8_t> notAPdu = {0xde, 0xad, 0x00, 0xbe};
     EXPECT_TRUE(Ctl(m)->InjectPrivateData(4242, notAPdu));
 
-    ArmCacheDelivery delivery;
-    delivery.cacheId = 9;
-    delivery.entityId = 50123;
-    delivery.result = kArmRetry;
-    delivery.action = CACHE_REPLY_LAST;
-    delivery.senderId = 4242;
-    delivery.value = 0x90;
-    delivery.flags = 3;
+    const ArmCacheDelivery delivery{9, 50123, kArmRetry, CACHE_REPLY_LAST, 4242, 0x90, 3};
     EXPECT_TRUE(Ctl(m)->InjectCacheDelivery(delivery, notAPdu));
     EXPECT_TRUE(Ctl(m)->InjectCacheDelivery(delivery, std::nullopt));
 
@@ -189,14 +177,10 @@ TEST_F(InProcessConferenceTest, InjectedDeliveriesArriveExactlyAsCrafted) {
     EXPECT_EQ(4242u, events[0].userId);
     EXPECT_EQ(notAPdu, events[0].data);
     for (int i : {1, 2}) {
-        EXPECT_EQ(m.ape, events[i].apeHandle);
-        EXPECT_EQ(9u, events[i].cacheId);
-        EXPECT_EQ(50123u, events[i].entityId);
-        EXPECT_EQ(kArmRetry, events[i].result);
-        EXPECT_EQ(CACHE_REPLY_LAST, events[i].action);
-        EXPECT_EQ(4242u, events[i].userId);
-        EXPECT_EQ(0x90u, events[i].value);
-        EXPECT_EQ(3, events[i].flags);
+        const ArmEvent& e = events[i];
+        EXPECT_EQ(std::make_tuple(m.ape, 9u, 50123u, kArmRetry, CACHE_REPLY_LAST, 4242u, 0x90u, 3),
+                  std::make_tuple(e.apeHandle, e.cacheId, e.entityId, e.result, e.action, e.userId,
+                                  e.value, e.flags));
     }
     EXPECT_EQ(notAPdu, events[1].data);
     EXPECT_EQ(0u, events[2].memHandle);
@@ -247,26 +231,36 @@ TEST_F(InProcessConferenceTest, RequestsOutsideTheirStateAreRefused) {
     EXPECT_EQ(kArmTooLarge, b.client->AllocMemHandle(kArmMaxDataLength + 1, &mem));
 }
 
-TEST_F(InProcessConferenceTest, MemoryReadsAndWritesAreClippedAtTheBlock) {
-    ContractParticipant& m = Connected(11);
+// Both services keep their memory blocks the same way; this pins it exactly.
+TEST_F(InProcessConferenceTest, MemoryBlocksAreClippedAtTheirEndAndGoneOnceFreed) {
+    IArmClient& m = *Connected(11).client;
     std::uint32_t mem = 0, size = 4;
-    ASSERT_EQ(0, m.client->AllocMemHandle(4, &mem));
-    ASSERT_EQ(0, m.client->WriteMemHandle(mem, 0, "abcd", &size));
+    ASSERT_EQ(0, m.AllocMemHandle(4, &mem));
+    ASSERT_EQ(0, m.WriteMemHandle(mem, 0, "abcd", &size));
     size = 10;
-    EXPECT_EQ(0, m.client->WriteMemHandle(mem, 2, "0123456789", &size));
+    EXPECT_EQ(0, m.WriteMemHandle(mem, 2, "0123456789", &size));
     EXPECT_EQ(2u, size);
+    ASSERT_EQ(0, m.GetMemHandleSize(mem, &size));
+    EXPECT_EQ(4u, size);
     char buffer[10] = {};
     size = 10;
-    EXPECT_EQ(0, m.client->ReadMemHandle(mem, 1, buffer, &size));
-    EXPECT_EQ(3u, size);
+    EXPECT_EQ(0, m.ReadMemHandle(mem, 1, buffer, &size));
     EXPECT_EQ("b01", std::string(buffer, size));
     size = 1;
-    EXPECT_EQ(0, m.client->ReadMemHandle(mem, 4, buffer, &size));
+    EXPECT_EQ(0, m.ReadMemHandle(mem, 4, buffer, &size));
     EXPECT_EQ(0u, size);
     size = 1;
-    EXPECT_EQ(kArmOutOfRange, m.client->ReadMemHandle(mem, 5, buffer, &size));
+    EXPECT_EQ(kArmOutOfRange, m.ReadMemHandle(mem, 5, buffer, &size));
     EXPECT_EQ(0u, size);
-    EXPECT_EQ(kArmInvalidArgument, m.client->ReadMemHandle(mem, 0, buffer, nullptr));
+    EXPECT_EQ(kArmInvalidArgument, m.ReadMemHandle(mem, 0, buffer, nullptr));
+
+    ASSERT_EQ(0, m.FreeMemHandle(mem));
+    size = 4;
+    EXPECT_EQ(kArmUnknownHandle, m.GetMemHandleSize(mem, &size));
+    EXPECT_EQ(kArmUnknownHandle, m.ReadMemHandle(mem, 0, buffer, &size));
+    EXPECT_EQ(kArmUnknownHandle, m.WriteMemHandle(mem, 0, "ab", &size));
+    EXPECT_EQ(kArmUnknownHandle, m.FreeMemHandle(mem));
+    EXPECT_EQ(kArmUnknownHandle, m.FreeMemHandle(0));
 }
 
 TEST_F(InProcessConferenceTest, SendOptionMarksTheNextSendOnly) {
