@@ -3,6 +3,7 @@
 #include <cstring>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "engine/users_group.h"
@@ -155,39 +156,37 @@ TEST(CUsersGroup, CacheRecordHoldsSixtyFourCharactersUntilDeleted) {
     EXPECT_EQ(group.GetCacheHandle(), 0u);
 }
 
-TEST(CUsersGroupList, GetGroupInfoLooksOnlyAtTheFirstGroupOfTypeAndId) {
+TEST(CUsersGroupList, GroupInfoLookUpsTakeTheFirstGroupOrTheFirstNamelessOne) {
+    // The first of a type and id is the only one a named look-up compares; GetGroupInfo2 without
+    // a name prefers a nameless group, else takes the last.
     CUsersGroupList list;
-    Append(list, MakeGroup(1, 1, nullptr));
-    Append(list, MakeGroup(1, 1, "Host"));
-    Append(list, MakeGroup(1, 8, "All Attendees"));
-    Append(list, MakeGroup(1, 8, "Second"));
-    std::int32_t position = 99;
-    EXPECT_EQ(list.GetGroupInfo(1, 8, "all ATTENDEES", &position), list.GetGroupByIndex(2));
-    EXPECT_EQ(position, 2);
-    EXPECT_EQ(list.GetGroupInfo(1, 8, nullptr, &position), list.GetGroupByIndex(2));
-    EXPECT_EQ(list.GetGroupInfo(1, 8, "Second", &position), nullptr);
-    EXPECT_EQ(position, -1);
-    // The first host group has no name: a named look-up finds nothing and does not crash.
-    EXPECT_EQ(list.GetGroupInfo(1, 1, "Host"), nullptr);
-    EXPECT_EQ(list.GetGroupInfo(3, 8, nullptr), nullptr);
-}
-
-TEST(CUsersGroupList, GetGroupInfo2PrefersANamelessGroupElseTheLast) {
-    CUsersGroupList list;
-    Append(list, MakeGroup(1, 8, "First"));
-    Append(list, MakeGroup(1, 8, "Last"));
-    Append(list, MakeGroup(1, 1, "Host"));
-    Append(list, MakeGroup(1, 1, nullptr));
-    Append(list, MakeGroup(1, 1, nullptr));
-    std::int32_t position = 99;
-    EXPECT_EQ(list.GetGroupInfo2(1, 8, nullptr, &position), list.GetGroupByIndex(1));
-    EXPECT_EQ(position, 1);
-    EXPECT_EQ(list.GetGroupInfo2(1, 1, nullptr, &position), list.GetGroupByIndex(3));
-    EXPECT_EQ(position, 3);
-    EXPECT_EQ(list.GetGroupInfo2(1, 8, "FIRST"), list.GetGroupByIndex(0));
-    EXPECT_EQ(list.GetGroupInfo2(1, 8, "Last"), nullptr);
-    EXPECT_EQ(list.GetGroupInfo2(2, 0, nullptr, &position), nullptr);
-    EXPECT_EQ(position, -1);
+    const std::pair<std::uint32_t, const char*> groups[] = {
+        {8, "All Attendees"}, {8, "Second"}, {1, "Host"}, {1, nullptr},
+        {1, nullptr},         {4, nullptr},  {4, "Panel"}};
+    for (const auto& g : groups)
+        Append(list, MakeGroup(1, g.first, g.second));
+    struct Case {
+        bool second;  // GetGroupInfo2
+        std::uint32_t type, id;
+        const char* name;
+        std::int32_t found;  // the index, -1 for none
+    };
+    const Case cases[] = {
+        {false, 1, 8, "all ATTENDEES", 0}, {false, 1, 8, nullptr, 0},
+        {false, 1, 8, "Second", -1},       {false, 1, 4, "Panel", -1},
+        {false, 3, 8, nullptr, -1},        {true, 1, 8, nullptr, 1},
+        {true, 1, 1, nullptr, 3},          {true, 1, 8, "ALL attendees", 0},
+        {true, 1, 8, "Second", -1},        {true, 2, 0, nullptr, -1},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(std::to_string(c.second) + "/" + std::to_string(c.id) + "/" +
+                     (c.name ? c.name : "-"));
+        std::int32_t position = 99;
+        const CUsersGroup* group = c.second ? list.GetGroupInfo2(c.type, c.id, c.name, &position)
+                                            : list.GetGroupInfo(c.type, c.id, c.name, &position);
+        EXPECT_EQ(group, c.found < 0 ? nullptr : list.GetGroupByIndex(c.found));
+        EXPECT_EQ(position, c.found);
+    }
 }
 
 TEST(CUsersGroupList, InsertGroupAppendsForPositionsOutsideTheList) {
@@ -204,12 +203,7 @@ TEST(CUsersGroupList, InsertGroup2FollowsTheKeyedGroupOrGoesToTheFront) {
     CUsersGroupList list;
     EXPECT_EQ(list.InsertGroup2(0, nullptr), -1);
     ASSERT_EQ(list.InsertGroup2(5, MakeGroup(1, 1, "a")), 1);  // nobody has 5: front
-    const CUsersGroup* first = list.GetGroupByIndex(0);
-    EXPECT_EQ(first->GetSequence(), 1u);
-    EXPECT_EQ(first->GetInsertPosition(), 0);
     ASSERT_EQ(list.InsertGroup2(1, MakeGroup(1, 2, "b")), 1);  // after sequence 1
-    EXPECT_EQ(list.GetGroupByIndex(1)->GetSequence(), 2u);
-    EXPECT_EQ(list.GetGroupByIndex(1)->GetInsertPosition(), 1);
     ASSERT_EQ(list.InsertGroup2(1, MakeGroup(1, 3, "c")), 1);  // after sequence 1 again
     ASSERT_EQ(list.InsertGroup2(9, MakeGroup(1, 4, "d")), 1);  // unknown: front
     EXPECT_EQ(Ids(list), (std::vector<std::uint32_t>{4, 1, 3, 2}));

@@ -8,6 +8,7 @@
 #include <algorithm>
 #include <cstdint>
 #include <cstdlib>
+#include <deque>
 #include <map>
 #include <memory>
 #include <string>
@@ -54,43 +55,35 @@ struct ReportEntry {
     std::uint32_t node = 0;
     std::uint32_t user = 0;
     std::string bytes;
-    bool withData = true;
 };
+
+inline ReportEntry EntryFor(const Person& person) {
+    return {person.node, person.user(), EnrollBytes(person)};
+}
 
 // Records of one callback, back to back; each record carries its own user entries.
 class RosterReport {
 public:
     // Adds a record of the given session holding the entries.
     RosterReport& Record(std::uint32_t session, std::vector<ReportEntry> entries) {
-        m_entries.emplace_back(session, std::move(entries));
+        m_entries.push_back(std::move(entries));
+        m_users.emplace_back();
+        for (const ReportEntry& e : m_entries.back())
+            m_users.back().push_back({e.node, e.user,
+                                      reinterpret_cast<const std::uint8_t*>(e.bytes.data()),
+                                      static_cast<std::int32_t>(e.bytes.size())});
+        const auto count = static_cast<std::uint16_t>(m_users.back().size());
+        m_records.push_back({0, session, 0, count, 0, m_users.back().data()});
         return *this;
     }
-    // The records, valid while the report lives and is not changed.
-    ARMApeRoster* Records() {
-        m_users.assign(m_entries.size(), {});
-        m_records.assign(m_entries.size(), ARMApeRoster{});
-        for (std::size_t i = 0; i < m_entries.size(); ++i) {
-            for (const ReportEntry& e : m_entries[i].second) {
-                const auto* data = reinterpret_cast<const std::uint8_t*>(e.bytes.data());
-                m_users[i].push_back({e.node, e.user, e.withData ? data : nullptr,
-                                      e.withData ? static_cast<std::int32_t>(e.bytes.size()) : -1});
-            }
-            m_records[i].dwSessionID = m_entries[i].first;
-            m_records[i].wUserCount = static_cast<std::uint16_t>(m_users[i].size());
-            m_records[i].pUsers = m_users[i].data();
-        }
-        return m_records.data();
-    }
+    // The records, valid while the report lives.
+    ARMApeRoster* Records() { return m_records.data(); }
 
 private:
-    std::vector<std::pair<std::uint32_t, std::vector<ReportEntry>>> m_entries;
-    std::vector<std::vector<ARMApeUser>> m_users;
+    std::deque<std::vector<ReportEntry>> m_entries;  // a deque keeps what the records point at
+    std::deque<std::vector<ARMApeUser>> m_users;
     std::vector<ARMApeRoster> m_records;
 };
-
-inline ReportEntry EntryFor(const Person& person) {
-    return {person.node, person.user(), EnrollBytes(person), true};
-}
 
 // How the engine starts.
 struct Options {

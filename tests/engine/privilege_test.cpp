@@ -48,12 +48,8 @@ Strings Apply(MenuHarness& h, std::int32_t type, Own own, unsigned setup, std::u
     for (int i = 0; i < 20; ++i)
         h.engine.OnTick();
     if (type != 3) {
-        h.Seed({{"Host", 1},
-                {"Presenter", 2},
-                {"Host & Presenter", 3},
-                {"All Panelists", 4},
-                {"All Attendees", 8}});
-        if (!(setup & kQMRules)) h.Seed({{"All Participants", 15}});
+        h.Seed("Host 1|Presenter 2|Host & Presenter 3|All Panelists 4|All Attendees 8");
+        if (!(setup & kQMRules)) h.Seed("All Participants 15");
     }
     std::uint32_t ownRoles = 0;
     if (own == kPanelist) ownRoles = ROLE_PANELIST;
