@@ -3,7 +3,6 @@
 // practice sessions.
 #include <gtest/gtest.h>
 
-#include <set>
 #include <string>
 #include <vector>
 
@@ -122,10 +121,6 @@ TEST(PrivilegePolicy, MenuInputAndSendToListFollowRolesAndWord) {
         {"type 2 panelist, nothing: the panelist bit keeps input", 2, kPanelist, kHostKnown, 0,
          "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All Participants",
          "1 on"},
-        {"type 3 attendee, all: the attendee menu", 3, kAttendee, kHostKnown, 0x4F,
-         "Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|hank|pat|---|*All "
-         "Participants",
-         "1 on"},
         {"type 3 attendee, attendees without private chat", 3, kAttendee, kHostKnown, 0x1,
          "*All Attendees", "0 off"},
         {"type 3 panelist, attendees and private: the picker entry", 3, kPanelist, kHostKnown, 0x9,
@@ -191,13 +186,13 @@ TEST(HostHandover, PanelMeetingHostWhoseOwnRecordArrivesGetsTheAttendeeAudiences
 }
 
 // The role groups whose caches the participant is subscribed to now.
-std::set<std::uint32_t> Subscribed(CChatClient& engine) {
-    std::set<std::uint32_t> ids;
+std::string Subscribed(CChatClient& engine) {
+    std::string ids;
     for (std::uint32_t id : {GROUP_HOST, GROUP_PRESENTER, GROUP_HOST_PRESENTER, GROUP_PANELISTS,
                              GROUP_ATTENDEES, GROUP_EVERYONE}) {
         int subscribed = 0, requestType = 0, cacheSet = 0;
         if (engine.GetGroupCacheStatus(id, subscribed, requestType, cacheSet) && subscribed)
-            ids.insert(id);
+            ids += " " + std::to_string(id);
     }
     return ids;
 }
@@ -208,36 +203,31 @@ TEST(Practice, EachSideSeesItsAudiencesAndKeepsItsCaches) {
         Own own;
         const char* during;
         const char* after;
-        std::set<std::uint32_t> caches;  // before, during and after practice
+        const char* caches;  // before, during and after practice
     };
     const Case cases[] = {
-        {"attendee with attendees: one entry",
-         kAttendee,
-         "*All Attendees",
+        {"attendee with attendees: one entry", kAttendee, "*All Attendees",
          "Host|Presenter|Host & Presenter|---|*All Attendees|All Panelists|hank|pat|---|All "
          "Participants",
-         {15, 8}},
-        {"panelist: the audiences among panelists",
-         kPanelist,
+         " 8 15"},
+        {"panelist: the audiences among panelists", kPanelist,
          "Host|Presenter|Host & Presenter|---|All Attendees|*All Panelists|pat|---|All "
          "Participants",
          "Host|Presenter|Host & Presenter|---|All Attendees|*All Panelists|hank|pat|---|All "
          "Participants|---|Select an Attendee...",
-         {15, 4}},
-        {"presenter: the groups without the picker, the audience chosen before kept",
-         kPresenter,
+         " 4 15"},
+        {"presenter: the groups without the picker, the audience chosen before kept", kPresenter,
          "*Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|All "
          "Participants",
          "*Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|All "
          "Participants|---|Select an Attendee...",
-         {15, 2, 4, 3}},
-        {"host: the same groups",
-         kHostRole,
+         " 2 3 4 15"},
+        {"host: the same groups", kHostRole,
          "Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|*All "
          "Participants",
          "Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|*All "
          "Participants|---|Select an Attendee...",
-         {15, 1, 4, 3}},
+         " 1 3 4 15"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
