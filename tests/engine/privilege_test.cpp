@@ -176,15 +176,6 @@ TEST(HostHandover, LocalParticipantTakesAndHandsOverTheHostRole) {
     EXPECT_TRUE(h.engine.IsBeforeHost());
 }
 
-TEST(HostHandover, PanelMeetingHostWhoseOwnRecordArrivesGetsTheAttendeeAudiences) {
-    MenuHarness h({3});
-    h.engine.OnHostChanged(kMyNode);
-    h.Enroll({{kMyNode, "me", ROLE_HOST | ROLE_PANELIST}});
-    EXPECT_EQ(Marked(h.engine),
-              "Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|---|*All "
-              "Participants|---|Select an Attendee...");
-}
-
 // The role groups whose caches the participant is subscribed to now.
 std::string Subscribed(CChatClient& engine) {
     std::string ids;
