@@ -83,54 +83,43 @@ TEST(PrivilegePolicy, MenuInputAndSendToListFollowRolesAndWord) {
         Own own;
         unsigned setup;
         std::uint32_t word;
-        const char* menu;
         const char* outcome;
+        const char* menu;
     };
     const Case cases[] = {
-        {"type 1 host: every group entry on whatever the word", 1, kHostRole, 0, 0,
-         "Host|Presenter|Host & Presenter|All Panelists|pat|All Attendees|ann|*All Participants",
-         "1 on"},
-        {"type 1 presenter before any host: role entries off", 1, kPresenter, 0, 0x40,
-         "~Host|~Presenter|~Host & Presenter|All Panelists|pat|All Attendees|ann|*All Participants",
-         "1 on"},
-        {"type 1 attendee, host only", 1, kAttendee, kHostKnown, 0x2,
-         "*Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|~All Participants",
-         "1 on"},
-        {"type 1 attendee, private only: participant entries, input by them", 1, kAttendee,
-         kHostKnown, 0x8,
-         "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All Participants",
-         "1 on"},
+        {"type 1 host: every group entry on whatever the word", 1, kHostRole, 0, 0, "1 on",
+         "Host|Presenter|Host & Presenter|All Panelists|pat|All Attendees|ann|*All Participants"},
+        {"type 1 presenter before any host: role entries off", 1, kPresenter, 0, 0x40, "1 on",
+         "~Host|~Presenter|~Host & Presenter|All Panelists|pat|All Attendees|ann|*All "
+         "Participants"},
+        {"type 1 attendee, host only", 1, kAttendee, kHostKnown, 0x2, "1 on",
+         "*Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|~All Participants"},
+        {"type 1 attendee, private: entries, input by them", 1, kAttendee, kHostKnown, 0x8, "1 on",
+         "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All Participants"},
         // The audience chosen before stays marked, disabled; the window clears the input.
-        {"type 1 attendee, nothing at all", 1, kAttendee, kHostKnown, 0,
-         "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*~All Participants",
-         "0 off"},
-        {"type 1 attendee before the host: attendees allowed", 1, kAttendee, 0, 0,
-         "~Host|~Presenter|~Host & Presenter|~All Panelists|*All Attendees|~All Participants",
-         "1 on"},
-        {"type 1 attendee before the host with the picker: attendees not allowed", 1, kAttendee,
-         kPicker, 0,
-         "~Host|~Presenter|~Host & Presenter|*~All Panelists|~All Attendees|~All Participants",
-         "0 off"},
-        {"type 1 attendee, all but panelists: no everyone with a panelist entry", 1, kAttendee,
-         kHostKnown, 0x7,
-         "*Host|Presenter|Host & Presenter|~All Panelists|All Attendees|~All Participants", "1 on"},
-        {"type 1 attendee, all: panelists listed", 1, kAttendee, kHostKnown, 0x4F,
+        {"type 1 attendee, nothing at all", 1, kAttendee, kHostKnown, 0, "0 off",
+         "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*~All Participants"},
+        {"type 1 attendee before the host: attendees allowed", 1, kAttendee, 0, 0, "1 on",
+         "~Host|~Presenter|~Host & Presenter|~All Panelists|*All Attendees|~All Participants"},
+        {"type 1 attendee before the host, picker: no attendees", 1, kAttendee, kPicker, 0, "0 off",
+         "~Host|~Presenter|~Host & Presenter|*~All Panelists|~All Attendees|~All Participants"},
+        {"type 1 attendee, all but panelists: everyone off", 1, kAttendee, kHostKnown, 0x7, "1 on",
+         "*Host|Presenter|Host & Presenter|~All Panelists|All Attendees|~All Participants"},
+        {"type 1 attendee, all: panelists listed", 1, kAttendee, kHostKnown, 0x4F, "1 on",
          "Host|Presenter|Host & Presenter|All Panelists|hank|pat|All Attendees|ann|*All "
-         "Participants",
-         "1 on"},
-        {"type 2 panelist, nothing: the panelist bit keeps input", 2, kPanelist, kHostKnown, 0,
-         "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All Participants",
-         "1 on"},
-        {"type 3 attendee, attendees without private chat", 3, kAttendee, kHostKnown, 0x1,
-         "*All Attendees", "0 off"},
-        {"type 3 panelist, attendees and private: the picker entry", 3, kPanelist, kHostKnown, 0x9,
-         "*All Attendees|---|Select an Attendee...", "1 on"},
-        {"type 3 attendee in practice without attendees: nothing left", 3, kAttendee,
-         kHostKnown | kPractice, 0x2, "", "0 off"},
-        {"QM type 1 attendee, everyone only", 1, kAttendee, kQMRules | kHostKnown, 0x10000,
-         "*Everyone|~All Panelists|~All Attendees", "1 on"},
-        {"QM type 1 attendee, host only: the host's entry, titled", 1, kAttendee,
-         kQMRules | kHostKnown, 0x2, "*hank (Host)|~All Panelists|~All Attendees", "1 on"},
+         "Participants"},
+        {"type 2 panelist, nothing: its role keeps input", 2, kPanelist, kHostKnown, 0, "1 on",
+         "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All Participants"},
+        {"type 3 attendee, attendees without private chat", 3, kAttendee, kHostKnown, 0x1, "0 off",
+         "*All Attendees"},
+        {"type 3 panelist, attendees and private: picker", 3, kPanelist, kHostKnown, 0x9, "1 on",
+         "*All Attendees|---|Select an Attendee..."},
+        {"type 3 attendee in practice, host only: none", 3, kAttendee, kHostKnown | kPractice, 0x2,
+         "0 off", ""},
+        {"QM type 1 attendee, everyone only", 1, kAttendee, kQMRules | kHostKnown, 0x10000, "1 on",
+         "*Everyone|~All Panelists|~All Attendees"},
+        {"QM type 1 attendee, host only: titled", 1, kAttendee, kQMRules | kHostKnown, 0x2, "1 on",
+         "*hank (Host)|~All Panelists|~All Attendees"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
@@ -192,33 +181,29 @@ TEST(Practice, EachSideSeesItsAudiencesAndKeepsItsCaches) {
     struct Case {
         const char* scenario;
         Own own;
+        const char* caches;  // before, during and after practice
         const char* during;
         const char* after;
-        const char* caches;  // before, during and after practice
     };
     const Case cases[] = {
-        {"attendee with attendees: one entry", kAttendee, "*All Attendees",
+        {"attendee with attendees: one entry", kAttendee, " 8 15", "*All Attendees",
          "Host|Presenter|Host & Presenter|---|*All Attendees|All Panelists|hank|pat|---|All "
-         "Participants",
-         " 8 15"},
-        {"panelist: the audiences among panelists", kPanelist,
+         "Participants"},
+        {"panelist: the audiences among panelists", kPanelist, " 4 15",
          "Host|Presenter|Host & Presenter|---|All Attendees|*All Panelists|pat|---|All "
          "Participants",
          "Host|Presenter|Host & Presenter|---|All Attendees|*All Panelists|hank|pat|---|All "
-         "Participants|---|Select an Attendee...",
-         " 4 15"},
-        {"presenter: the groups without the picker, the audience chosen before kept", kPresenter,
+         "Participants|---|Select an Attendee..."},
+        {"presenter: no picker, the audience chosen before kept", kPresenter, " 2 3 4 15",
          "*Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|All "
          "Participants",
          "*Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|All "
-         "Participants|---|Select an Attendee...",
-         " 2 3 4 15"},
-        {"host: the same groups", kHostRole,
+         "Participants|---|Select an Attendee..."},
+        {"host: the same groups", kHostRole, " 1 3 4 15",
          "Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|*All "
          "Participants",
          "Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|*All "
-         "Participants|---|Select an Attendee...",
-         " 1 3 4 15"},
+         "Participants|---|Select an Attendee..."},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.scenario);
