@@ -201,21 +201,19 @@ public:
         }
     }
 
-    // One record of this session holding the entries, reported as added, deleted or modified.
-    void Report(std::vector<ReportEntry> entries, std::uint32_t added, std::uint32_t deleted,
+    // The people in one record of this session, reported as added, deleted or modified.
+    void Report(const std::vector<Person>& people, std::uint32_t added, std::uint32_t deleted,
                 std::uint32_t modified) {
+        std::vector<ReportEntry> entries;
+        for (const Person& p : people)
+            entries.push_back(EntryFor(p));
         RosterReport report;
         report.Record(kSession, std::move(entries));
         engine.ApeRosterChanged(1, 0, added, deleted, modified, report.Records());
     }
-    void Enroll(const std::vector<Person>& people) {
-        std::vector<ReportEntry> entries;
-        for (const Person& p : people)
-            entries.push_back(EntryFor(p));
-        Report(entries, 1, 0, 0);
-    }
-    void Leave(const Person& person) { Report({EntryFor(person)}, 0, 1, 0); }
-    void Modify(const Person& person) { Report({EntryFor(person)}, 0, 0, 1); }
+    void Enroll(const std::vector<Person>& people) { Report(people, 1, 0, 0); }
+    void Leave(const Person& person) { Report({person}, 0, 1, 0); }
+    void Modify(const Person& person) { Report({person}, 0, 0, 1); }
 
     std::vector<std::string> Titles() const { return menutest::Titles(engine); }
     std::string Menu() const { return Join(Titles()); }
