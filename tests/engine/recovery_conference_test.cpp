@@ -31,10 +31,8 @@ const Person kCy{"Cy", 13, 0};
 const Person kDee{"Dee", 14, 0};
 constexpr const char* kStarted = "Start recovery customer cache data......";
 
-// Every participant that joins from now on is configured with the customer id (0: none).
-void GiveCustomerId(ChatRoom& room, std::uint32_t customerId) {
-    room.beforeStart = [customerId](CChatClient& e) { e.RecoveryMgr()->SetCustomerId(customerId); };
-}
+// Configures a participant with the customer id before it starts.
+const auto kWithCustomerId = [](CChatClient& e) { e.RecoveryMgr()->SetCustomerId(kCustomerId); };
 
 // The participant leaves: its engine is destroyed and the conference runs on.
 void Leave(ChatRoom& room, const Member& member) {
@@ -43,17 +41,17 @@ void Leave(ChatRoom& room, const Member& member) {
     room.Run();
 }
 
+// Makes the service of the participant who joined last refuse its next retrieval.
+void RefuseNext(ChatRoom& room) {
+    room.members.back()->client->FailNext(ArmOperation::ApeRequestSharedDataEx, 1104);
+}
+
 // At the nth retrieval the participant now joining asks for (1 user info, 2 customer cache,
-// 3 the everyone group's cache) runs action, by default making its service refuse it. Keeps
-// the texts logged meanwhile, warnings marked "W:".
+// 3 the everyone group's cache) runs action. Keeps the texts logged meanwhile, warnings
+// marked "W:".
 class AtNthRetrieval {
 public:
-    AtNthRetrieval(ChatRoom& room, int nth, std::function<void()> action = {}) {
-        if (!action) {
-            action = [&room] {
-                room.members.back()->client->FailNext(ArmOperation::ApeRequestSharedDataEx, 1104);
-            };
-        }
+    AtNthRetrieval(int nth, std::function<void()> action) {
         SetTraceSink([nth, action, this](TraceLevel level, const char*, const char* text) {
             logged.insert((level == TraceLevel::Warn ? "W:" : "") + std::string(text));
             if (std::string(text) == "Enter CChatClient::ChatRequestSharedDataEx" &&
@@ -75,7 +73,7 @@ private:
 
 TEST(LateJoiner, SeesPrivateAndEveryoneHistoryOnceInOrderNamedAlsoForThoseWhoLeft) {
     ChatRoom room(1, kRecover);
-    GiveCustomerId(room, kCustomerId);
+    room.beforeStart = kWithCustomerId;
     Member& ann = room.Join(kAnn);
     Member& bob = room.Join(kBob);
     room.Say(ann, "hi Bob", -1, kBob.node);
@@ -84,7 +82,7 @@ TEST(LateJoiner, SeesPrivateAndEveryoneHistoryOnceInOrderNamedAlsoForThoseWhoLef
     Leave(room, bob);
 
     // Ann says one more line to everyone just before Cy asks for the everyone group's cache.
-    AtNthRetrieval during(room, 3, [&room, &ann] {
+    AtNthRetrieval during(3, [&room, &ann] {
         room.Select(ann, GROUP_EVERYONE);
         ann.window->inputText = "during";
         ann.engine.HandleUIMessage(msg_SendChat, nullptr, nullptr);
@@ -111,13 +109,13 @@ TEST(LateJoiner, BacksUpTheEveryoneHistoryIntoACustomerCacheNobodySetBefore) {
     ChatRoom room(1, kRecover);
     Member& ann = room.Join(kAnn);  // no customer id: no customer cache, no copies
     room.Say(ann, "kept in the everyone cache only", GROUP_EVERYONE);
-    GiveCustomerId(room, kCustomerId);
+    room.beforeStart = kWithCustomerId;
     Member& cy = room.Join(kCy);  // finds the customer cache never set, sets it, backs up
     Leave(room, ann);
 
     // Dee cannot read the everyone group's cache: the backup, named from the history roster
     // since Ann has left, is all she has, and she chats on.
-    AtNthRetrieval refuse(room, 3);
+    AtNthRetrieval refuse(3, [&room] { RefuseNext(room); });
     Member& dee = room.Join(kDee);
     EXPECT_EQ(ChatRoom::Transcript(dee),
               Strings({"from Ann to Everyone|kept in the everyone cache only"}));
@@ -140,12 +138,12 @@ TEST(LateJoiner, ARefusedReadLeavesTheRestOfTheHistory) {
     for (const auto& [nth, format, history] : cases) {
         SCOPED_TRACE(nth);
         ChatRoom room(1, kRecover);
-        GiveCustomerId(room, kCustomerId);
+        room.beforeStart = kWithCustomerId;
         Member& ann = room.Join(kAnn);
         room.Join(kBob);
         room.Say(ann, "hi", -1, kBob.node);
         room.Say(ann, "one", GROUP_EVERYONE);
-        AtNthRetrieval refuse(room, nth);
+        AtNthRetrieval refuse(nth, [&room] { RefuseNext(room); });
         Member& cy = room.Join(kCy);
         const std::uint32_t handles[] = {cy.engine.UserInfoCacheHandle().handle_value,
                                          cy.engine.CustomerCacheHandle().handle_value};
@@ -158,7 +156,7 @@ TEST(LateJoiner, ARefusedReadLeavesTheRestOfTheHistory) {
 
 TEST(LateJoiner, AnEngineCleanedUpMidwayIgnoresItsCachesAndShowsNoRestoredLine) {
     ChatRoom room(1, kRecover);
-    GiveCustomerId(room, kCustomerId);
+    room.beforeStart = kWithCustomerId;
     Member& cy = room.Join(kCy);
     const std::uint32_t customerCache = cy.engine.CustomerCacheHandle().handle_value;
     cy.engine.Cleanup();

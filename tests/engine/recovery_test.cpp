@@ -198,10 +198,8 @@ TEST(Recovery, EachLineIsShownOnceWhateverHoldsCopiesOfItAndAForgedOneNever) {
     r.mgr.NoteLiveGroupMessage(8, 4);
     // Every receiver copied the attendees line 3 and the line 4 shown live; the sender and
     // the receiver each copied the private line; "ok" was really said twice.
-    for (int copy = 0; copy < 3; ++copy) {
-        r.Customer(GroupLine(11, 8, 3, "three"));
-        r.Customer(GroupLine(11, 8, 4, "four"));
-    }
+    for (const std::uint32_t cacheId : {3u, 4u, 3u, 4u, 3u, 4u})
+        r.Customer(GroupLine(11, 8, cacheId, "line " + std::to_string(cacheId)));
     for (int copy = 0; copy < 4; ++copy)
         r.Customer(PrivateLine(11, 12, "ok"));
     r.Customer("", CACHE_REPLY_LAST);
@@ -214,7 +212,7 @@ TEST(Recovery, EachLineIsShownOnceWhateverHoldsCopiesOfItAndAForgedOneNever) {
     r.Everyone(21, GroupLine(12, 15, 0, "live"), CACHE_APPEND);
     r.Everyone(23, GroupLine(11, 15, 0, "forged"), CACHE_APPEND, 12);
     r.Everyone(22, GroupLine(12, 15, 0, "after"), CACHE_REPLY_LAST, 12);
-    EXPECT_EQ(r.shown, Strings({"Ann@8:three", "from Ann to Bob (privately):ok",
+    EXPECT_EQ(r.shown, Strings({"Ann@8:line 3", "from Ann to Bob (privately):ok",
                                 "from Ann to Bob (privately):ok", "Ann@15:old", "Bob@15:live",
                                 "Bob@15:after"}));
     EXPECT_TRUE(trace.Has(TraceLevel::Warn,
