@@ -4,20 +4,13 @@
 #include <gtest/gtest.h>
 
 #include <cstring>
-#include <memory>
 #include <optional>
 #include <set>
-#include <string>
 #include <tuple>
 #include <utility>
-#include <vector>
 
-#include "engine/chat_client.h"
 #include "engine/chat_recovery_mgr.h"
-#include "platform/inproc_conference.h"
-#include "platform/virtual_run_loop.h"
 #include "tests/engine/chat_room.h"
-#include "tests/support/recording_window.h"
 #include "tests/support/spy_arm_client.h"
 #include "tests/support/trace_capture.h"
 

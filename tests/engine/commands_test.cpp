@@ -4,11 +4,8 @@
 
 #include <algorithm>
 #include <cstdint>
-#include <string>
 #include <tuple>
-#include <vector>
 
-#include "engine/chat_client.h"
 #include "engine/chat_recovery_mgr.h"
 #include "platform/telemetry.h"
 #include "tests/engine/chat_room.h"

@@ -2,15 +2,8 @@
 // and support staff search their logs for these texts.
 #include <gtest/gtest.h>
 
-#include <functional>
-#include <memory>
-#include <string>
 #include <tuple>
-#include <vector>
 
-#include "engine/chat_client.h"
-#include "platform/inproc_conference.h"
-#include "platform/virtual_run_loop.h"
 #include "tests/engine/chat_room.h"
 #include "tests/support/trace_capture.h"
 

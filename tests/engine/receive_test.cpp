@@ -6,12 +6,9 @@
 #include <algorithm>
 #include <cstdio>
 #include <optional>
-#include <string>
 #include <tuple>
 #include <type_traits>
-#include <vector>
 
-#include "engine/chat_client.h"
 #include "pdu/group_info_pdu.h"
 #include "pdu/group_message_pdu.h"
 #include "pdu/private_message_pdu.h"

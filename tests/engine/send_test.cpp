@@ -4,12 +4,9 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <string>
 #include <tuple>
 #include <utility>
-#include <vector>
 
-#include "engine/chat_client.h"
 #include "engine/line_ends.h"
 #include "platform/telemetry.h"
 #include "tests/engine/chat_room.h"

@@ -2,19 +2,11 @@
 // connection chain and its failures, roster-info switches, the tick and the tear-down.
 #include <gtest/gtest.h>
 
-#include <functional>
-#include <memory>
 #include <optional>
-#include <string>
 #include <tuple>
-#include <vector>
 
-#include "engine/chat_client.h"
-#include "platform/inproc_conference.h"
-#include "platform/virtual_run_loop.h"
 #include "tests/engine/chat_room.h"
 #include "tests/support/host_recorder.h"
-#include "tests/support/recording_window.h"
 #include "tests/support/spy_arm_client.h"
 #include "tests/support/trace_capture.h"
 
