@@ -40,8 +40,7 @@ std::vector<std::string> Prefix(const std::vector<std::string>& calls, std::size
 }
 
 TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
-    InProcessArmClient* client = conference.CreateClient(loop, 7);
-    SpyArmClient spy(client);
+    SpyArmClient spy(conference.CreateClient(loop, 7));
     CChatClient engine;
     engine.Initialize(Data(&spy, 7, "Alice", 3));
 
@@ -83,8 +82,7 @@ TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
 }
 
 TEST_F(SessionTest, RosterInfoIsPinned) {
-    InProcessArmClient* client = conference.CreateClient(loop, 7);
-    SpyArmClient spy(client);
+    SpyArmClient spy(conference.CreateClient(loop, 7));
     CChatClient engine;
     engine.SetRosters(ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST, 1);
     engine.Initialize(Data(&spy, 7, "Alice <&> ]]>", 1));
@@ -99,8 +97,7 @@ TEST_F(SessionTest, RosterInfoIsPinned) {
 }
 
 TEST_F(SessionTest, RosterInfoCarriesFaqFieldsTagAndCustomerId) {
-    InProcessArmClient* client = conference.CreateClient(loop, 7);
-    SpyArmClient spy(client);
+    SpyArmClient spy(conference.CreateClient(loop, 7));
     CChatClient engine;
     engine.SetRosters(ROLE_HOST | ROLE_PRESENTER | ROLE_PANELIST, 1);
     engine.SetConfig(2,
@@ -237,8 +234,7 @@ TEST_F(SessionTest, NoResourceOrNoServiceChangesNothing) {
 }
 
 TEST_F(SessionTest, SetRosterStatusReEnrollsOnlyOnChange) {
-    InProcessArmClient* client = conference.CreateClient(loop, 7);
-    SpyArmClient spy(client);
+    SpyArmClient spy(conference.CreateClient(loop, 7));
     CChatClient engine;
     engine.Initialize(Data(&spy, 7, "Alice"));
     loop.RunUntilIdle();
@@ -302,8 +298,7 @@ TEST_F(SessionTest, TickClosesTheAttendeePickerOnceItsWarningIsGone) {
 }
 
 TEST_F(SessionTest, RolesChangedBeforeEnrolmentAreEnrolledByTheTick) {
-    InProcessArmClient* client = conference.CreateClient(loop, 7);
-    SpyArmClient spy(client);
+    SpyArmClient spy(conference.CreateClient(loop, 7));
     CChatClient engine;
     engine.Initialize(Data(&spy, 7, "Alice"));
     EXPECT_EQ(engine.SetRosters(ROLE_PRESENTER, 0), 0);  // not enrolled yet: pending
@@ -316,8 +311,7 @@ TEST_F(SessionTest, RolesChangedBeforeEnrolmentAreEnrolledByTheTick) {
 }
 
 TEST_F(SessionTest, CleanupIsSafeTwiceAndReleasesOnce) {
-    InProcessArmClient* client = conference.CreateClient(loop, 7);
-    SpyArmClient spy(client);
+    SpyArmClient spy(conference.CreateClient(loop, 7));
     CChatClient engine;
     engine.Initialize(Data(&spy, 7, "Alice"));
     loop.RunUntilIdle();
@@ -334,10 +328,8 @@ TEST_F(SessionTest, CleanupIsSafeTwiceAndReleasesOnce) {
 }
 
 TEST_F(SessionTest, SecondInitializeKeepsTheFirstServiceWindowAndTimer) {
-    InProcessArmClient* first = conference.CreateClient(loop, 7);
-    InProcessArmClient* second = conference.CreateClient(loop, 8);
-    SpyArmClient spyFirst(first);
-    SpyArmClient spySecond(second);
+    SpyArmClient spyFirst(conference.CreateClient(loop, 7));
+    SpyArmClient spySecond(conference.CreateClient(loop, 8));
     CChatClient engine;
     engine.Initialize(Data(&spyFirst, 7, "Alice"));
     loop.RunUntilIdle();
