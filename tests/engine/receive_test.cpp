@@ -29,10 +29,6 @@ using Names = std::vector<std::string>;
 
 constexpr std::uint32_t kHost = 101, kPresenter = 102, kPanelist = 103, kAttendee = 104;
 
-std::vector<std::uint8_t> Bytes(const std::string& text) {
-    return std::vector<std::uint8_t>(text.begin(), text.end());
-}
-
 // A group message to group `to`, or a private one with receive id `to`.
 template <typename Pdu>
 std::vector<std::uint8_t> Line(std::uint32_t sendId, const char* name, std::uint32_t to,
@@ -47,7 +43,8 @@ std::vector<std::uint8_t> Line(std::uint32_t sendId, const char* name, std::uint
     }
     pdu.SetMessageContent(text);
     pdu.GenerateXMLPDU();
-    return Bytes(pdu.ToWireText());
+    const std::string wire = pdu.ToWireText();
+    return {wire.begin(), wire.end()};
 }
 const auto GroupLine = Line<CGroupMessagePDU>;
 const auto PrivateLine = Line<CPrivateMessagePDU>;
@@ -63,20 +60,17 @@ protected:
         room.SetHostAndPresenter(kHost, kPresenter);
     }
     std::uint32_t Id(int member) { return room.members[member]->client->UserId(); }
-    // Delivers bytes to every member as an append to the group's cache (group 0: no handle).
-    void ToGroup(std::uint32_t groupId, const std::vector<std::uint8_t>& bytes,
+    // Delivers bytes to every member privately, or as an append to the group's cache (group 0:
+    // no handle).
+    void Deliver(bool privately, std::uint32_t groupId, const std::vector<std::uint8_t>& bytes,
                  std::uint32_t senderId) {
         for (auto& m : room.members) {
             ArmCacheDelivery delivery;
             delivery.entityId = m->engine.GetCacheHandleFormGroupId(groupId);
             delivery.senderId = senderId;
-            ASSERT_TRUE(m->client->InjectCacheDelivery(delivery, bytes));
+            ASSERT_TRUE(privately ? m->client->InjectPrivateData(senderId, bytes)
+                                  : m->client->InjectCacheDelivery(delivery, bytes));
         }
-        room.Run();
-    }
-    void Privately(const std::vector<std::uint8_t>& bytes, std::uint32_t senderId) {
-        for (auto& m : room.members)
-            ASSERT_TRUE(m->client->InjectPrivateData(senderId, bytes));
         room.Run();
     }
     ChatRoom room{3};
@@ -115,11 +109,8 @@ TEST_F(Receiving, AMessageReachesItsAudienceWithItsTitle) {
         const std::string text = "line " + std::to_string(++n);
         const char* name = from == 0 ? "Hana" : "Ann";
         const std::uint32_t to = privately && toId == 1 ? Id(0) : static_cast<std::uint32_t>(toId);
-        if (privately) {
-            Privately(PrivateLine(Id(from), name, to, text), Id(from));
-        } else {
-            ToGroup(to, GroupLine(Id(from), name, to, text), Id(from));
-        }
+        const auto line = privately ? PrivateLine : GroupLine;
+        Deliver(privately, to, line(Id(from), name, to, text), Id(from));
         EXPECT_EQ(room.Holders(std::string(title) + "|" + text), holders) << text;
     }
 }
@@ -131,8 +122,8 @@ TEST_F(Receiving, ForgedSendersAreDroppedWithAWarningAndSenderZeroIsNotChecked) 
         const std::string said = std::to_string(sender);
         const std::size_t before = ChatRoom::Transcript(*room.members[0]).size();
         TraceCapture capture;
-        ToGroup(GROUP_EVERYONE, GroupLine(Id(3), "Ann", 15, "g" + said), sender);
-        Privately(PrivateLine(Id(3), "Ann", 0, "p" + said), sender);
+        Deliver(false, GROUP_EVERYONE, GroupLine(Id(3), "Ann", 15, "g" + said), sender);
+        Deliver(true, 0, PrivateLine(Id(3), "Ann", 0, "p" + said), sender);
         EXPECT_EQ(ChatRoom::Transcript(*room.members[0]).size() - before, forged ? 0u : 2u);
         const std::string ids = "senderId:" + said + ", senderId in PDU:" + inPdu;
         EXPECT_EQ(capture.Has(TraceLevel::Warn,
