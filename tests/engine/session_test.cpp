@@ -127,7 +127,9 @@ TEST_F(SessionTest, RosterInfoCarriesFaqFieldsTagAndCustomerId) {
 TEST_F(SessionTest, ConnectResultDecidesWhetherTheChainGoesOn) {
     std::uint32_t node = 7;
     // Negative: the confirmation carries the value; -19 twice: two retries, then it connects.
-    for (const int result : {1202, 1, 19, -5, -19}) {
+    // Already connected, and (0) already connected and joined: the chain goes on within the
+    // same call, without waiting for a confirmation.
+    for (const int result : {1202, 1, 19, -5, -19, int{kArmAlreadyConnected}, 0}) {
         SCOPED_TRACE(result);
         InProcessArmClient* client = conference.CreateClient(loop, node);
         SpyArmClient spy(client);
@@ -135,10 +137,23 @@ TEST_F(SessionTest, ConnectResultDecidesWhetherTheChainGoesOn) {
         if (result < 0)
             client->ConfirmNextWith(ArmConfirmation::ConnectConfirm, -result,
                                     result == -19 ? 2 : 1);
+        if (result == 0) {
+            client->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
+            client->FailNext(ArmOperation::ConferenceJoin, kArmAlreadyJoined);
+        }
+        TraceCapture capture;
         CChatClient engine;
         engine.Initialize(Data(&spy, node++, "Alice"));
+        const bool already = result == kArmAlreadyConnected || result == 0;
+        if (already) {
+            const std::vector<std::string> chain{"Connect", "ConferenceJoin", "ApeAttach"};
+            const std::size_t made = result == 0 ? 3 : 2;
+            EXPECT_EQ(Prefix(spy.Calls(), made), Prefix(chain, made));
+            EXPECT_TRUE(
+                capture.Has("CChatClient::already connected, now call ConnectConfirm() myself"));
+        }
         loop.RunUntilIdle();
-        const bool joins = result == 1202 || result == -19;
+        const bool joins = result == 1202 || result == -19 || already;
         EXPECT_EQ(spy.Count("Connect"), result == -19 ? 3u : 1u);
         EXPECT_EQ(spy.Count("ConferenceJoin"), joins ? 1u : 0u);
         if (joins) {
@@ -156,30 +171,6 @@ TEST_F(SessionTest, ConnectResultDecidesWhetherTheChainGoesOn) {
         EXPECT_EQ(engine.ArmClient(), nullptr);
         EXPECT_NE(engine.ChatUI(), nullptr);
         EXPECT_TRUE(engine.TimerInstalled());
-    }
-}
-
-TEST_F(SessionTest, AlreadyConnectedOrJoinedGoesOnWithinTheSameCall) {
-    for (const std::uint32_t node : {7u, 8u}) {
-        const bool joined = node == 8;
-        InProcessArmClient* client = conference.CreateClient(loop, node);
-        SpyArmClient spy(client);
-        client->FailNext(ArmOperation::Connect, kArmAlreadyConnected);
-        if (joined) client->FailNext(ArmOperation::ConferenceJoin, kArmAlreadyJoined);
-        TraceCapture capture;
-        CChatClient engine;
-        engine.Initialize(Data(&spy, node, "Alice"));
-        // Without waiting for a confirmation.
-        std::vector<std::string> chain = {"Connect", "ConferenceJoin"};
-        if (joined) chain.push_back("ApeAttach");
-        EXPECT_EQ(Prefix(spy.Calls(), chain.size()), chain);
-        EXPECT_TRUE(
-            capture.Has("CChatClient::already connected, now call ConnectConfirm() myself"));
-        if (joined) {
-            EXPECT_EQ(engine.State(), kStateAttaching);
-        }
-        loop.RunUntilIdle();
-        EXPECT_EQ(engine.State(), kStateEnrolled);
     }
 }
 
