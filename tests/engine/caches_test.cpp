@@ -11,6 +11,7 @@
 
 #include "engine/chat_recovery_mgr.h"
 #include "tests/engine/chat_room.h"
+#include "tests/engine/menu_harness.h"
 #include "tests/support/spy_arm_client.h"
 #include "tests/support/trace_capture.h"
 
@@ -30,19 +31,11 @@ struct Participant {
     // refuseUserInfoSet: the service refuses the first cache set, the user-info cache's.
     explicit Participant(bool refuseUserInfoSet = false) {
         RecordingWindow::Install();
-        client = conference.CreateClient(loop, kMyNode);
         if (refuseUserInfoSet) client->ConfirmNextWith(ArmConfirmation::ApeCacheActionConfirmEx, 7);
-        spy = std::make_unique<SpyArmClient>(client);
-        engine.Initialize(chatroom::StartRecord(spy.get(), conference.ConferenceId(), kSessionId,
+        engine.Initialize(chatroom::StartRecord(&spy, conference.ConferenceId(), kSessionId,
                                                 "Alice", kMyNode, 3));
-        for (std::uint32_t id : {GROUP_HOST_PRESENTER_PANELISTS, kHighGroupId}) {
-            _tagChatGroupInfo info{};
-            info.dwIndex = 100;
-            info.dwGroupType = 1;
-            info.dwGroupId = id;
-            info.cszGroupName = "Added";
-            engine.AddGroup(&info, 0);
-        }
+        for (std::uint32_t id : {GROUP_HOST_PRESENTER_PANELISTS, kHighGroupId})
+            menutest::AddGroup(engine, 100, 1, id, "Added", 0);
         loop.RunUntilIdle();
     }
     ~Participant() { RecordingWindow::Uninstall(); }
@@ -61,8 +54,8 @@ struct Participant {
     VirtualRunLoop loop;
     ScopedCurrentRunLoop current{&loop};
     InProcessConference conference;
-    InProcessArmClient* client = nullptr;
-    std::unique_ptr<SpyArmClient> spy;
+    InProcessArmClient* client = conference.CreateClient(loop, kMyNode);
+    SpyArmClient spy{client};
     CChatClient engine;
 };
 
@@ -131,11 +124,11 @@ TEST(Caches, ARequestIsSentOnlyWhenItWouldChangeTheSubscription) {
         SCOPED_TRACE(request);
         if (refused) p.client->FailNext(ArmOperation::ApeRequestSharedDataEx, 5);
         TraceCapture capture;
-        const std::size_t before = p.spy->Count("ApeRequestSharedDataEx");
+        const std::size_t before = p.spy.Count("ApeRequestSharedDataEx");
         EXPECT_EQ(subscribe ? p.engine.SubscribeGroupCache(groupId, type)
                             : p.engine.UnSubscribeGroupCache(groupId),
                   sent);
-        EXPECT_EQ(p.spy->Count("ApeRequestSharedDataEx") - before, static_cast<std::size_t>(sent));
+        EXPECT_EQ(p.spy.Count("ApeRequestSharedDataEx") - before, static_cast<std::size_t>(sent));
         int subscribed = 0, requestType = 0, cacheSet = 0;
         ASSERT_TRUE(p.engine.GetGroupCacheStatus(groupId, subscribed, requestType, cacheSet));
         EXPECT_EQ(subscribed, subscribedAfter);
@@ -146,10 +139,10 @@ TEST(Caches, ARequestIsSentOnlyWhenItWouldChangeTheSubscription) {
             refused);
     }
     // A group without a cache (a separator, an unknown id) is never asked for.
-    const std::size_t before = p.spy->Count("ApeRequestSharedDataEx");
+    const std::size_t before = p.spy.Count("ApeRequestSharedDataEx");
     EXPECT_EQ(p.engine.SubscribeGroupCache(0, CACHE_REQUEST_SUBSCRIBE), 0);
     EXPECT_EQ(p.engine.SubscribeGroupCache(99, CACHE_REQUEST_SUBSCRIBE), 0);
-    EXPECT_EQ(p.spy->Count("ApeRequestSharedDataEx"), before);
+    EXPECT_EQ(p.spy.Count("ApeRequestSharedDataEx"), before);
 }
 
 TEST(Caches, CachesNeverMarkedSetAreNeverSubscribed) {
@@ -158,12 +151,12 @@ TEST(Caches, CachesNeverMarkedSetAreNeverSubscribed) {
     Participant p(true);
     ASSERT_EQ(p.engine.State(), kStateEnrolled);
     TraceCapture capture;
-    p.spy->ClearCalls();
+    p.spy.ClearCalls();
     p.engine.OnHostChanged(kMyNode);
     EXPECT_EQ(p.engine.SubscribeGroupCache(GROUP_EVERYONE, CACHE_REQUEST_SUBSCRIBE), 0);
     p.engine.SubscribeAllGroupCaches();
     p.engine.ReSubscribeGroupCaches();
-    EXPECT_EQ(p.spy->Count("ApeRequestSharedDataEx"), 0u);
+    EXPECT_EQ(p.spy.Count("ApeRequestSharedDataEx"), 0u);
     EXPECT_TRUE(capture.Has(
         TraceLevel::Warn, "CChatClient::SubscribeGroupCache , dwGroupID=15, dwGroupCacheHandle = " +
                               std::to_string(p.engine.GetCacheHandleFormGroupId(15)) +
@@ -205,10 +198,10 @@ TEST(Caches, CacheActionConfirmationsDriveTheNextStep) {
         if (kind == kStatus) entity = p.engine.ChatStatusCacheHandle().handle_value;
         if (kind == kNoEntity) entity = 0;
         TraceCapture capture;
-        p.spy->ClearCalls();
+        p.spy.ClearCalls();
         p.engine.ApeCacheActionConfirmEx(zeroApe ? 0 : p.client->ApeHandle(), entity, action, 1, 1,
                                          result);
-        EXPECT_EQ(p.spy->Count("ApeSharedDataActionEx"), writes);
+        EXPECT_EQ(p.spy.Count("ApeSharedDataActionEx"), writes);
         EXPECT_EQ(p.Subscribed(), subscribed);
         EXPECT_EQ(capture.Has("Enter CChatClient::ReSubscribeGroupCaches"), resubscribed);
     }
@@ -224,7 +217,7 @@ TEST(Caches, InitialisingSetsEveryCacheFromOneSharedBlock) {
             // apart from their names.
             p.engine.RecoveryMgr()->SetCustomerId(customerId);
             ASSERT_EQ(p.engine.AllocAllNeededCacheHandle(), 1);
-            for (const NameHandle& entry : p.spy->HandleRequests().back()) {
+            for (const NameHandle& entry : p.spy.HandleRequests().back()) {
                 EXPECT_EQ(entry.handle_value, 0u) << entry.name;
                 const std::size_t length = strnlen(entry.name, sizeof entry.name);
                 EXPECT_EQ(std::string(entry.name + length, sizeof entry.name - length),
@@ -238,7 +231,7 @@ TEST(Caches, InitialisingSetsEveryCacheFromOneSharedBlock) {
         for (std::uint32_t id : {1u, 2u, 3u, 4u, 7u, 8u, 15u, 16u, kHighGroupId})
             if (p.engine.GetCacheHandleFormGroupId(id) != 0) ++caches;
         const std::size_t blocks = p.client->MemHandleCount();
-        p.spy->ClearCalls();
+        p.spy.ClearCalls();
         p.engine.SetAllCaches();
 
         std::vector<std::string> expected = {"AllocMemHandle", "WriteMemHandle"};
@@ -249,7 +242,7 @@ TEST(Caches, InitialisingSetsEveryCacheFromOneSharedBlock) {
                                              "ApeSharedDataActionEx", "FreeMemHandle"});
         }
         expected.push_back("FreeMemHandle");
-        EXPECT_EQ(p.spy->Calls(), expected);
+        EXPECT_EQ(p.spy.Calls(), expected);
         EXPECT_EQ(p.client->MemHandleCount(), blocks);
     }
 }
@@ -277,7 +270,7 @@ TEST(Caches, TheStatusCacheAnswerDecidesWhetherToInitialiseOrJoin) {
         delivery.action = action;
         delivery.result = result;
         TraceCapture capture;
-        p.spy->ClearCalls();
+        p.spy.ClearCalls();
         ASSERT_TRUE(p.client->InjectCacheDelivery(delivery, data));
         p.loop.RunUntilIdle();
         EXPECT_TRUE(capture.Has("CChatClient::SharedDataReceivedEx chat status cache ----/"));
@@ -289,7 +282,7 @@ TEST(Caches, TheStatusCacheAnswerDecidesWhetherToInitialiseOrJoin) {
                               "m_ChatStatusCacheHandle.handle_value,result =19"),
                   warns);
         // Joining writes the own user info only; initialising sets every cache and more.
-        if (!initialises) EXPECT_EQ(p.spy->Count("ApeSharedDataActionEx"), joins ? 1u : 0u);
+        if (!initialises) EXPECT_EQ(p.spy.Count("ApeSharedDataActionEx"), joins ? 1u : 0u);
     }
 }
 

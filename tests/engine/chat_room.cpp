@@ -1,24 +1,11 @@
 #include "tests/engine/chat_room.h"
 
 #include "api/ui_protocol.h"
+#include "tests/engine/menu_harness.h"
 
 namespace chatroom {
 
-namespace {
-
 constexpr std::uint32_t kSession = 5;
-
-}  // namespace
-
-ChatRoom::ChatRoom(std::int32_t meetingType, std::uint32_t features)
-    : m_meetingType(meetingType), m_features(features) {
-    RecordingWindow::Install();
-}
-
-ChatRoom::~ChatRoom() {
-    members.clear();
-    RecordingWindow::Uninstall();
-}
 
 Member& ChatRoom::Join(const Person& person, IHostChatSink* hostSink) {
     members.push_back(std::make_unique<Member>());
@@ -51,15 +38,11 @@ bool ChatRoom::Select(Member& from, std::int32_t groupId, std::uint32_t node) {
     std::int32_t index =
         groupId >= 0 ? engine.GetIndexOfMenuByGroup(groupId) : engine.GetIndexOfMenuByNodeID(node);
     if (index == -1 && groupId >= 0) {
-        _tagChatGroupInfo info{};
-        info.dwIndex = static_cast<std::uint32_t>(engine.Menu().size());
-        info.dwGroupType = 1;
-        info.dwGroupId = static_cast<std::uint32_t>(groupId);
         // The group's own name updates the group instead of adding one without a cache.
         const char* name =
             engine.GetGroupNameFromGroupCacheHandle(engine.GetCacheHandleFormGroupId(groupId));
-        info.cszGroupName = name ? name : "Audience";
-        engine.AddGroup(&info, 1);
+        menutest::AddGroup(engine, static_cast<std::uint32_t>(engine.Menu().size()), 1,
+                           static_cast<std::uint32_t>(groupId), name ? name : "Audience");
         index = engine.GetIndexOfMenuByGroup(groupId);
     } else if (index == -1) {
         const UserItem* user = engine.UserList().GetUserItemFromNodeId(node);

@@ -47,8 +47,11 @@ struct Member {
 class ChatRoom {
 public:
     // features go to every member before it starts.
-    explicit ChatRoom(std::int32_t meetingType, std::uint32_t features = 0);
-    ~ChatRoom();
+    explicit ChatRoom(std::int32_t meetingType, std::uint32_t features = 0)
+        : m_meetingType(meetingType), m_features(features) {
+        RecordingWindow::Install();
+    }
+    ~ChatRoom() { RecordingWindow::Uninstall(); }
 
     // Starts a participant and runs the conference until it is enrolled and subscribed.
     Member& Join(const Person& person, IHostChatSink* hostSink = nullptr);
