@@ -19,25 +19,22 @@ const std::string kBom = "\xEF\xBB\xBF";
 const std::string kFirst = "03/05/2009    09:03:07 AM    ";
 const std::string kSecond = "12/31/2010    14:05:09 PM    ";
 
-// What parsing a file gives: whether it opened, its entries' lines and the texts shown, each
-// marked T: (title, 2201) or M: (message text, 2200).
-struct Parsed {
-    bool ok;
+// What parsing a file gives: its entries' lines and the texts shown, each marked T: (title,
+// 2201) or M: (message text, 2200). The file opens when there is a line.
+std::pair<Strings, Strings> Parse(const std::string& bytes) {
     Strings lines;
     Strings shown;
-};
-
-Parsed Parse(const std::string& bytes) {
-    Parsed parsed{};
     CChatContentStorage content;
-    parsed.ok = ParseTranscript(bytes, &content, [&parsed](bool bTitle, const std::string& text) {
-        parsed.shown.push_back((bTitle ? "T:" : "M:") + text);
-    });
+    const bool opened =
+        ParseTranscript(bytes, &content, [&shown](bool bTitle, const std::string& text) {
+            shown.push_back((bTitle ? "T:" : "M:") + text);
+        });
     for (std::size_t i = 0; i < content.GetLineCount(); ++i)
-        parsed.lines.emplace_back(content.GetLineAtIndex(i));
+        lines.emplace_back(content.GetLineAtIndex(i));
+    EXPECT_EQ(opened, !lines.empty());
     // Every line keeps the time it was read with.
-    EXPECT_EQ(content.GetTimeCount(), parsed.lines.size());
-    return parsed;
+    EXPECT_EQ(content.GetTimeCount(), lines.size());
+    return {lines, shown};
 }
 
 TEST(TranscriptFormat, FileIsMarkThenPrefixLineAndLfPerTime) {
@@ -108,10 +105,7 @@ TEST(TranscriptFormat, ParsingKeepsEntriesWholeCaseByCase) {
     };
     for (const auto& [name, bytes, lines, shown] : cases) {
         SCOPED_TRACE(name);
-        const Parsed parsed = Parse(bytes);
-        EXPECT_EQ(parsed.ok, !lines.empty());
-        EXPECT_EQ(parsed.lines, lines);
-        EXPECT_EQ(parsed.shown, shown);
+        EXPECT_EQ(Parse(bytes), std::make_pair(lines, shown));
     }
 }
 
@@ -126,9 +120,8 @@ TEST(TranscriptFormat, LongHeadersAreCutToTheBufferAtACharacterBoundary) {
         {euros, euros.substr(0, 8188) + "\r"},
     };
     for (const auto& [header, kept] : cases) {
-        const Parsed parsed = Parse(kFirst + header + "\tmsg\n");
-        EXPECT_EQ(parsed.lines, Strings{kept + "\tmsg"});
-        EXPECT_EQ(parsed.shown, (Strings{"T:" + kept, "M:msg"}));
+        EXPECT_EQ(Parse(kFirst + header + "\tmsg\n"),
+                  std::make_pair(Strings{kept + "\tmsg"}, Strings{"T:" + kept, "M:msg"}));
     }
 }
 
