@@ -2,24 +2,19 @@
 
 #include <cstring>
 #include <string>
+#include <tuple>
 
 #include "kyutil/ky_string2.h"
 
 TEST(KyString2, NullAndEmptyTextsAreEqualAndOtherwiseEveryByteCounts) {
-    struct Case {
-        const char* a;
-        const char* b;
-        bool equal;
-    };
-    const Case cases[] = {
+    const std::tuple<const char*, const char*, bool> cases[] = {
         {"abc", "abc", true},  {"abc", "abd", false},   {"abc", "ab", false},
         {"abc", "ABC", false}, {"abc", nullptr, false}, {nullptr, "", true},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(std::string(c.a ? c.a : "(null)") + " / " + (c.b ? c.b : "(null)"));
-        const CKyString2 a(c.a);
-        EXPECT_EQ(c.equal, a.Equals(c.b));
-        EXPECT_EQ(c.equal, a.Equals(CKyString2(c.b)));
+    for (const auto& [a, b, equal] : cases) {
+        SCOPED_TRACE(std::string(a ? a : "(null)") + " / " + (b ? b : "(null)"));
+        EXPECT_EQ(equal, CKyString2(a).Equals(b));
+        EXPECT_EQ(equal, CKyString2(a).Equals(CKyString2(b)));
     }
     CKyString2 text("abc");
     text.CopyFrom(static_cast<const char*>(nullptr));
@@ -57,27 +52,20 @@ TEST(KyString2, CopyingItsOwnTextIsSafe) {
 }
 
 TEST(KyString2, DeleteAndMidStayWithinTheText) {
-    struct Case {
-        bool mid;
-        int32_t start;
-        int32_t count;
-        const char* text;  // what Delete leaves of "hello", or the part Mid takes
-        int32_t result;    // Delete's answer
+    // Each start and count: Delete's answer and what it leaves of "hello", and Mid's part.
+    const std::tuple<int32_t, int32_t, int32_t, const char*, const char*> cases[] = {
+        {1, 2, 3, "hlo", "el"},  {-3, 2, 3, "llo", "he"},  {0, 0, -1, "hello", ""},
+        {5, 1, -1, "hello", ""}, {3, 10, 3, "hel", "lo"},  {0, 5, 0, "", "hello"},
+        {6, 2, -1, "hello", ""}, {1, -1, -1, "hello", ""},
     };
-    const Case cases[] = {
-        {false, 1, 2, "hlo", 3},    {false, -3, 2, "llo", 3}, {false, 0, 0, "hello", -1},
-        {false, 5, 1, "hello", -1}, {false, 3, 10, "hel", 3}, {false, 0, 5, "", 0},
-        {true, 1, 3, "ell", 0},     {true, -2, 2, "he", 0},   {true, 3, 10, "lo", 0},
-        {true, 5, 2, "", 0},        {true, 6, 2, "", 0},      {true, 1, -1, "", 0},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(::testing::Message() << c.mid << ": " << c.start << "," << c.count);
+    for (const auto& [start, count, result, left, part] : cases) {
+        SCOPED_TRACE(::testing::Message() << start << "," << count);
         CKyString2 text("hello");
-        if (!c.mid) {
-            EXPECT_EQ(c.result, text.Delete(c.start, c.count));
-        }
-        const CKyString2 seen = c.mid ? text.Mid(c.start, c.count) : text;
-        EXPECT_STREQ(c.text, seen.GetData());
-        EXPECT_EQ(std::strlen(c.text), seen.GetLength());
+        const CKyString2 mid = text.Mid(start, count);
+        EXPECT_STREQ(part, mid.GetData());
+        EXPECT_EQ(std::strlen(part), mid.GetLength());
+        EXPECT_EQ(result, text.Delete(start, count));
+        EXPECT_STREQ(left, text.GetData());
+        EXPECT_EQ(std::strlen(left), text.GetLength());
     }
 }

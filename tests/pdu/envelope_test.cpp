@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <tuple>
 
 #include "pdu/group_info_pdu.h"
 #include "pdu/group_message_pdu.h"
@@ -23,10 +24,7 @@ TEST(Envelope, PduTypeIsTheMainTypeFrom1To11AndElse0) {
         const int expected = type >= 1 && type <= 11 ? type : 0;
         EXPECT_EQ(pdu.GetPDUType(WithType(std::to_string(type))), expected) << type;
     }
-    const struct {
-        const char* text;
-        int type;
-    } cases[] = {
+    const std::tuple<const char*, int> cases[] = {
         {"", 0},
         {"this is not xml", 0},
         {"<chats ver=\"1.0\"><mtype>3</mtype></chats>", 0},
@@ -39,28 +37,25 @@ TEST(Envelope, PduTypeIsTheMainTypeFrom1To11AndElse0) {
         {"<chat><mtype>4</mtype></chat>", 4},
         {"<!-- note --><chat ver=\"1.0\"><mtype>5</mtype></chat>", 5},
     };
-    for (const auto& c : cases)
-        EXPECT_EQ(pdu.GetPDUType(c.text), c.type) << c.text;
+    for (const auto& [text, type] : cases)
+        EXPECT_EQ(pdu.GetPDUType(text), type) << text;
 }
 
 TEST(Envelope, OnlyVersionOnePointZeroPassesTheCheck) {
-    const struct {
-        const char* attribute;
-        int result;
-        uint32_t version;
-    } cases[] = {
+    // Each ver attribute: what parsing answers and the version it leaves.
+    const std::tuple<const char*, int, uint32_t> cases[] = {
         {" ver=\"1.0\"", 1, 1u},
         {" ver=\"1.00\"", 0, 1u},
         {" ver=\"2.0\"", 0, 2u},
         {" ver=\"\"", 0, 0u},
         {"", 0, 1u},  // no "ver": the version stays as it was
     };
-    for (const auto& c : cases) {
+    for (const auto& [attribute, result, version] : cases) {
         CGroupMessagePDU pdu;
         const std::string text =
-            std::string("<chat") + c.attribute + ">" + kGroupMessageBody + "</chat>";
-        EXPECT_EQ(pdu.ParseXMLPDU(text), c.result) << text;
-        EXPECT_EQ(pdu.GetVersion(), c.version) << text;
+            std::string("<chat") + attribute + ">" + kGroupMessageBody + "</chat>";
+        EXPECT_EQ(pdu.ParseXMLPDU(text), result) << text;
+        EXPECT_EQ(pdu.GetVersion(), version) << text;
     }
 }
 

@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <tuple>
 
 #include "pdu/chat_user_info_pdu.h"
 #include "pdu/faq_macro_info_pdu.h"
@@ -146,23 +147,21 @@ TEST(HostileInput, BytesThatAreNotUtf8AreKeptAsTheyCame) {
 }
 
 TEST(HostileInput, CharacterReferencesFollowTheDeclaredEncoding) {
-    const struct {
-        const char* prefix;
-        const char* name;
-    } cases[] = {
+    // Each prefix and the first name it makes of "Ren&#233;".
+    const std::tuple<const char*, const char*> cases[] = {
         {"", "Ren\xE9"},
         {"\xEF\xBB\xBF", "Ren\xC3\xA9"},
         {"<?xml version=\"1.0\" encoding=\"UTF-8\"?>", "Ren\xC3\xA9"},
         {"<?xml version=\"1.0\"?>", "Ren\xC3\xA9"},
         {"<?xml version=\"1.0\" encoding=\"ISO-8859-1\"?>", "Ren\xE9"},
     };
-    for (const auto& c : cases) {
+    for (const auto& [prefix, name] : cases) {
         CFAQMacroInfoPDU pdu;
-        ASSERT_EQ(pdu.ParseXMLPDU(std::string(c.prefix) +
+        ASSERT_EQ(pdu.ParseXMLPDU(std::string(prefix) +
                                   "<chat ver=\"1.0\"><mtype>8</mtype><fname>Ren&#233;</fname>"
                                   "<lname>&#0;&#xFFFFFFFFFFFF;&unknown;</lname></chat>"),
                   1)
-            << c.prefix;
-        EXPECT_EQ(pdu.GetFirstName(), c.name) << c.prefix;
+            << prefix;
+        EXPECT_EQ(pdu.GetFirstName(), name) << prefix;
     }
 }

@@ -1,14 +1,12 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <tuple>
 
 #include "pdu/pdu_text.h"
 
 TEST(PduText, DecimalsKeepTheLow32BitsWhateverTheSign) {
-    const struct {
-        const char* text;
-        uint32_t value;
-    } cases[] = {
+    const std::tuple<const char*, uint32_t> cases[] = {
         {"", 0u},
         {"0", 0u},
         {"15", 15u},
@@ -26,15 +24,12 @@ TEST(PduText, DecimalsKeepTheLow32BitsWhateverTheSign) {
         {"-", 0u},
         {"1.0", 1u},
     };
-    for (const auto& c : cases)
-        EXPECT_EQ(DwordValue(c.text), c.value) << '"' << c.text << '"';
+    for (const auto& [text, value] : cases)
+        EXPECT_EQ(DwordValue(text), value) << '"' << text << '"';
 }
 
 TEST(PduText, EveryCdataEndMarkerGetsItsBlank) {
-    const struct {
-        const char* in;
-        const char* out;
-    } cases[] = {
+    const std::tuple<const char*, const char*> cases[] = {
         {"", ""},
         {"plain", "plain"},
         {"a]]>b", "a]] >b"},
@@ -45,6 +40,6 @@ TEST(PduText, EveryCdataEndMarkerGetsItsBlank) {
         {"]] >", "]] >"},
         {"]]", "]]"},
     };
-    for (const auto& c : cases)
-        EXPECT_EQ(ReplaceCdataEndMarkers(c.in), c.out) << c.in;
+    for (const auto& [in, out] : cases)
+        EXPECT_EQ(ReplaceCdataEndMarkers(in), out) << in;
 }

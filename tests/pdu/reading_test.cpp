@@ -3,6 +3,7 @@
 
 #include <functional>
 #include <string>
+#include <tuple>
 
 #include "pdu/chat_user_info_pdu.h"
 #include "pdu/customer_id_pdu.h"
@@ -28,12 +29,8 @@ int Parse(const std::string& text) {
 }  // namespace
 
 TEST(Reading, RequiredAndOptionalElementsOfEachKind) {
-    const struct {
-        std::function<int(const std::string&)> parse;
-        int type;
-        const char* body;
-        int result;
-    } cases[] = {
+    // Each parser, the main type and body of the text it is given, and its answer.
+    const std::tuple<std::function<int(const std::string&)>, int, const char*, int> cases[] = {
         {Parse<CPrivateMessagePDU>, 2, "<sendid>7</sendid><recid>1</recid><message/>", 1},
         {Parse<CPrivateMessagePDU>, 2, "<message/><recid>1</recid><sendid>7</sendid>", 1},
         {Parse<CPrivateMessagePDU>, 2, "<recid>1</recid><message/>", 0},
@@ -61,8 +58,8 @@ TEST(Reading, RequiredAndOptionalElementsOfEachKind) {
         {Parse<CPrimCustNodeIdPDU>, 10, "<primcust>4096</primcust>", 1},
         {Parse<CPrimCustNodeIdPDU>, 10, "", 0},
     };
-    for (const auto& c : cases)
-        EXPECT_EQ(c.parse(Chat(c.type, c.body)), c.result) << c.type << ": " << c.body;
+    for (const auto& [parse, type, body, result] : cases)
+        EXPECT_EQ(parse(Chat(type, body)), result) << type << ": " << body;
 }
 
 TEST(Reading, MissingOptionalElementsLeaveFieldsEmptyAndFailuresKeepWhatWasRead) {

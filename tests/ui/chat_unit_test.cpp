@@ -2,30 +2,26 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <tuple>
+#include <utility>
 #include <vector>
 
 #include "ui/chat_unit.h"
 
 namespace {
 
-struct UnitRun {
-    std::string text;
-    bool url;
-    bool operator==(const UnitRun& other) const { return text == other.text && url == other.url; }
-};
+// A run's text and whether it is a URL.
+using UnitRun = std::pair<std::string, bool>;
 
 std::vector<UnitRun> Runs(const char* message) {
     std::vector<UnitRun> runs;
     for (const CChatUnit& unit : CChatUnit::GetChatUnitListFromString(message))
-        runs.push_back({unit.GetContent(), unit.IsText() == 0});
+        runs.emplace_back(unit.GetContent(), unit.IsText() == 0);
     return runs;
 }
 
 TEST(ChatUnit, WordsThatAreUrls) {
-    const struct {
-        const char* word;
-        bool url;
-    } cases[] = {
+    const std::tuple<const char*, bool> cases[] = {
         {"www.example.com", true},       {"WWW.Example.COM/Path", true},
         {"https://a.b", true},           {"http://a.b", true},
         {"ftp://files.example", true},   {"ftp://nodot", false},
@@ -35,8 +31,8 @@ TEST(ChatUnit, WordsThatAreUrls) {
         {"www.example.\r", false},       {"example.com", false},
         {"xwww.example.com", false},     {"", false},
     };
-    for (const auto& c : cases)
-        EXPECT_EQ(CChatUnit::IsUrl(c.word), c.url) << c.word;
+    for (const auto& [word, url] : cases)
+        EXPECT_EQ(CChatUnit::IsUrl(word), url) << word;
     EXPECT_FALSE(CChatUnit::IsUrl(nullptr));
 }
 

@@ -1,6 +1,8 @@
 // The input formatters: length limit with beeps, digits up to a largest value.
 #include <gtest/gtest.h>
 
+#include <tuple>
+
 #include "ui/input_filters.h"
 
 namespace {
@@ -30,16 +32,14 @@ TEST(NumberFilter, AcceptsDigitsUpToTheLimitWithoutOverflow) {
     NumberFilter filter;
     filter.setMaxnumber(100);
     filter.setBeeper([&beeps] { ++beeps; });
-    const struct {
-        const char* text;
-        bool valid;
-    } cases[] = {{"", true},    {"1", true},   {"100", true},
-                 {"0", false},  {"05", false}, {"101", false},
-                 {"1a", false}, {"-1", false}, {"99999999999999999999", false}};
+    const std::tuple<const char*, bool> cases[] = {
+        {"", true},    {"1", true},   {"100", true},
+        {"0", false},  {"05", false}, {"101", false},
+        {"1a", false}, {"-1", false}, {"99999999999999999999", false}};
     int rejected = 0;
-    for (const auto& c : cases) {
-        EXPECT_EQ(filter.isPartialStringValid(c.text), c.valid) << c.text;
-        rejected += c.valid ? 0 : 1;
+    for (const auto& [text, valid] : cases) {
+        EXPECT_EQ(filter.isPartialStringValid(text), valid) << text;
+        rejected += valid ? 0 : 1;
     }
     EXPECT_EQ(beeps, rejected);
 

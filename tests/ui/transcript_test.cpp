@@ -4,6 +4,7 @@
 #include <QTextBlock>
 #include <QTextDocument>
 #include <QTextFragment>
+#include <tuple>
 
 #include "tests/ui/window_fixture.h"
 #include "ui/chat_panels.h"
@@ -52,10 +53,8 @@ protected:
 
 // Each shown line ends one paragraph, with or without its own line end.
 TEST_F(TranscriptTest, LineEndsConvertedTwiceMakeNoBlankParagraph) {
-    const struct {
-        const char* text;
-        const char* shown;
-    } cases[] = {
+    // Each line and the transcript's text after it alone.
+    const std::tuple<const char*, const char*> cases[] = {
         {"abc", "abc\n"},
         {"def\n", "def\n"},
         {"two\r\nlines\r\n", "two\nlines\n"},
@@ -67,10 +66,10 @@ TEST_F(TranscriptTest, LineEndsConvertedTwiceMakeNoBlankParagraph) {
         {"x\r\ry", "x\n\ny\n"},
         {"x\n\ny\r\n\r\n", "x\n\ny\n\n"},
     };
-    for (const auto& c : cases) {
+    for (const auto& [text, shown] : cases) {
         Command(msg_ClearChat);
-        Show(c.text);
-        EXPECT_EQ(Document()->toPlainText().toStdString(), c.shown) << c.text;
+        Show(text);
+        EXPECT_EQ(Document()->toPlainText().toStdString(), shown) << text;
     }
 }
 

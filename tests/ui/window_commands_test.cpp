@@ -1,5 +1,6 @@
 // The window's side of the engine's menu and input commands, the placeholder item included.
 #include <QTest>
+#include <tuple>
 
 #include "tests/ui/window_fixture.h"
 #include "ui/chat_menu_item.h"
@@ -115,19 +116,18 @@ TEST_F(WindowTest, SelectedUserLeftShowsThePlaceholderUntilATargetIsChosenAgain)
 }
 
 TEST_F(WindowTest, InputTextHasNormalisedLineEndsAndIsLimited) {
-    const struct {
-        std::string typed;
-        std::string sent;
-    } cases[] = {{"x\n\ny", "x\ry"},
-                 {"x\n\n\ny", "x\r\ry"},
-                 {"a\r\nb", "a\rb"},
-                 {"abc", "abc"},
-                 {std::string(1200, 'z'), std::string(1000, 'z')}};
-    for (const auto& c : cases) {
-        window->editView()->setStringValue(QString::fromStdString(c.typed));
+    // Each text typed and what the engine is given for it.
+    const std::tuple<std::string, std::string> cases[] = {
+        {"x\n\ny", "x\ry"},
+        {"x\n\n\ny", "x\r\ry"},
+        {"a\r\nb", "a\rb"},
+        {"abc", "abc"},
+        {std::string(1200, 'z'), std::string(1000, 'z')}};
+    for (const auto& [typed, sent] : cases) {
+        window->editView()->setStringValue(QString::fromStdString(typed));
         std::string text = "old";
         Command(msg_GetInputText, &text);
-        EXPECT_EQ(text, c.sent) << c.typed;
+        EXPECT_EQ(text, sent) << typed;
     }
     Command(msg_ClearInput);
     EXPECT_TRUE(window->editView()->toPlainText().isEmpty());
