@@ -62,32 +62,30 @@ TEST(Reading, RequiredAndOptionalElementsOfEachKind) {
         EXPECT_EQ(parse(Chat(type, body)), result) << type << ": " << body;
 }
 
-TEST(Reading, MissingOptionalElementsLeaveFieldsEmptyAndFailuresKeepWhatWasRead) {
+TEST(Reading, MissingOptionalElementsLeaveFieldsEmptyAndOnlyTheFirstOfANameCounts) {
     CGroupMessagePDU group;
-    ASSERT_EQ(group.ParseXMLPDU(Chat(3, "<sendid>7</sendid><groupid>15</groupid><message/>")), 1);
+    ASSERT_EQ(group.ParseXMLPDU(Chat(3, "<sendid>9</sendid><groupid>15</groupid><message/>")), 1);
     EXPECT_EQ(group.GetSenderName(), "");
     EXPECT_EQ(group.GetMessageContent(), "");
     EXPECT_EQ(group.GetGroupCacheId_DWORD(), 0u);
+    // The first element of a name and its first CDATA section count.
+    ASSERT_EQ(group.ParseXMLPDU(Chat(3,
+                                     "<message><![CDATA[one]]><![CDATA[two]]></message>"
+                                     "<groupid>15</groupid><sendid>7</sendid><sendid>8</sendid>")),
+              1);
+    EXPECT_EQ(group.GetMessageContent(), "one");
+    EXPECT_EQ(group.GetSendID(), "7");
 
     CRosterInfoPDU roster;
     ASSERT_EQ(roster.ParseXMLPDU(Chat(5, "")), 1);
     EXPECT_EQ(roster.GetUserNameW(), "");
     EXPECT_EQ(roster.GetVisible_BOOL(), 0);
 
+    // A failed read keeps what it read before failing.
     CPrivateMessagePDU partial;
     EXPECT_EQ(partial.ParseXMLPDU(Chat(2, "<sendid>7</sendid><SenderName>Ann</SenderName>")), 0);
     EXPECT_EQ(partial.GetSendID(), "7");
     EXPECT_EQ(partial.GetSenderName(), "Ann");
-}
-
-TEST(Reading, TheFirstElementOfANameAndTheFirstCdataSectionCount) {
-    CGroupMessagePDU pdu;
-    ASSERT_EQ(pdu.ParseXMLPDU(Chat(3,
-                                   "<message><![CDATA[one]]><![CDATA[two]]></message>"
-                                   "<groupid>15</groupid><sendid>7</sendid><sendid>8</sendid>")),
-              1);
-    EXPECT_EQ(pdu.GetMessageContent(), "one");
-    EXPECT_EQ(pdu.GetSendID(), "7");
 }
 
 // A group message widens its end markers only when printed (its wire bytes pin that).

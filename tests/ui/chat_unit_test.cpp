@@ -36,16 +36,6 @@ TEST(ChatUnit, WordsThatAreUrls) {
     EXPECT_FALSE(CChatUnit::IsUrl(nullptr));
 }
 
-TEST(ChatUnit, MessagesWithUrlContent) {
-    EXPECT_TRUE(CChatUnit::IsHaveUrlContent("see www.example.com now"));
-    EXPECT_TRUE(CChatUnit::IsHaveUrlContent("a\r\nhttp://x.y"));
-    EXPECT_TRUE(CChatUnit::IsHaveUrlContent("a\tmailto:x@y.z"));
-    // A dot but no prefix, and a prefix but no dot.
-    EXPECT_FALSE(CChatUnit::IsHaveUrlContent("see example.com now"));
-    EXPECT_FALSE(CChatUnit::IsHaveUrlContent("see www now"));
-    EXPECT_FALSE(CChatUnit::IsHaveUrlContent(nullptr));
-}
-
 TEST(ChatUnit, SplitsIntoAlternatingRuns) {
     EXPECT_EQ(Runs("go www.a.com now"),
               (std::vector<UnitRun>{
@@ -58,9 +48,15 @@ TEST(ChatUnit, SplitsIntoAlternatingRuns) {
     EXPECT_EQ(Runs("h\xC3\xA9 www.a.com\r"),
               (std::vector<UnitRun>{
                   {"h\xC3\xA9", false}, {" ", false}, {"www.a.com", true}, {"\r", false}}));
-    // Without URL-like content the message is one run, whatever it holds.
+    // A scheme prefix counts after any blank.
+    EXPECT_EQ(Runs("a\r\nhttp://x.y").back(), (UnitRun{"http://x.y", true}));
+    EXPECT_EQ(Runs("a\tmailto:x@y.z").back(), (UnitRun{"mailto:x@y.z", true}));
+    // Without URL-like content (a dot but no prefix, a prefix but no dot) the message is one
+    // run, whatever it holds.
     EXPECT_EQ(Runs("a b.c  d"), (std::vector<UnitRun>{{"a b.c  d", false}}));
+    EXPECT_EQ(Runs("see www now"), (std::vector<UnitRun>{{"see www now", false}}));
     EXPECT_TRUE(Runs(nullptr).empty());
+    EXPECT_FALSE(CChatUnit::IsHaveUrlContent(nullptr));
 }
 
 TEST(ChatUnit, CopiesOwnTheirText) {

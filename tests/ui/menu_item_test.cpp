@@ -48,7 +48,6 @@ TEST(ChatMenuItem, NoRoomLeavesTheTitleWholeButMarksItShortened) {
     EXPECT_TRUE(item.isCompressed());
     EXPECT_EQ(item.text(), "All Attendees (internal)");
     EXPECT_EQ(item.toolTip(), "All Attendees (internal)");
-    EXPECT_TRUE(item.font().bold());
 }
 
 TEST(ChatMenuItem, SuffixWithACommaIsCutAtTheCommaAndTheNameShortened) {

@@ -18,7 +18,6 @@ TEST(QtHost, FindsTheApplicationLoopOnItsThreadOnly) {
     RunLoop* loop = RunLoop::FindCurrent();
     ASSERT_NE(loop, nullptr);
     EXPECT_EQ(RunLoop::Current(), loop);
-    EXPECT_EQ(RunLoop::FindCurrent(), loop);
     RunLoop* elsewhere = loop;
     std::thread other([&elsewhere] { elsewhere = RunLoop::FindCurrent(); });
     other.join();

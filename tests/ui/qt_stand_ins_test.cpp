@@ -20,7 +20,7 @@
 
 namespace {
 
-TEST(QtRunLoop, PostsFromAnyThreadRunLaterOnTheLoopThread) {
+TEST(QtRunLoop, PostsFromAnyThreadAndTimersRunLaterOnTheLoopThreadUntilCancelled) {
     QtRunLoop loop;
     std::vector<int> order;
     std::thread::id ranOn;
@@ -32,14 +32,6 @@ TEST(QtRunLoop, PostsFromAnyThreadRunLaterOnTheLoopThread) {
         });
     });
     poster.join();
-    EXPECT_TRUE(order.empty());
-    RunUntil([&] { return order.size() == 2; });
-    EXPECT_EQ(order, (std::vector<int>{1, 2}));
-    EXPECT_EQ(ranOn, std::this_thread::get_id());
-}
-
-TEST(QtRunLoop, TimersRepeatUntilCancelledFromTheirOwnTask) {
-    QtRunLoop loop;
     int once = 0;
     int repeats = 0;
     loop.AddTimer(0.001, 0, [&] { ++once; });
@@ -48,10 +40,13 @@ TEST(QtRunLoop, TimersRepeatUntilCancelledFromTheirOwnTask) {
         if (++repeats == 3) loop.CancelTimer(id);
     });
     loop.CancelTimer(loop.AddTimer(0.001, 0, [] { FAIL() << "cancelled timer fired"; }));
-    RunUntil([&] { return repeats >= 3 && once == 1; });
+    EXPECT_TRUE(order.empty());
+    RunUntil([&] { return order.size() == 2 && repeats >= 3 && once == 1; });
     bool settled = false;  // no firing is left over afterwards
     QTimer::singleShot(20, [&settled] { settled = true; });
     RunUntil([&settled] { return settled; });
+    EXPECT_EQ(order, (std::vector<int>{1, 2}));
+    EXPECT_EQ(ranOn, std::this_thread::get_id());
     EXPECT_EQ(once, 1);
     EXPECT_EQ(repeats, 3);
     EXPECT_EQ(loop.TimerCount(), 0u);
