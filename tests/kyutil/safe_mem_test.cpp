@@ -9,26 +9,22 @@
 #include "kyutil/safe_mem.h"
 #include "tests/support/safec_guard.h"
 
-TEST(SafeMem, RefusalsAreReportedAndNeverMistakenForSuccess) {
-    ExpectSafecViolation expected;
-    char small[4] = {'w', 'x', 'y', 'z'};
-    EXPECT_FALSE(SafeMove(small, sizeof(small), "123456", 6));
-    EXPECT_FALSE(SafeMove(small, sizeof(small), nullptr, 2));
-    EXPECT_FALSE(SafeBytesEqual("abc", nullptr, 3));
-    EXPECT_EQ(3, expected.Count());
-    EXPECT_TRUE(SafeBytesEqual("abc", "abc", 3));
-    EXPECT_FALSE(SafeBytesEqual("abc", "abd", 3));
-}
-
-TEST(SafeMem, CopyTextCutsAndTerminatesAtAnySize) {
+TEST(SafeMem, TextIsCutAndTerminatedAndRefusalsAreNeverMistakenForSuccess) {
     char small[4] = {'w', 'x', 'y', 'z'};
     EXPECT_EQ(3u, SafeCopyText(small, sizeof(small), "hello"));
     EXPECT_STREQ("hel", small);
     EXPECT_EQ(0u, SafeCopyText(small, sizeof(small), nullptr));
     EXPECT_STREQ("", small);
-
     const std::string longText(40000, 'q');
     std::vector<char> large(50000, 'z');
     EXPECT_EQ(longText.size(), SafeCopyText(large.data(), large.size(), longText.c_str()));
     EXPECT_EQ(longText, std::string(large.data()));
+    EXPECT_TRUE(SafeBytesEqual("abc", "abc", 3));
+    EXPECT_FALSE(SafeBytesEqual("abc", "abd", 3));
+
+    ExpectSafecViolation expected;
+    EXPECT_FALSE(SafeMove(small, sizeof(small), "123456", 6));
+    EXPECT_FALSE(SafeMove(small, sizeof(small), nullptr, 2));
+    EXPECT_FALSE(SafeBytesEqual("abc", nullptr, 3));
+    EXPECT_EQ(3, expected.Count());
 }

@@ -94,7 +94,6 @@ TEST(WireBytes, RosterInfoWithThePhoneAsPlainText) {
     pdu.SetRoleSet(3u);
     pdu.SetVisible(1);
     pdu.SetUserType(1u);
-    pdu.SetUserExternalTag(0u);
     ASSERT_EQ(pdu.GenerateXMLPDU(), 1);
     // No FAQ details and a tag of 0: none of their elements.
     EXPECT_EQ(pdu.ToWireText(),
@@ -124,7 +123,6 @@ TEST(WireBytes, UserInfoAndGroupInfo) {
     CChatUserInfoPDU user;
     user.SetUserID(1001u);
     user.SetUserName("Bo]]>b");
-    user.SetUserExternalTag(0u);
     ASSERT_EQ(user.GenerateXMLPDU(), 1);
     EXPECT_EQ(user.ToWireText(),
               "<chat ver=\"1.0\"><mtype>4</mtype><uid>1001</uid><un><![CDATA[Bo]] >b]]></un>"

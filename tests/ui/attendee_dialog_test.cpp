@@ -94,7 +94,7 @@ TEST_F(AttendeeDialogTest, FindWrapsAroundAndWarns) {
     EXPECT_EQ(SelectedRow(dialog), 1);
 }
 
-TEST_F(AttendeeDialogTest, OkIsOnlyForANonZeroIdAndSendsItThenNone) {
+TEST_F(AttendeeDialogTest, OkIsOnlyForANonZeroIdAndSendsItThenNoneAsDoesAnotherTarget) {
     ChatSelectAttdControl* dialog = Open({{"Ghost", 0}, {"Zoe", 9}});
     EXPECT_FALSE(dialog->okButton()->isEnabled());
     dialog->tableView()->selectRow(0);
@@ -107,9 +107,8 @@ TEST_F(AttendeeDialogTest, OkIsOnlyForANonZeroIdAndSendsItThenNone) {
               (std::vector<RecordedEvent>{{msg_AttendeeSelected, 9}, {msg_AttendeeSelected, 0}}));
     EXPECT_EQ(window->attendeeDialog(), nullptr);
     EXPECT_EQ(ChatSelectAttdControl::instance(), nullptr);
-}
 
-TEST_F(AttendeeDialogTest, ChoosingAnotherTargetClosesIt) {
+    // Choosing another target closes it with none chosen.
     Open({{"Ann", 1}});
     engine.events.clear();
     window->userlist()->setCurrentIndex(0);

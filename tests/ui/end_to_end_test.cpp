@@ -84,16 +84,15 @@ TEST_F(EndToEnd, TypedLineReachesEveryWindow) {
     for (auto& p : people)
         ChSetHost(p->handle, kHana);
     // Enrolment, caches and the start-up ticks that apply the privileges.
-    RunUntil([] { return false; });
+    QTest::qWait(6000);
 
     // Hana adds the audience of everyone, picks it from her popup and types a line.
-    const QString audience = "All Participants";
-    const QByteArray audienceName = audience.toUtf8();
+    const char* audience = "All Participants";
     _tagChatGroupInfo everyone{};
     everyone.dwIndex = static_cast<std::uint32_t>(hana.window->userlist()->numberOfItems());
     everyone.dwGroupType = 1;
     everyone.dwGroupId = GROUP_EVERYONE;
-    everyone.cszGroupName = audienceName.constData();
+    everyone.cszGroupName = audience;
     ChAddGroup(hana.handle, &everyone);
     ChatPopUpButton* popup = hana.window->userlist();
     const int all = popup->indexOfItemWithTitle(audience);
@@ -104,7 +103,7 @@ TEST_F(EndToEnd, TypedLineReachesEveryWindow) {
     QTest::keyClick(hana.window->editView(), Qt::Key_Return);
 
     const std::string line = "Hello from Hana, see www.example.com";
-    ASSERT_TRUE(RunUntil([&] { return Transcript(ann).find(line) != std::string::npos; }));
+    ASSERT_TRUE(QTest::qWaitFor([&] { return Transcript(ann).find(line) != std::string::npos; }));
     EXPECT_NE(Transcript(hana).find(line), std::string::npos);
     EXPECT_NE(Transcript(ann).find("from Hana to All Participants"), std::string::npos);
 
@@ -119,7 +118,7 @@ TEST_F(EndToEnd, TypedLineReachesEveryWindow) {
 
     // The attendee picker, filled by the engine with the attendees.
     hana.window->popAttendeeList(popup);
-    ASSERT_TRUE(RunUntil([] {
+    ASSERT_TRUE(QTest::qWaitFor([] {
         return ChatSelectAttdControl::instance() &&
                ChatSelectAttdControl::instance()->dataSource()->numberOfRowsInTableView() == 1;
     }));

@@ -6,6 +6,7 @@
 #include <QFileDialog>
 #include <QFileInfo>
 #include <QMessageBox>
+#include <QTest>
 #include <QTimer>
 #include <thread>
 
@@ -41,10 +42,10 @@ TEST(QtRunLoop, PostsFromAnyThreadAndTimersRunLaterOnTheLoopThreadUntilCancelled
     });
     loop.CancelTimer(loop.AddTimer(0.001, 0, [] { FAIL() << "cancelled timer fired"; }));
     EXPECT_TRUE(order.empty());
-    RunUntil([&] { return order.size() == 2 && repeats >= 3 && once == 1; });
+    ASSERT_TRUE(QTest::qWaitFor([&] { return order.size() == 2 && repeats >= 3 && once == 1; }));
     bool settled = false;  // no firing is left over afterwards
     QTimer::singleShot(20, [&settled] { settled = true; });
-    RunUntil([&settled] { return settled; });
+    ASSERT_TRUE(QTest::qWaitFor([&settled] { return settled; }));
     EXPECT_EQ(order, (std::vector<int>{1, 2}));
     EXPECT_EQ(ranOn, std::this_thread::get_id());
     EXPECT_EQ(once, 1);

@@ -37,7 +37,6 @@ TEST_F(WindowTest, InsertAndRebuildMakeRowsWithoutReportingASelection) {
 TEST_F(WindowTest, ThePopupShowsTheEnginesNewSelectionsOrNothing) {
     Rebuild({Entry("Everyone", 15), Entry("Ann"), Entry("Bob")});
     EXPECT_EQ(Selected(), -1);
-    EXPECT_TRUE(window->userlist()->currentText().isEmpty());
     MenuStatus bob = Entry("Bob");
     bob.bSelected = true;
     Rebuild({Entry("Everyone", 15), SeparatorEntry(), Entry("Ann"), bob});

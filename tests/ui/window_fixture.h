@@ -5,7 +5,6 @@
 #include <gtest/gtest.h>
 
 #include <QApplication>
-#include <QElapsedTimer>
 #include <QWidget>
 #include <functional>
 #include <memory>
@@ -55,16 +54,6 @@ inline MenuStatus SeparatorEntry(const std::string& title = "") {
     MenuStatus entry = Entry(title);
     entry.bSeparator = true;
     return entry;
-}
-
-// Runs Qt events until done() holds or about six seconds passed; whether it holds.
-template <typename Done>
-bool RunUntil(Done done) {
-    QElapsedTimer clock;
-    clock.start();
-    while (!done() && clock.elapsed() < 6000)
-        QApplication::processEvents(QEventLoop::AllEvents, 5);
-    return done();
 }
 
 class WindowTest : public testing::Test {
