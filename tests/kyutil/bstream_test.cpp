@@ -75,7 +75,7 @@ TEST(ByteStreamValues, MostSignificantByteFirstInStreamsAndAtOffsets) {
                        S::ReadDouble);
 }
 
-TEST(ByteStream, StringFormCountsTheTerminator) {
+TEST(ByteStream, StringFormCountsTheTerminatorAndRefusedStringsKeepThePosition) {
     uint8_t buffer[32] = {};
     CByteStream out(buffer, sizeof(buffer));
     out.WriteString("");
@@ -89,6 +89,20 @@ TEST(ByteStream, StringFormCountsTheTerminator) {
     EXPECT_EQ(9u, in.Tell());
     EXPECT_STREQ("ab", TakeString(in).get());
     EXPECT_FALSE(in.Failed());
+
+    // Refused strings keep the position.
+    const Bytes cases[] = {
+        {0, 0, 0},                  // the count itself is cut off
+        {0, 0, 0, 9, 'a', 'b', 0},  // the count passes the end
+        {0, 0, 0, 2, 'a', 'b', 0},  // the last counted byte is not the terminator
+    };
+    for (Bytes data : cases) {
+        SCOPED_TRACE(data.size());
+        CByteStream refused(data.data(), static_cast<uint32_t>(data.size()));
+        EXPECT_EQ(nullptr, TakeString(refused).get());
+        EXPECT_EQ(0u, refused.Tell());
+        EXPECT_TRUE(refused.Failed());
+    }
 }
 
 TEST(ByteStream, BoundedStreamRefusesWhatDoesNotFitAndKeepsItsPosition) {
@@ -120,21 +134,6 @@ TEST(ByteStream, GrowsInWholeIncrementsAndKeepsItsData) {
     Bytes expected = first;
     expected.insert(expected.end(), second.begin(), second.end());
     EXPECT_EQ(expected, Contents(out));
-}
-
-TEST(ByteStream, RefusedStringsKeepThePosition) {
-    const Bytes cases[] = {
-        {0, 0, 0},                  // the count itself is cut off
-        {0, 0, 0, 9, 'a', 'b', 0},  // the count passes the end
-        {0, 0, 0, 2, 'a', 'b', 0},  // the last counted byte is not the terminator
-    };
-    for (Bytes data : cases) {
-        SCOPED_TRACE(data.size());
-        CByteStream in(data.data(), static_cast<uint32_t>(data.size()));
-        EXPECT_EQ(nullptr, TakeString(in).get());
-        EXPECT_EQ(0u, in.Tell());
-        EXPECT_TRUE(in.Failed());
-    }
 }
 
 TEST(ByteStream, WithoutStorageOnlyMeasuresAndPositionsPastFourGibibytesDoNotFit) {

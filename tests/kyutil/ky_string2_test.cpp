@@ -23,19 +23,18 @@ TEST(KyString2, NullAndEmptyTextsAreEqualAndOtherwiseEveryByteCounts) {
     EXPECT_TRUE(text.Equals(static_cast<const char*>(nullptr)));
 }
 
-TEST(KyString2, LongTextsAreCutTo65535Bytes) {
+TEST(KyString2, CopiesAreCutTo65535BytesAndMayTakeTheirOwnText) {
     std::string longText(70000, 'x');
     longText[65534] = 'y';
-    const CKyString2 text(longText.c_str());
+    CKyString2 text(longText.c_str());
     ASSERT_EQ(65535, text.GetLength());
     EXPECT_EQ(65535u, std::strlen(text.GetData()));
     EXPECT_TRUE(text.Equals(longText.substr(0, 65535).c_str()));
     EXPECT_FALSE(text.Equals(longText.c_str()));
     EXPECT_TRUE(text.Equals(CKyString2(text)));
-}
 
-TEST(KyString2, CopyingItsOwnTextIsSafe) {
-    CKyString2 text("hello");
+    // Copying its own text, or a part of it, is safe.
+    text.CopyFrom("hello");
     text.CopyFrom(text.GetData());
     EXPECT_STREQ("hello", text.GetData());
     text.CopyFrom(text);

@@ -48,7 +48,7 @@ TEST(KyVector, AddRemoveAndLookupUseTheFirstOccurrenceAndMoveTheTail) {
     EXPECT_EQ(nullptr, v.GetData());
 }
 
-TEST(KyVector, InsertAtMovesTheTailUpAndAFullVectorGrowsByThirtyTwoSlots) {
+TEST(KyVector, InsertAtMovesTheTailUpOrRefusesAndAFullVectorGrowsByThirtyTwoSlots) {
     CKyVector v = Of({1, 2});
     EXPECT_EQ(1, v.InsertAt(0, Item(0)));
     EXPECT_EQ(1, v.InsertAt(2, Item(9)));
@@ -70,23 +70,22 @@ TEST(KyVector, InsertAtMovesTheTailUpAndAFullVectorGrowsByThirtyTwoSlots) {
                   Numbers(Of({0,  1,  2,  3,  4,  5,  6,  7,  8,  9,  10, 11, 12, 13, 14, 15, 16,
                               17, 18, 19, 20, 21, 22, 23, 24, 25, 26, 27, 28, 29, 30, 31, 32})));
     }
-}
 
-TEST(KyVector, OutOfRangeIndexesAreRefusedAndReported) {
-    CKyVector v = Of({1, 2});
+    // Indexes out of range are refused and reported.
+    CKyVector two = Of({1, 2});
     DebugOutputCapture capture;
-    EXPECT_EQ(0, v.InsertAt(-1, Item(9)));
-    EXPECT_EQ(0, v.InsertAt(3, Item(9)));
-    EXPECT_EQ(0, v.SetAt(-1, Item(9)));
-    EXPECT_EQ(0, v.SetAt(2, Item(9)));
-    EXPECT_EQ((std::vector<int>{1, 2}), Numbers(v));
+    EXPECT_EQ(0, two.InsertAt(-1, Item(9)));
+    EXPECT_EQ(0, two.InsertAt(3, Item(9)));
+    EXPECT_EQ(0, two.SetAt(-1, Item(9)));
+    EXPECT_EQ(0, two.SetAt(2, Item(9)));
+    EXPECT_EQ((std::vector<int>{1, 2}), Numbers(two));
     const std::string insert =
         "Assert -- nIndex >= 0 && nIndex <= m_nUsed in InsertAt of newutil/macutil\n";
     const std::string set =
         "Assert -- nIndex >= 0 && nIndex < m_nUsed in SetAt of newutil/macutil\n";
     EXPECT_EQ((std::vector<std::string>{insert, insert, set, set}), capture.Texts());
-    EXPECT_EQ(1, v.SetAt(1, Item(9)));
-    EXPECT_EQ((std::vector<int>{1, 9}), Numbers(v));
+    EXPECT_EQ(1, two.SetAt(1, Item(9)));
+    EXPECT_EQ((std::vector<int>{1, 9}), Numbers(two));
 }
 
 TEST(KyVector, CopiesHoldTheSamePointersInTheirOwnArrays) {

@@ -9,10 +9,6 @@
 
 namespace {
 
-std::string WithType(const std::string& type) {
-    return "<chat ver=\"1.0\"><mtype>" + type + "</mtype></chat>";
-}
-
 const char kGroupMessageBody[] =
     "<mtype>3</mtype><sendid>1</sendid><groupid>15</groupid><message><![CDATA[hi]]></message>";
 
@@ -21,8 +17,9 @@ const char kGroupMessageBody[] =
 TEST(Envelope, PduTypeIsTheMainTypeFrom1To11AndElse0) {
     const CKvoChatXMLPDU pdu;
     for (int type = 0; type <= 12; ++type) {
-        const int expected = type >= 1 && type <= 11 ? type : 0;
-        EXPECT_EQ(pdu.GetPDUType(WithType(std::to_string(type))), expected) << type;
+        const std::string text =
+            "<chat ver=\"1.0\"><mtype>" + std::to_string(type) + "</mtype></chat>";
+        EXPECT_EQ(pdu.GetPDUType(text), type >= 1 && type <= 11 ? type : 0) << type;
     }
     const std::tuple<const char*, int> cases[] = {
         {"", 0},

@@ -13,7 +13,7 @@ float Width(const ChatMenuItem& item) {
 }
 
 // A title that fits is shown whole, in the colour of the item's state at the last compression.
-TEST(ChatMenuItem, TitleThatFitsIsShownWholeInTheColourOfItsState) {
+TEST(ChatMenuItem, TitleThatFitsOrHasNoRoomIsShownWholeInTheColourOfItsState) {
     ChatMenuItem item("Ann", ChatItemAction::Select);
     item.compressTitlewithWidth(300);
     EXPECT_EQ(item.text(), "Ann");
@@ -24,6 +24,15 @@ TEST(ChatMenuItem, TitleThatFitsIsShownWholeInTheColourOfItsState) {
     EXPECT_EQ(item.foreground().color(), QColor(Qt::black));
     item.compressTitlewithWidth(300);
     EXPECT_EQ(item.foreground().color(), QColor(Qt::gray));
+
+    // No room at all leaves the title whole but marks it shortened.
+    ChatMenuItem group("All Attendees (internal)", ChatItemAction::Select);
+    group.setIsGroup(true);
+    group.setFullTitle("All Attendees (internal)");
+    group.compressTitlewithWidth(40.0f - 40.0f);
+    EXPECT_TRUE(group.isCompressed());
+    EXPECT_EQ(group.text(), "All Attendees (internal)");
+    EXPECT_EQ(group.toolTip(), "All Attendees (internal)");
 }
 
 TEST(ChatMenuItem, LongTitleIsShortenedWithAnEllipsisToFit) {
@@ -38,16 +47,6 @@ TEST(ChatMenuItem, LongTitleIsShortenedWithAnEllipsisToFit) {
         EXPECT_LT(Width(item), width);
         EXPECT_EQ(item.toolTip(), name);
     }
-}
-
-TEST(ChatMenuItem, NoRoomLeavesTheTitleWholeButMarksItShortened) {
-    ChatMenuItem item("All Attendees (internal)", ChatItemAction::Select);
-    item.setIsGroup(true);
-    item.setFullTitle("All Attendees (internal)");
-    item.compressTitlewithWidth(40.0f - 40.0f);
-    EXPECT_TRUE(item.isCompressed());
-    EXPECT_EQ(item.text(), "All Attendees (internal)");
-    EXPECT_EQ(item.toolTip(), "All Attendees (internal)");
 }
 
 TEST(ChatMenuItem, SuffixWithACommaIsCutAtTheCommaAndTheNameShortened) {

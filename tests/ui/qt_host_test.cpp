@@ -12,7 +12,7 @@
 
 namespace {
 
-TEST(QtHost, FindsTheApplicationLoopOnItsThreadOnly) {
+TEST(QtHost, FindsTheApplicationLoopOnItsThreadOnlyAndMakesTheQtWindowByDefault) {
     RunLoop::SetToolkitLoopFinder(QtApplicationRunLoop);
     ASSERT_EQ(RunLoop::Current(), nullptr);
     RunLoop* loop = RunLoop::FindCurrent();
@@ -25,9 +25,8 @@ TEST(QtHost, FindsTheApplicationLoopOnItsThreadOnly) {
     RunLoop::SetCurrent(nullptr);
     RunLoop::SetToolkitLoopFinder(nullptr);
     EXPECT_EQ(RunLoop::FindCurrent(), nullptr);
-}
 
-TEST(QtHost, DefaultFactoryMakesTheQtWindowInTheParentView) {
+    // The default window factory makes the Qt window in the parent view.
     SetDefaultChatWindowFactory(MakeQtChatWindow);
     QWidget parent;
     ChatUIHandle window = nullptr;
