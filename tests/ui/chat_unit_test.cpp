@@ -54,7 +54,7 @@ TEST(ChatUnit, SplitsIntoAlternatingRuns) {
     // Without URL-like content (a dot but no prefix, a prefix but no dot) the message is one
     // run, whatever it holds.
     EXPECT_EQ(Runs("a b.c  d"), (std::vector<UnitRun>{{"a b.c  d", false}}));
-    EXPECT_EQ(Runs("see www now"), (std::vector<UnitRun>{{"see www now", false}}));
+    EXPECT_EQ(Runs("see http://x now"), (std::vector<UnitRun>{{"see http://x now", false}}));
     EXPECT_TRUE(Runs(nullptr).empty());
     EXPECT_FALSE(CChatUnit::IsHaveUrlContent(nullptr));
 }
