@@ -19,6 +19,10 @@ Strings Scoped(const std::string& text, Strings inner = {}) {
     return inner;
 }
 
+constexpr const char* kCustomerId =
+    "<chat ver=\"1.0\"><mtype>11</mtype><customerid>5</customerid></chat>";
+constexpr const char* kFaqMacros = "<chat ver=\"1.0\"><mtype>8</mtype><fname>Ann</fname></chat>";
+
 const Strings kCleanup =
     Scoped("CChatClient::Cleanup", {"CChatClient::ape detach", "CChatClient::conference leave",
                                     "CChatClient::destroy", "CChatClient::after destroy"});
@@ -45,22 +49,17 @@ TEST(LogTexts, SessionWalkAndHostCommands) {
     VirtualRunLoop loop;
     ScopedCurrentRunLoop current{&loop};
     InProcessConference conference;
-    const std::string initialize = "CChatClient::Initialize";
     // Each step: whether the engine was started on a conference before the capture begins,
     // what it does, and the lines it logs.
     const std::tuple<const char*, bool, std::function<void(Engine&)>, Strings> steps[] = {
         {"Initialize", false,
-         [](Engine& e) {
-             ChatData data{};
-             data.lpszUserName = "Alice";
-             e->Initialize(data);
-         },
-         Scoped(initialize, {"Enter CChatClient::ShowChatUI, bShow = 1",
-                             "Enter CChatClient::SetChatPanelUI inState = -1",
-                             "Leave CChatClient::SetChatPanelUI inState = -1",
-                             "Leave CChatClient::ShowChatUI, bShow = 1",
-                             "Enter CChatClient::SetChatPanelUI inState = 0",
-                             "Leave CChatClient::SetChatPanelUI inState = 0"})},
+         [](Engine& e) { e->Initialize(chatroom::StartRecord(nullptr, 0, 0, "Alice", 0, 0)); },
+         Scoped("CChatClient::Initialize", {"Enter CChatClient::ShowChatUI, bShow = 1",
+                                            "Enter CChatClient::SetChatPanelUI inState = -1",
+                                            "Leave CChatClient::SetChatPanelUI inState = -1",
+                                            "Leave CChatClient::ShowChatUI, bShow = 1",
+                                            "Enter CChatClient::SetChatPanelUI inState = 0",
+                                            "Leave CChatClient::SetChatPanelUI inState = 0"})},
         {"attach confirmation", false, [](Engine& e) { e->ApeAttachConfirm(5, 0, 33); },
          Scoped("CChatClient::::ApeAttachConfirm, ape_handle = 5, result = 0, userId = 33",
                 Scoped("CChatClient::Enroll"))},
@@ -82,16 +81,9 @@ TEST(LogTexts, SessionWalkAndHostCommands) {
          Scoped("CChatClient::SetSourndIncomingChat, inSoundWork = 2")},
         {"SetSoundFSSpec", false, [](Engine& e) { e->SetSoundFSSpec(FSRef{}); },
          Scoped("CChatClient::SetSoundFSSpec")},
-        {"customer id configuration", false,
-         [](Engine& e) {
-             e->SetConfig(3,
-                          "<chat ver=\"1.0\"><mtype>11</mtype><customerid>5</customerid></chat>");
-         },
+        {"customer id configuration", false, [](Engine& e) { e->SetConfig(3, kCustomerId); },
          Scoped("CChatClient::HandleCustomerIdConfig()")},
-        {"FAQ macro configuration", false,
-         [](Engine& e) {
-             e->SetConfig(2, "<chat ver=\"1.0\"><mtype>8</mtype><fname>Ann</fname></chat>");
-         },
+        {"FAQ macro configuration", false, [](Engine& e) { e->SetConfig(2, kFaqMacros); },
          Scoped("CChatClient::HandleFAQMacroInfoConfig()")},
     };
     std::uint32_t node = 7;
