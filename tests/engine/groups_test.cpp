@@ -3,6 +3,7 @@
 #include <cstring>
 #include <memory>
 #include <string>
+#include <tuple>
 #include <utility>
 #include <vector>
 
@@ -122,26 +123,23 @@ TEST(CUsersGroup, SetGroupRefusesIncompleteOrLyingData) {
 }
 
 TEST(CUsersGroup, FlagSchemesStoreWholeOrUnpacked) {
-    struct Case {
-        std::uint32_t value;
-        bool packed;
-        std::uint32_t flags, bit1, bit2, bit3;
-        bool listed;
-    };
-    const Case cases[] = {
-        {0x1F, false, 0x1F, 0, 1, 0, true},  // first scheme: whole value, bits untouched
-        {0x0B, true, 1, 1, 0, 1, false},
-        {0x14, true, 0, 0, 1, 0, true},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.value);
+    // Each case: value, packed; the flags, the three bits and whether the group is listed.
+    const std::tuple<std::uint32_t, bool, std::uint32_t, std::uint32_t, std::uint32_t,
+                     std::uint32_t, bool>
+        cases[] = {
+            {0x1F, false, 0x1F, 0, 1, 0, true},  // first scheme: whole value, bits untouched
+            {0x0B, true, 1, 1, 0, 1, false},
+            {0x14, true, 0, 0, 1, 0, true},
+        };
+    for (const auto& [value, packed, flags, bit1, bit2, bit3, listed] : cases) {
+        SCOPED_TRACE(value);
         CUsersGroup group;
-        group.SetFlags(c.value, c.packed);
-        EXPECT_EQ(group.GetFlags(), c.flags);
-        EXPECT_EQ(group.GetFlagBit1(), c.bit1);
-        EXPECT_EQ(group.GetFlagBit2(), c.bit2);
-        EXPECT_EQ(group.GetFlagBit3(), c.bit3);
-        EXPECT_EQ(group.IsListed(), c.listed);
+        group.SetFlags(value, packed);
+        EXPECT_EQ(group.GetFlags(), flags);
+        EXPECT_EQ(group.GetFlagBit1(), bit1);
+        EXPECT_EQ(group.GetFlagBit2(), bit2);
+        EXPECT_EQ(group.GetFlagBit3(), bit3);
+        EXPECT_EQ(group.IsListed(), listed);
     }
 }
 
@@ -165,27 +163,21 @@ TEST(CUsersGroupList, GroupInfoLookUpsTakeTheFirstGroupOrTheFirstNamelessOne) {
         {1, nullptr},         {4, nullptr},  {4, "Panel"}};
     for (const auto& g : groups)
         Append(list, MakeGroup(1, g.first, g.second));
-    struct Case {
-        bool second;  // GetGroupInfo2
-        std::uint32_t type, id;
-        const char* name;
-        std::int32_t found;  // the index, -1 for none
-    };
-    const Case cases[] = {
+    // Each case: GetGroupInfo2 (else GetGroupInfo), type, id, name; the index found, -1 for none.
+    const std::tuple<bool, std::uint32_t, std::uint32_t, const char*, std::int32_t> cases[] = {
         {false, 1, 8, "all ATTENDEES", 0}, {false, 1, 8, nullptr, 0},
         {false, 1, 8, "Second", -1},       {false, 1, 4, "Panel", -1},
         {false, 3, 8, nullptr, -1},        {true, 1, 8, nullptr, 1},
         {true, 1, 1, nullptr, 3},          {true, 1, 8, "ALL attendees", 0},
         {true, 1, 8, "Second", -1},        {true, 2, 0, nullptr, -1},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(std::to_string(c.second) + "/" + std::to_string(c.id) + "/" +
-                     (c.name ? c.name : "-"));
+    for (const auto& [second, type, id, name, found] : cases) {
+        SCOPED_TRACE(std::to_string(second) + "/" + std::to_string(id) + "/" + (name ? name : "-"));
         std::int32_t position = 99;
-        const CUsersGroup* group = c.second ? list.GetGroupInfo2(c.type, c.id, c.name, &position)
-                                            : list.GetGroupInfo(c.type, c.id, c.name, &position);
-        EXPECT_EQ(group, c.found < 0 ? nullptr : list.GetGroupByIndex(c.found));
-        EXPECT_EQ(position, c.found);
+        const CUsersGroup* group = second ? list.GetGroupInfo2(type, id, name, &position)
+                                          : list.GetGroupInfo(type, id, name, &position);
+        EXPECT_EQ(group, found < 0 ? nullptr : list.GetGroupByIndex(found));
+        EXPECT_EQ(position, found);
     }
 }
 

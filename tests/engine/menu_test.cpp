@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "engine/menu_model.h"
@@ -25,42 +26,38 @@ constexpr const char* kPanelTail = "---|All Participants 15|---|Select an Attend
 }  // namespace
 
 TEST(InsertChatUserName, PlacesAttendeesByMeetingTypeAndRules) {
-    struct Case {
-        const char* scenario;
-        std::int32_t meetingType;
-        std::uint32_t features;
-        const char* seed;
-        const char* names;  // inserted in order as nodes 201, 202, ...
-        const char* menu;
-        const char* commands;
-    };
-    const Case cases[] = {
-        {"type 1: below All Attendees, case-insensitive, equal titles above", 1, 0,
-         "Host 1|All Attendees 8|All Panelists 4", "bob|Alice|carol|BOB",
-         "Host|All Attendees|Alice|BOB|bob|carol|All Panelists",
-         "insert 2 bob|insert 2 Alice|insert 4 carol|insert 3 BOB"},
-        {"type 2 without All Attendees: appended", 2, 0, "Host 1", "bob|Alice", "Host|bob|Alice",
-         "insert -1 bob|insert -1 Alice"},
-        {"QM: a separator opens the participant section under Everyone", 1, kQM, "", "bob|Alice",
-         "Everyone|---|Alice|bob", "insert -1 ---|insert -1 bob|insert 2 Alice"},
-        {"type 3: attendees fenced between All Participants and the picker", 3, 0, kPanelTail,
-         "bob|Alice",
-         "Host|Presenter|Host & Presenter|---|All Panelists|---|All Participants|---|Alice|bob|---|"
-         "Select an Attendee...",
-         "insert 7 ---|insert 8 bob|insert 8 Alice"},
-        {"type 3 without everyone or attendees entry: appended, no separator", 3, 0, "", "bob",
-         "Host|Presenter|Host & Presenter|---|All Panelists|bob", "insert -1 bob"},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.scenario);
-        MenuHarness h({c.meetingType, false, 0, c.features});
-        h.Seed(c.seed);
+    // Each case: meeting type, features, the seeded groups, the names inserted in order as nodes
+    // 201, 202, ..., and the menu and commands then.
+    const std::tuple<const char*, std::int32_t, std::uint32_t, const char*, const char*,
+                     const char*, const char*>
+        cases[] = {
+            {"type 1: below All Attendees, case-insensitive, equal titles above", 1, 0,
+             "Host 1|All Attendees 8|All Panelists 4", "bob|Alice|carol|BOB",
+             "Host|All Attendees|Alice|BOB|bob|carol|All Panelists",
+             "insert 2 bob|insert 2 Alice|insert 4 carol|insert 3 BOB"},
+            {"type 2 without All Attendees: appended", 2, 0, "Host 1", "bob|Alice",
+             "Host|bob|Alice", "insert -1 bob|insert -1 Alice"},
+            {"QM: a separator opens the participant section under Everyone", 1, kQM, "",
+             "bob|Alice", "Everyone|---|Alice|bob", "insert -1 ---|insert -1 bob|insert 2 Alice"},
+            {"type 3: attendees fenced between All Participants and the picker", 3, 0, kPanelTail,
+             "bob|Alice",
+             "Host|Presenter|Host & Presenter|---|All Panelists|---|All "
+             "Participants|---|Alice|bob|---|"
+             "Select an Attendee...",
+             "insert 7 ---|insert 8 bob|insert 8 Alice"},
+            {"type 3 without everyone or attendees entry: appended, no separator", 3, 0, "", "bob",
+             "Host|Presenter|Host & Presenter|---|All Panelists|bob", "insert -1 bob"},
+        };
+    for (const auto& [scenario, meetingType, features, seed, names, menu, commands] : cases) {
+        SCOPED_TRACE(scenario);
+        MenuHarness h({meetingType, false, 0, features});
+        h.Seed(seed);
         h.Commands();
-        const Strings names = Split(c.names);
-        for (std::size_t i = 0; i < names.size(); ++i)
-            h.engine.InsertChatUserName(names[i].c_str(), 201 + i, 0);
-        EXPECT_EQ(h.Menu(), c.menu);
-        EXPECT_EQ(h.Seen(), c.commands);
+        const Strings inserted = Split(names);
+        for (std::size_t i = 0; i < inserted.size(); ++i)
+            h.engine.InsertChatUserName(inserted[i].c_str(), 201 + i, 0);
+        EXPECT_EQ(h.Menu(), menu);
+        EXPECT_EQ(h.Seen(), commands);
     }
 }
 
@@ -116,15 +113,9 @@ TEST(SetGroupMenuEnable, TellsOnlyOfChangesAndAnInsertReplacesADisabledSelection
 }
 
 TEST(RemoveChatUserName, TidiesSeparatorsAndFallsBack) {
-    struct Case {
-        const char* scenario;
-        bool selector;
-        const char* seed;
-        bool disableEveryone;
-        const char* menu;
-        const char* commands;
-    };
-    const Case cases[] = {
+    // Each case: the attendee picker, the seeded groups, everyone disabled; the menu and the
+    // commands once bob, selected, is gone.
+    const std::tuple<const char*, bool, const char*, bool, const char*, const char*> cases[] = {
         {"selected entry gone: the everyone entry takes over", false,
          "All Participants 15|All Attendees 8", false, "*All Participants|All Attendees",
          "remove 2|select 0"},
@@ -136,17 +127,17 @@ TEST(RemoveChatUserName, TidiesSeparatorsAndFallsBack) {
         {"with the attendee picker the trailing separator stays", true, "All Attendees 8|---",
          false, "*All Attendees|---", "remove 1|select 0"},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.scenario);
-        MenuHarness h({1, c.selector});
-        h.Seed(c.seed);
+    for (const auto& [scenario, selector, seed, disableEveryone, menu, commands] : cases) {
+        SCOPED_TRACE(scenario);
+        MenuHarness h({1, selector});
+        h.Seed(seed);
         h.engine.InsertChatUserName("bob", 201, 0);
-        if (c.disableEveryone) h.engine.SetGroupMenuEnable(15, false);
+        if (disableEveryone) h.engine.SetGroupMenuEnable(15, false);
         h.engine.SelectMenuItemByIndex(h.engine.GetIndexOfMenuByNodeID(201));
         h.Commands();
         h.engine.RemoveChatUserName("bob", 201, 0);
-        EXPECT_EQ(h.Menu(), c.menu);
-        EXPECT_EQ(h.Seen(), c.commands);
+        EXPECT_EQ(h.Menu(), menu);
+        EXPECT_EQ(h.Seen(), commands);
     }
 }
 
@@ -165,49 +156,46 @@ TEST(RemoveChatUserNameInQM, SelectedEntryLeavesAsDepartedAudience) {
 
 TEST(RemoveChatUserNameInQM, RoleEntryGoesOnlyWhenSelectedAndTakesItsSeparatorAlong) {
     const std::string logged = "CChatClient::RemoveChatUserNameInQM,";
-    struct Case {
-        const char* scenario;
-        std::int32_t meetingType;  // 1 brings the everyone entry, 2 does not
-        std::uint32_t host, presenter;
-        int selected;     // index selected before the node leaves
-        const char* log;  // hank's entry's selected status and index / the separator's index
-        const char* seed;
-        const char* menu;
-        const char* commands;
-    };
-    const Case cases[] = {
-        {"host entry selected, the local participant presents: separator above goes", 1, 300,
-         kMyNode, 2, "1,its index is 2/1", "---|Host 1|Presenter 2", "Everyone|Presenter",
-         "left 2|input 0|remove 1"},
-        {"host entry not selected: it stays", 1, 300, kMyNode, 0, "0,its index is 2/",
-         "---|Host 1|Presenter 2", "*Everyone|---|hank (Host)|Presenter", ""},
-        {"host entry selected, the presenter is someone else: separator stays", 1, 300, 301, 2,
-         "1,its index is 2/", "---|Host 1|Presenter 2", "Everyone|---|Presenter", "left 2|input 0"},
-        {"presenter entry selected with no host known", 1, 0, 300, 2, "1,its index is 2/1",
-         "---|Presenter 2", "Everyone", "left 2|input 0|remove 1"},
-        {"combined entry at the top: the separator now at the top goes", 2, 300, 300, 0,
-         "1,its index is 0/0", "Host & Presenter 3|---|All Attendees 8", "All Attendees",
-         "left 0|input 0|remove 0"},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.scenario);
+    // Each case: meeting type (1 brings the everyone entry, 2 does not), host and presenter
+    // nodes, the index selected before hank leaves, the logged selected status and index of his
+    // entry / index of the separator removed with it, the seeded groups, the menu and commands.
+    const std::tuple<const char*, std::int32_t, std::uint32_t, std::uint32_t, int, const char*,
+                     const char*, const char*, const char*>
+        cases[] = {
+            {"host entry selected, the local participant presents: separator above goes", 1, 300,
+             kMyNode, 2, "1,its index is 2/1", "---|Host 1|Presenter 2", "Everyone|Presenter",
+             "left 2|input 0|remove 1"},
+            {"host entry not selected: it stays", 1, 300, kMyNode, 0, "0,its index is 2/",
+             "---|Host 1|Presenter 2", "*Everyone|---|hank (Host)|Presenter", ""},
+            {"host entry selected, the presenter is someone else: separator stays", 1, 300, 301, 2,
+             "1,its index is 2/", "---|Host 1|Presenter 2", "Everyone|---|Presenter",
+             "left 2|input 0"},
+            {"presenter entry selected with no host known", 1, 0, 300, 2, "1,its index is 2/1",
+             "---|Presenter 2", "Everyone", "left 2|input 0|remove 1"},
+            {"combined entry at the top: the separator now at the top goes", 2, 300, 300, 0,
+             "1,its index is 0/0", "Host & Presenter 3|---|All Attendees 8", "All Attendees",
+             "left 0|input 0|remove 0"},
+        };
+    for (const auto& [scenario, type, host, presenter, selected, log, seed, menu, commands] :
+         cases) {
+        SCOPED_TRACE(scenario);
         // The holders are set before QM mode starts, so the seeded role entries are the only
         // ones (under QM rules a role change brings its own).
-        MenuHarness h({c.meetingType});
-        h.engine.OnHostChanged(c.host);
-        h.engine.OnPresenterChanged(c.presenter);
+        MenuHarness h({type});
+        h.engine.OnHostChanged(host);
+        h.engine.OnPresenterChanged(presenter);
         h.engine.SelectFeature(kQM, 0, 0, 0, 0, nullptr);
-        h.Seed(c.seed);
+        h.Seed(seed);
         h.Enroll({{300, "hank", ROLE_HOST}});
-        h.engine.SelectMenuItemByIndexInQM(c.selected);
+        h.engine.SelectMenuItemByIndexInQM(selected);
         h.Commands();
         TraceCapture trace;
         h.Leave({300, "hank", ROLE_HOST});
-        EXPECT_EQ(h.Menu(), c.menu);
-        EXPECT_EQ(h.Seen(), c.commands);
+        EXPECT_EQ(h.Menu(), menu);
+        EXPECT_EQ(h.Seen(), commands);
         EXPECT_EQ(Traced(trace, logged + "user[node is 300] selected status ") + "/" +
                       Traced(trace, logged + "remove spe line,its index is "),
-                  c.log);
+                  log);
     }
 }
 
@@ -317,21 +305,17 @@ TEST(SelectUserByNodeID, FollowsRolesEntriesAndTestOnly) {
     ASSERT_EQ(h.Menu(), "Host|Presenter|All Attendees|ann");
     h.Commands();
 
-    struct Case {
-        std::uint32_t node;
-        bool testOnly, select, result;
-        const char* commands;
-    };
-    const Case cases[] = {
+    // Each case: node, test only, select; the result and the commands.
+    const std::tuple<std::uint32_t, bool, bool, bool, const char*> cases[] = {
         {300, false, true, true, "select 0"}, {301, false, true, true, "select 1"},
         {201, false, true, true, "select 3"}, {201, false, true, true, ""},
         {300, true, true, true, ""},          {201, false, false, false, ""},
         {202, true, true, false, ""},         {999, false, true, false, ""},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.node);
-        EXPECT_EQ(h.engine.SelectUserByNodeID(c.node, c.testOnly, c.select), c.result);
-        EXPECT_EQ(h.Seen(), c.commands);
+    for (const auto& [node, testOnly, select, result, commands] : cases) {
+        SCOPED_TRACE(node);
+        EXPECT_EQ(h.engine.SelectUserByNodeID(node, testOnly, select), result);
+        EXPECT_EQ(h.Seen(), commands);
     }
     EXPECT_TRUE(h.engine.CanChatWith(301, false));
     h.engine.SetGroupMenuEnable(2, false);
@@ -383,26 +367,22 @@ TEST(EveryoneOnly, SelectionAlwaysLandsOnEveryone) {
 }
 
 TEST(ExternalInternalTags, MarkFollowsTheTaggingMode) {
-    struct Case {
-        std::int32_t mode;
-        std::uint32_t tag;
-        const char* title;
-        const char* mark;
-    };
-    const Case cases[] = {{0, 1, "ann", ""},
-                          {1, 1, "ann (internal)", ", internal"},
-                          {1, 2, "ann", ""},
-                          {2, 2, "ann (external)", ", external"},
-                          {2, 1, "ann", ""}};
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.title);
-        MenuHarness h({1, false, c.mode});
+    // Each case: tagging mode, tag; ann's title and the mark's text.
+    const std::tuple<std::int32_t, std::uint32_t, const char*, const char*> cases[] = {
+        {0, 1, "ann", ""},
+        {1, 1, "ann (internal)", ", internal"},
+        {1, 2, "ann", ""},
+        {2, 2, "ann (external)", ", external"},
+        {2, 1, "ann", ""}};
+    for (const auto& [mode, tag, title, mark] : cases) {
+        SCOPED_TRACE(title);
+        MenuHarness h({1, false, mode});
         h.engine.OnHostChanged(300);
         h.Seed("All Attendees 8");
-        h.Enroll({{201, "ann", 0, c.tag}, {300, "hank", ROLE_HOST, c.tag}});
-        h.engine.InsertExternalInternalChatUserName("hank", 300, c.tag);  // hosts go unmarked
-        EXPECT_EQ(h.Menu(), "All Attendees|" + std::string(c.title) + "|hank");
-        EXPECT_EQ(h.engine.GetUserExternalInternalString(c.tag, 1), c.mark);
+        h.Enroll({{201, "ann", 0, tag}, {300, "hank", ROLE_HOST, tag}});
+        h.engine.InsertExternalInternalChatUserName("hank", 300, tag);  // hosts go unmarked
+        EXPECT_EQ(h.Menu(), "All Attendees|" + std::string(title) + "|hank");
+        EXPECT_EQ(h.engine.GetUserExternalInternalString(tag, 1), mark);
     }
 }
 

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "tests/engine/menu_harness.h"
@@ -77,56 +78,57 @@ Strings Apply(MenuHarness& h, std::int32_t type, Own own, unsigned setup, std::u
 }  // namespace
 
 TEST(PrivilegePolicy, MenuInputAndSendToListFollowRolesAndWord) {
-    struct Case {
-        const char* scenario;
-        std::int32_t type;
-        Own own;
-        unsigned setup;
-        std::uint32_t word;
-        const char* outcome;
-        const char* menu;
-    };
-    const Case cases[] = {
-        {"type 1 host: every group entry on whatever the word", 1, kHostRole, 0, 0, "1 on",
-         "Host|Presenter|Host & Presenter|All Panelists|pat|All Attendees|ann|*All Participants"},
-        {"type 1 presenter before any host: role entries off", 1, kPresenter, 0, 0x40, "1 on",
-         "~Host|~Presenter|~Host & Presenter|All Panelists|pat|All Attendees|ann|*All "
-         "Participants"},
-        {"type 1 attendee, host only", 1, kAttendee, kHostKnown, 0x2, "1 on",
-         "*Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|~All Participants"},
-        {"type 1 attendee, private: entries, input by them", 1, kAttendee, kHostKnown, 0x8, "1 on",
-         "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All Participants"},
-        // The audience chosen before stays marked, disabled; the window clears the input.
-        {"type 1 attendee, nothing at all", 1, kAttendee, kHostKnown, 0, "0 off",
-         "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*~All Participants"},
-        {"type 1 attendee before the host: attendees allowed", 1, kAttendee, 0, 0, "1 on",
-         "~Host|~Presenter|~Host & Presenter|~All Panelists|*All Attendees|~All Participants"},
-        {"type 1 attendee before the host, picker: no attendees", 1, kAttendee, kPicker, 0, "0 off",
-         "~Host|~Presenter|~Host & Presenter|*~All Panelists|~All Attendees|~All Participants"},
-        {"type 1 attendee, all but panelists: everyone off", 1, kAttendee, kHostKnown, 0x7, "1 on",
-         "*Host|Presenter|Host & Presenter|~All Panelists|All Attendees|~All Participants"},
-        {"type 1 attendee, all: panelists listed", 1, kAttendee, kHostKnown, 0x4F, "1 on",
-         "Host|Presenter|Host & Presenter|All Panelists|hank|pat|All Attendees|ann|*All "
-         "Participants"},
-        {"type 2 panelist, nothing: its role keeps input", 2, kPanelist, kHostKnown, 0, "1 on",
-         "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All Participants"},
-        {"type 3 attendee, attendees without private chat", 3, kAttendee, kHostKnown, 0x1, "0 off",
-         "*All Attendees"},
-        {"type 3 panelist, attendees and private: picker", 3, kPanelist, kHostKnown, 0x9, "1 on",
-         "*All Attendees|---|Select an Attendee..."},
-        {"type 3 attendee in practice, host only: none", 3, kAttendee, kHostKnown | kPractice, 0x2,
-         "0 off", ""},
-        {"QM type 1 attendee, everyone only", 1, kAttendee, kQMRules | kHostKnown, 0x10000, "1 on",
-         "*Everyone|~All Panelists|~All Attendees"},
-        {"QM type 1 attendee, host only: titled", 1, kAttendee, kQMRules | kHostKnown, 0x2, "1 on",
-         "*hank (Host)|~All Panelists|~All Attendees"},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.scenario);
-        MenuHarness h({c.type, (c.setup & kPicker) != 0, 0, c.setup & kQMRules ? kQM : 0u});
-        const Strings commands = Apply(h, c.type, c.own, c.setup, c.word);
-        EXPECT_EQ(Marked(h.engine), c.menu);
-        EXPECT_EQ(Outcome(commands), c.outcome);
+    // Each case: meeting type, own role, set-up flags, word; the last input and send-to list
+    // states, and the menu.
+    const std::tuple<const char*, std::int32_t, Own, unsigned, std::uint32_t, const char*,
+                     const char*>
+        cases[] = {
+            {"type 1 host: every group entry on whatever the word", 1, kHostRole, 0, 0, "1 on",
+             "Host|Presenter|Host & Presenter|All Panelists|pat|All Attendees|ann|*All "
+             "Participants"},
+            {"type 1 presenter before any host: role entries off", 1, kPresenter, 0, 0x40, "1 on",
+             "~Host|~Presenter|~Host & Presenter|All Panelists|pat|All Attendees|ann|*All "
+             "Participants"},
+            {"type 1 attendee, host only", 1, kAttendee, kHostKnown, 0x2, "1 on",
+             "*Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|~All Participants"},
+            {"type 1 attendee, private: entries, input by them", 1, kAttendee, kHostKnown, 0x8,
+             "1 on",
+             "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All "
+             "Participants"},
+            // The audience chosen before stays marked, disabled; the window clears the input.
+            {"type 1 attendee, nothing at all", 1, kAttendee, kHostKnown, 0, "0 off",
+             "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*~All Participants"},
+            {"type 1 attendee before the host: attendees allowed", 1, kAttendee, 0, 0, "1 on",
+             "~Host|~Presenter|~Host & Presenter|~All Panelists|*All Attendees|~All Participants"},
+            {"type 1 attendee before the host, picker: no attendees", 1, kAttendee, kPicker, 0,
+             "0 off",
+             "~Host|~Presenter|~Host & Presenter|*~All Panelists|~All Attendees|~All Participants"},
+            {"type 1 attendee, all but panelists: everyone off", 1, kAttendee, kHostKnown, 0x7,
+             "1 on",
+             "*Host|Presenter|Host & Presenter|~All Panelists|All Attendees|~All Participants"},
+            {"type 1 attendee, all: panelists listed", 1, kAttendee, kHostKnown, 0x4F, "1 on",
+             "Host|Presenter|Host & Presenter|All Panelists|hank|pat|All Attendees|ann|*All "
+             "Participants"},
+            {"type 2 panelist, nothing: its role keeps input", 2, kPanelist, kHostKnown, 0, "1 on",
+             "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All "
+             "Participants"},
+            {"type 3 attendee, attendees without private chat", 3, kAttendee, kHostKnown, 0x1,
+             "0 off", "*All Attendees"},
+            {"type 3 panelist, attendees and private: picker", 3, kPanelist, kHostKnown, 0x9,
+             "1 on", "*All Attendees|---|Select an Attendee..."},
+            {"type 3 attendee in practice, host only: none", 3, kAttendee, kHostKnown | kPractice,
+             0x2, "0 off", ""},
+            {"QM type 1 attendee, everyone only", 1, kAttendee, kQMRules | kHostKnown, 0x10000,
+             "1 on", "*Everyone|~All Panelists|~All Attendees"},
+            {"QM type 1 attendee, host only: titled", 1, kAttendee, kQMRules | kHostKnown, 0x2,
+             "1 on", "*hank (Host)|~All Panelists|~All Attendees"},
+        };
+    for (const auto& [scenario, type, own, setup, word, outcome, menu] : cases) {
+        SCOPED_TRACE(scenario);
+        MenuHarness h({type, (setup & kPicker) != 0, 0, setup & kQMRules ? kQM : 0u});
+        const Strings commands = Apply(h, type, own, setup, word);
+        EXPECT_EQ(Marked(h.engine), menu);
+        EXPECT_EQ(Outcome(commands), outcome);
     }
 }
 
@@ -178,14 +180,9 @@ std::string Subscribed(CChatClient& engine) {
 }
 
 TEST(Practice, EachSideSeesItsAudiencesAndKeepsItsCaches) {
-    struct Case {
-        const char* scenario;
-        Own own;
-        const char* caches;  // before, during and after practice
-        const char* during;
-        const char* after;
-    };
-    const Case cases[] = {
+    // Each case: own role, the caches subscribed before, during and after practice, and the
+    // menus during and after it.
+    const std::tuple<const char*, Own, const char*, const char*, const char*> cases[] = {
         {"attendee with attendees: one entry", kAttendee, " 8 15", "*All Attendees",
          "Host|Presenter|Host & Presenter|---|*All Attendees|All Panelists|hank|pat|---|All "
          "Participants"},
@@ -205,20 +202,20 @@ TEST(Practice, EachSideSeesItsAudiencesAndKeepsItsCaches) {
          "Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|*All "
          "Participants|---|Select an Attendee..."},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.scenario);
+    for (const auto& [scenario, own, caches, during, after] : cases) {
+        SCOPED_TRACE(scenario);
         MenuHarness h({3, false, 0, 0, false, true});
-        Apply(h, 3, c.own, c.own != kHostRole ? kHostKnown : 0, 0x4F);
+        Apply(h, 3, own, own != kHostRole ? kHostKnown : 0, 0x4F);
         h.engine.SubscribeAllGroupCaches();
-        EXPECT_EQ(Subscribed(h.engine), c.caches);
+        EXPECT_EQ(Subscribed(h.engine), caches);
         h.engine.SetPracticeStatus(1);
-        EXPECT_EQ(Marked(h.engine), c.during);
-        EXPECT_EQ(Subscribed(h.engine), c.caches);
+        EXPECT_EQ(Marked(h.engine), during);
+        EXPECT_EQ(Subscribed(h.engine), caches);
         h.Commands();
         h.engine.SetPracticeStatus(1);  // repeating the value does nothing
         EXPECT_EQ(h.Commands(), Strings());
         h.engine.SetPracticeStatus(0);
-        EXPECT_EQ(Marked(h.engine), c.after);
-        EXPECT_EQ(Subscribed(h.engine), c.caches);
+        EXPECT_EQ(Marked(h.engine), after);
+        EXPECT_EQ(Subscribed(h.engine), caches);
     }
 }

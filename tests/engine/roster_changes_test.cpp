@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "pdu/xml_limits.h"
@@ -65,27 +66,21 @@ TEST(ApeRosterChanged, AddsThenDeletesThenModifiesInOneCallback) {
 }
 
 TEST(ProcessAddEnrollInfo, PrivateChatPrivilegeOrHostGivesEntries) {
-    struct Case {
-        const char* scenario;
-        std::int32_t meetingType;
-        std::uint32_t privilege;
-        bool host;
-        const char* menu;
-    };
-    const Case cases[] = {
+    // Each case: meeting type, privilege word, local participant hosts; the menu.
+    const std::tuple<const char*, std::int32_t, std::uint32_t, bool, const char*> cases[] = {
         {"type 1 attendee without private chat", 1, 0x1, false, "All Attendees"},
         {"type 1 attendee with private chat", 1, 0x8, false, "All Attendees|ann"},
         {"type 1 host whatever the privilege", 1, 0, true, "All Attendees|ann"},
         {"type 2 host whatever the privilege", 2, 0, true, "All Attendees|ann"},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.scenario);
-        MenuHarness h({c.meetingType});
-        if (c.host) h.engine.OnHostChanged(kMyNode);
-        h.engine.OnPrivilegeChanged(c.privilege, 0);
+    for (const auto& [scenario, meetingType, privilege, host, menu] : cases) {
+        SCOPED_TRACE(scenario);
+        MenuHarness h({meetingType});
+        if (host) h.engine.OnHostChanged(kMyNode);
+        h.engine.OnPrivilegeChanged(privilege, 0);
         h.Seed("All Attendees 8");
         h.Enroll({{201, "ann"}});
-        EXPECT_EQ(h.Menu(), c.menu);
+        EXPECT_EQ(h.Menu(), menu);
     }
 }
 
@@ -109,12 +104,8 @@ TEST(ProcessAddEnrollInfo, QMHostReturnsToEveryoneForEachArrivalAfterItsOwnRecor
         "|select 0|msg_EnableUserList|input 1|select 0|msg_CloseAttendeeWarning|"
         "msg_CloseAttendeeDialog";
     const std::string bobAgain = "|remove 2|remove 1|insert -1 ---|insert -1 bob";
-    struct Case {
-        const char* scenario;
-        std::vector<Person> report;
-        std::string commands;
-    };
-    const Case cases[] = {
+    // Each case: the people of the report, in order, and the commands.
+    const std::tuple<const char*, std::vector<Person>, std::string> cases[] = {
         {"own record alone", {own}, "select+input 0" + reapplied},
         {"an arrival after the own record",
          {own, bob},
@@ -123,40 +114,35 @@ TEST(ProcessAddEnrollInfo, QMHostReturnsToEveryoneForEachArrivalAfterItsOwnRecor
          {bob, own},
          "insert -1 ---|insert -1 bob|select+input 0" + bobAgain + reapplied},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.scenario);
+    for (const auto& [scenario, people, commands] : cases) {
+        SCOPED_TRACE(scenario);
         MenuHarness h({1, false, 0, FEATURE_QM_MODE});
         h.engine.OnHostChanged(kMyNode);
         h.Commands();
-        h.Enroll(c.report);
-        EXPECT_EQ(h.Seen(), c.commands);
+        h.Enroll(people);
+        EXPECT_EQ(h.Seen(), commands);
         EXPECT_EQ(h.Titles()[0], "*Everyone");
     }
 }
 
 TEST(RosterChanges, BeforeHostChangeReappliesThePrivilegeWithForce) {
-    struct Case {
-        const char* scenario;
-        std::int32_t meetingType;
-        bool modify;         // else an add
-        const char* forces;  // of the re-applications, in order
-        Person person;
-    };
-    const Case cases[] = {
+    // Each case: meeting type, a modify (else an add), the force flags of the re-applications in
+    // order, and who is reported.
+    const std::tuple<const char*, std::int32_t, bool, const char*, Person> cases[] = {
         {"type 3: the host's arrival ends before-host", 3, false, "1", {300, "hank", ROLE_HOST}},
         {"type 3: an attendee's arrival changes nothing", 3, false, "", {201, "ann"}},
         {"type 1: the host's arrival re-applies nothing", 1, false, "", {300, "hank", ROLE_HOST}},
         {"modify to host", 1, true, "1", {201, "ann", ROLE_HOST}},
         {"modify keeping the before-host state", 1, true, "0", {201, "anne"}},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.scenario);
-        MenuHarness h({c.meetingType, false, 0, FEATURE_QM_MODE});
-        if (c.modify) h.Enroll({{201, "ann"}});
+    for (const auto& [scenario, meetingType, modify, forces, person] : cases) {
+        SCOPED_TRACE(scenario);
+        MenuHarness h({meetingType, false, 0, FEATURE_QM_MODE});
+        if (modify) h.Enroll({{201, "ann"}});
         TraceCapture trace;
-        c.modify ? h.Modify(c.person) : h.Enroll({c.person});
+        modify ? h.Modify(person) : h.Enroll({person});
         // The QM trace shows the force flag of each re-application.
-        EXPECT_EQ(Traced(trace, std::string(kPrivilegeReapplied) + ", bDefault = "), c.forces);
+        EXPECT_EQ(Traced(trace, std::string(kPrivilegeReapplied) + ", bDefault = "), forces);
     }
 }
 
@@ -247,35 +233,31 @@ TEST(ExtractEnrollInfo, HostileEnrollDataCannotHurt) {
 TEST(ProcessDeleteEnrollInfo, ParticipantWithoutANodeIdLeavesTheMenuAsItWas) {
     // A report entry for node 0 comes and goes; entry lookups never match node 0 (separators
     // carry it), so it must not get an entry that could not be taken out again.
-    struct Case {
-        const char* scenario;
-        std::uint32_t features;
-        std::uint32_t host;  // the local participant picks node 0 in the attendee picker
-        const char* menu;
-    };
-    const Case cases[] = {
+    // Each case: features, the host (the local participant picks node 0 in the attendee picker),
+    // and the menu.
+    const std::tuple<const char*, std::uint32_t, std::uint32_t, const char*> cases[] = {
         {"normal rules", 0, 300, "All Attendees|---|Host"},
         {"QM rules: the role entries come with the roles", FEATURE_QM_MODE, 300,
          "Everyone|Host|Presenter|All Attendees|---|Host"},
         {"picked by the host", 0, kMyNode, "All Attendees|---|Host"},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.scenario);
-        MenuHarness h({1, c.host == kMyNode, 0, c.features});
-        h.engine.OnHostChanged(c.host);
+    for (const auto& [scenario, features, host, menu] : cases) {
+        SCOPED_TRACE(scenario);
+        MenuHarness h({1, host == kMyNode, 0, features});
+        h.engine.OnHostChanged(host);
         h.engine.OnPresenterChanged(301);
         h.Seed("All Attendees 8|---|Host 1");
         h.Commands();
         h.Enroll({{0, "ghost"}});
-        if (c.host == kMyNode) {
+        if (host == kMyNode) {
             EXPECT_FALSE(h.engine.SelectUserByNodeID(0, false, true));
         }
         EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
-        EXPECT_EQ(h.Menu(), c.menu);
+        EXPECT_EQ(h.Menu(), menu);
         EXPECT_EQ(h.Seen(), "");
         h.Leave({0, "ghost"});
         EXPECT_EQ(h.engine.UserList().GetCount(), 0u);
-        EXPECT_EQ(h.Menu(), c.menu);
+        EXPECT_EQ(h.Menu(), menu);
     }
 }
 

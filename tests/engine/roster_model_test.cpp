@@ -1,6 +1,7 @@
 #include <gtest/gtest.h>
 
 #include <memory>
+#include <tuple>
 
 #include "engine/user_list_manager.h"
 
@@ -44,21 +45,20 @@ TEST(CUserListManager, UnknownNodeGivesNotFoundAndNonStrictPanelistYes) {
 TEST(CUserListManager, RoleQueriesAnswerTheBitValue) {
     CUserListManager list;
     FillRoster(list);
-    struct Case {
-        std::uint32_t node;
-        std::uint32_t host, presenter, attendee, strictPanelist, panelist;
-    };
-    const Case cases[] = {
-        {10, 1, 0, 0, 0, 1}, {20, 0, 2, 0, 0, 1}, {30, 0, 0, 0, 4, 1},
-        {40, 0, 0, 0, 0, 0}, {50, 1, 2, 0, 4, 1},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.node);
-        EXPECT_EQ(list.IsHost(c.node), c.host);
-        EXPECT_EQ(list.IsPresenter(c.node), c.presenter);
-        EXPECT_EQ(list.IsAttendee(c.node), c.attendee);
-        EXPECT_EQ(list.IsPanelist(c.node, true), c.strictPanelist);
-        EXPECT_EQ(list.IsPanelist(c.node, false), c.panelist);
+    // Each case: node; what IsHost, IsPresenter, IsAttendee, strict and loose IsPanelist answer.
+    const std::tuple<std::uint32_t, std::uint32_t, std::uint32_t, std::uint32_t, std::uint32_t,
+                     std::uint32_t>
+        cases[] = {
+            {10, 1, 0, 0, 0, 1}, {20, 0, 2, 0, 0, 1}, {30, 0, 0, 0, 4, 1},
+            {40, 0, 0, 0, 0, 0}, {50, 1, 2, 0, 4, 1},
+        };
+    for (const auto& [node, host, presenter, attendee, strictPanelist, panelist] : cases) {
+        SCOPED_TRACE(node);
+        EXPECT_EQ(list.IsHost(node), host);
+        EXPECT_EQ(list.IsPresenter(node), presenter);
+        EXPECT_EQ(list.IsAttendee(node), attendee);
+        EXPECT_EQ(list.IsPanelist(node, true), strictPanelist);
+        EXPECT_EQ(list.IsPanelist(node, false), panelist);
     }
     UserItem out;
     EXPECT_EQ(list.JudgeRosters(50, 0x6, &out), 6u);

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include "tests/engine/menu_harness.h"
@@ -43,13 +44,8 @@ void Enrolled(CChatClient& engine) {
 }  // namespace
 
 TEST(RosterOps, DefaultGroupsByMeetingTypeAndQMMode) {
-    struct Case {
-        std::int32_t meetingType;
-        std::uint32_t features;
-        const char* groups;
-        const char* menu;
-    };
-    const Case cases[] = {
+    // Each case: meeting type, features; the group list and the menu.
+    const std::tuple<std::int32_t, std::uint32_t, const char*, const char*> cases[] = {
         {3, 0,
          "1:1:Host|1:2:Presenter|1:3:Host & Presenter|2:0:-|1:8:All Attendees|1:4:All "
          "Panelists|2:0:-|1:15:All Participants|2:0:-|1:16:Select an Attendee...",
@@ -58,11 +54,11 @@ TEST(RosterOps, DefaultGroupsByMeetingTypeAndQMMode) {
         {1, FEATURE_QM_MODE, "1:15:Everyone", "Everyone/15"},
         {2, FEATURE_QM_MODE, "", ""},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(std::to_string(c.meetingType) + (c.features ? " QM" : ""));
-        MenuHarness h({c.meetingType, false, 0, c.features});
-        EXPECT_EQ(Groups(h.engine.GroupList()), c.groups);
-        EXPECT_EQ(Entries(h.engine.Menu()), c.menu);
+    for (const auto& [meetingType, features, groups, menu] : cases) {
+        SCOPED_TRACE(std::to_string(meetingType) + (features ? " QM" : ""));
+        MenuHarness h({meetingType, false, 0, features});
+        EXPECT_EQ(Groups(h.engine.GroupList()), groups);
+        EXPECT_EQ(Entries(h.engine.Menu()), menu);
     }
 }
 
@@ -112,53 +108,44 @@ TEST(RosterOps, HostGroupsWithOddValuesStillLandInListAndMenu) {
 }
 
 TEST(RosterOps, GroupSchemesPlaceGroupsAndMarkThemForTheRecording) {
-    struct Case {
-        const char* what;
-        std::uint32_t features;
-        const char* groups;
-        const char* sendGroupInfo;  // each group's mark, in list order
-    };
-    const Case cases[] = {
+    // Each case: features; the group list and each group's mark, in list order.
+    const std::tuple<const char*, std::uint32_t, const char*, const char*> cases[] = {
         // At the index; an index past the end appends.
         {"first scheme", 0, "1:1:HOST|1:8:All Attendees|3:30:ids", "110"},
         // After the group whose sequence number is the index; an unknown one goes to the front.
         {"second scheme", FEATURE_GROUP_SCHEME2, "3:30:ids|1:1:HOST|1:8:All Attendees", "000"},
     };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.what);
+    for (const auto& [scheme, features, groups, marks] : cases) {
+        SCOPED_TRACE(scheme);
         CChatClient other;
-        other.SelectFeature(c.features, 0, 0, 0, 0, nullptr);
+        other.SelectFeature(features, 0, 0, 0, 0, nullptr);
         other.SetNBRStatus(0, 1, 0);  // recorded: new role groups owe their cache a description
         AddGroup(other, 0, 1, 1, "Host", 0);
         AddGroup(other, 1, 1, 8, "All Attendees", 0);
         AddGroup(other, 7, 3, 30, "ids", 0);
         AddGroup(other, 2, 1, 1, "HOST", 0);  // matches the host group, which is updated
-        EXPECT_EQ(Groups(other.GroupList()), c.groups);
+        EXPECT_EQ(Groups(other.GroupList()), groups);
         std::string sendGroupInfo;
         for (std::int32_t i = 0; i < other.GroupList().GetGroupsCount(); ++i)
             sendGroupInfo +=
                 std::to_string(other.GroupList().GetGroupByIndex(i)->GetNeedSendGroupInfo());
-        EXPECT_EQ(sendGroupInfo, c.sendGroupInfo);
+        EXPECT_EQ(sendGroupInfo, marks);
     }
 }
 
 TEST(RosterOps, OwnRolesGainThePanelistBitOutsideMeetingTypeOne) {
-    struct Case {
-        std::int32_t meetingType;
-        std::uint32_t roster;
-        std::uint32_t stored;
-    };
-    const Case cases[] = {
+    // Each case: meeting type, the roles given and the roles stored.
+    const std::tuple<std::int32_t, std::uint32_t, std::uint32_t> cases[] = {
         {3, ROLE_PRESENTER, 6}, {3, ROLE_HOST, 5},      {3, 0, 0}, {3, ROLE_PANELIST, 4},
         {2, ROLE_HOST, 5},      {1, ROLE_PRESENTER, 2}, {1, 3, 3}};
-    for (const Case& c : cases) {
-        SCOPED_TRACE(std::to_string(c.meetingType) + "/" + std::to_string(c.roster));
+    for (const auto& [meetingType, roster, stored] : cases) {
+        SCOPED_TRACE(std::to_string(meetingType) + "/" + std::to_string(roster));
         CChatClient other;
-        other.SetMeetingType(c.meetingType);
-        EXPECT_EQ(other.SetRosters(c.roster, 0), 0);  // not enrolled yet
-        EXPECT_EQ(other.GetMyRosters(), c.stored);
-        EXPECT_EQ(other.SetRosters(c.roster, 1), 1);
-        EXPECT_EQ(other.GetMyRosters(), c.stored);
+        other.SetMeetingType(meetingType);
+        EXPECT_EQ(other.SetRosters(roster, 0), 0);  // not enrolled yet
+        EXPECT_EQ(other.GetMyRosters(), stored);
+        EXPECT_EQ(other.SetRosters(roster, 1), 1);
+        EXPECT_EQ(other.GetMyRosters(), stored);
     }
 }
 
