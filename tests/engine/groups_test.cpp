@@ -91,28 +91,24 @@ TEST(CUsersGroup, SetGroupRefusesIncompleteOrLyingData) {
     Bytes noLabel(kRoleGroupBytes.begin(), kRoleGroupBytes.begin() + 26);
     noLabel.insert(noLabel.end(), {0, 0, 0, 0, 0, 0, 0, 1, 0, 0, 0, 7});
     const Bytes noName = {0, 0, 0, 1, 0, 0, 0, 8, 0, 0, 0, 0};
-    struct Case {
-        const char* what;
-        Bytes data;
-    };
-    std::vector<Case> cases = {{"member count 0", zeroCount},
-                               {"count above the members", lyingCount},
-                               {"count beyond any size", hugeCount},
-                               {"null label", noLabel},
-                               {"null name", noName}};
+    std::vector<std::pair<const char*, Bytes>> cases = {{"member count 0", zeroCount},
+                                                        {"count above the members", lyingCount},
+                                                        {"count beyond any size", hugeCount},
+                                                        {"null label", noLabel},
+                                                        {"null name", noName}};
     // Every cut of the complete group ends too early.
     for (std::size_t size = 1; size < kRoleGroupBytes.size(); ++size)
         cases.push_back(
             {"truncated", Bytes(kRoleGroupBytes.begin(), kRoleGroupBytes.begin() + size)});
-    for (const Case& c : cases) {
-        SCOPED_TRACE(std::string(c.what) + ", size " + std::to_string(c.data.size()));
+    for (const auto& [what, data] : cases) {
+        SCOPED_TRACE(std::string(what) + ", size " + std::to_string(data.size()));
         // The stream may read only the given bytes: a copy on the heap lets a sanitizer see
         // any read past them.
-        std::unique_ptr<unsigned char[]> exact(new unsigned char[c.data.size()]);
-        std::memcpy(exact.get(), c.data.data(), c.data.size());
+        std::unique_ptr<unsigned char[]> exact(new unsigned char[data.size()]);
+        std::memcpy(exact.get(), data.data(), data.size());
         CUsersGroup group;
         group.SetGrpName("old");
-        EXPECT_EQ(group.SetGroup(exact.get(), static_cast<std::uint32_t>(c.data.size())), 0);
+        EXPECT_EQ(group.SetGroup(exact.get(), static_cast<std::uint32_t>(data.size())), 0);
         EXPECT_EQ(group.GetGrpName(), nullptr);
         EXPECT_EQ(group.GetGrpLabel(), nullptr);
         EXPECT_EQ(group.GetMemberCount(), 0);

@@ -389,9 +389,7 @@ TEST(ExternalInternalTags, MarkFollowsTheTaggingMode) {
 TEST(WindowReentry, SelectionReportsFromInsideCommandsEndOnTheRightEntry) {
     // A real window reports the selection (5001) from inside SetSink, before any menu
     // exists, and from inside 2303, 2305 and 2306; the engine takes each report in mid-command.
-    Options normal{1};
-    normal.answerBack = true;
-    MenuHarness h(normal);
+    MenuHarness h({1, false, 0, 0, true});
     h.Seed("All Participants 15|All Attendees 8");
     EXPECT_EQ(h.Commands().front(), "report 0");
     h.Enroll({{201, "bob"}});
@@ -401,9 +399,7 @@ TEST(WindowReentry, SelectionReportsFromInsideCommandsEndOnTheRightEntry) {
     EXPECT_EQ(h.Seen(), "select 2|report 2|remove 2|select 0|report 0");
     EXPECT_EQ(h.Menu(), "*All Participants|All Attendees");
 
-    Options qm{1, false, 0, kQM};
-    qm.answerBack = true;
-    MenuHarness q(qm);
+    MenuHarness q({1, false, 0, kQM, true});
     q.Enroll({{201, "bob"}, {202, "carl"}});
     q.Commands();
     EXPECT_TRUE(q.engine.SelectUserByNodeID(202, false, true));

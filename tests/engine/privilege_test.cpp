@@ -51,16 +51,11 @@ Strings Apply(MenuHarness& h, std::int32_t type, Own own, unsigned setup, std::u
         h.Seed("Host 1|Presenter 2|Host & Presenter 3|All Panelists 4|All Attendees 8");
         if (!(setup & kQMRules)) h.Seed("All Participants 15");
     }
-    std::uint32_t ownRoles = 0;
-    if (own == kPanelist) ownRoles = ROLE_PANELIST;
-    if (own == kPresenter) {
-        h.engine.OnPresenterChanged(kMyNode);
-        ownRoles = ROLE_PRESENTER | ROLE_PANELIST;
-    }
-    if (own == kHostRole) {
-        h.engine.OnHostChanged(kMyNode);
-        ownRoles = ROLE_HOST | ROLE_PANELIST;
-    }
+    const std::uint32_t kRoles[] = {0, ROLE_PANELIST, ROLE_PRESENTER | ROLE_PANELIST,
+                                    ROLE_HOST | ROLE_PANELIST};  // by Own
+    const std::uint32_t ownRoles = kRoles[own];
+    if (own == kPresenter) h.engine.OnPresenterChanged(kMyNode);
+    if (own == kHostRole) h.engine.OnHostChanged(kMyNode);
     h.engine.SetRosters(ownRoles, 1);
     std::vector<Person> people = {
         {kMyNode, "me", ownRoles}, {201, "ann"}, {202, "pat", ROLE_PANELIST}};

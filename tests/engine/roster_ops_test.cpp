@@ -34,13 +34,6 @@ std::string Entries(const MenuStatusList& menu) {
     return Join(entries);
 }
 
-// The service grants the enrolment.
-void Enrolled(CChatClient& engine) {
-    ARMSessionResource resource{};
-    resource.dwValue = 9;
-    engine.ApeEnrollConfirm(1, 0, 1, &resource);
-}
-
 }  // namespace
 
 TEST(RosterOps, DefaultGroupsByMeetingTypeAndQMMode) {
@@ -153,7 +146,9 @@ TEST(RosterOps, AfterEnrolmentOnlyChangedRolesEnrollAgain) {
     MenuHarness h({3});
     EXPECT_EQ(h.engine.SetRosters(ROLE_PRESENTER, 0), 0);
     EXPECT_TRUE(h.engine.IsRostersPending());
-    Enrolled(h.engine);
+    ARMSessionResource resource{};  // the service grants the enrolment
+    resource.dwValue = 9;
+    h.engine.ApeEnrollConfirm(1, 0, 1, &resource);
 
     TraceCapture capture;
     EXPECT_EQ(h.engine.SetRosters(ROLE_PRESENTER, 0), 1);
