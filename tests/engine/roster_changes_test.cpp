@@ -186,47 +186,43 @@ TEST(ExtractEnrollInfo, HostileEnrollDataCannotHurt) {
     std::string accents;
     for (int i = 0; i < 200; ++i)
         accents += "\xC3\xA9";  // 400 bytes of two-byte characters
-    struct Case {
-        const char* scenario;
-        int result;
-        std::string name;
-        std::uint32_t roles;
-        std::string bytes;
-        std::int32_t length = -2;  // -2: the bytes' own length
-        bool withData = true;
-    };
-    const Case cases[] = {
-        {"a roster record", 0, "ann", ROLE_PANELIST, valid},
-        {"not a record", 0, "", 0, "hello"},
-        {"cut short by the given length", 0, "", 0, valid, size - 9},
-        {"trailing bytes past the given length", 0, "ann", ROLE_PANELIST, valid + "<<garbage",
-         size},
-        {"no data", -1, "", 0, valid, -2, false},
-        {"negative length", -1, "", 0, valid, -1},
-        {"longer than any document: not copied", 0, "", 0, valid,
-         static_cast<std::int32_t>(kMaxXmlBytes + 1)},
-        {"control characters", 0, "ev il name ", 0, EnrollBytes({201, "ev\til\x01name\x7f"})},
-        {"a huge name", 0, std::string(255, 'x'), 0, EnrollBytes({201, wide + wide + wide})},
-        {"a huge name of two-byte characters", 0, accents.substr(0, 254), 0,
-         EnrollBytes({201, accents})},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.scenario);
+    // Each case: the result; the name and roles read; the bytes, the length the service gives
+    // (-2: the bytes' own) and whether it gives the bytes at all.
+    const std::tuple<const char*, int, std::string, std::uint32_t, std::string, std::int32_t, bool>
+        cases[] = {
+            {"a roster record", 0, "ann", ROLE_PANELIST, valid, -2, true},
+            {"not a record", 0, "", 0, "hello", -2, true},
+            {"cut short by the given length", 0, "", 0, valid, size - 9, true},
+            {"trailing bytes past the given length", 0, "ann", ROLE_PANELIST, valid + "<<garbage",
+             size, true},
+            {"no data", -1, "", 0, valid, -2, false},
+            {"negative length", -1, "", 0, valid, -1, true},
+            {"longer than any document: not copied", 0, "", 0, valid,
+             static_cast<std::int32_t>(kMaxXmlBytes + 1), true},
+            {"control characters", 0, "ev il name ", 0, EnrollBytes({201, "ev\til\x01name\x7f"}),
+             -2, true},
+            {"a huge name", 0, std::string(255, 'x'), 0, EnrollBytes({201, wide + wide + wide}), -2,
+             true},
+            {"a huge name of two-byte characters", 0, accents.substr(0, 254), 0,
+             EnrollBytes({201, accents}), -2, true},
+        };
+    for (const auto& [scenario, result, name, roles, bytes, length, withData] : cases) {
+        SCOPED_TRACE(scenario);
         MenuHarness h({1});
         RosterReport report;
-        report.Record(kSession, {{201, 1201, c.bytes}});
+        report.Record(kSession, {{201, 1201, bytes}});
         ARMApeRoster* records = report.Records();
-        if (c.length != -2) records[0].pUsers[0].nEnrollInfoLen = c.length;
-        if (!c.withData) records[0].pUsers[0].pEnrollInfo = nullptr;
+        if (length != -2) records[0].pUsers[0].nEnrollInfoLen = length;
+        if (!withData) records[0].pUsers[0].pEnrollInfo = nullptr;
         UserItem item;
-        EXPECT_EQ(h.engine.ExtractEnrollInfoAndReturnLen(0, &item, records), c.result);
+        EXPECT_EQ(h.engine.ExtractEnrollInfoAndReturnLen(0, &item, records), result);
         EXPECT_EQ(item.dwNodeID, 201u);
         EXPECT_EQ(item.dwUserID, 1201u);
-        EXPECT_EQ(std::string(item.strName.GetData() ? item.strName.GetData() : ""), c.name);
-        EXPECT_EQ(item.dwRoles, c.roles);
+        EXPECT_EQ(std::string(item.strName.GetData() ? item.strName.GetData() : ""), name);
+        EXPECT_EQ(item.dwRoles, roles);
 
         h.engine.ApeRosterChanged(1, 0, 1, 0, 0, records);
-        EXPECT_EQ(h.engine.UserList().GetCount(), c.result == 0 ? 1u : 0u);
+        EXPECT_EQ(h.engine.UserList().GetCount(), result == 0 ? 1u : 0u);
     }
 }
 
