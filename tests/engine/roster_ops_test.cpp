@@ -199,13 +199,10 @@ TEST(RosterOps, RosterCountsRoleChangesBeforeHostAndPickedAttendees) {
     EXPECT_FALSE(capture.Has(kEnrollTrace));
 
     // Picked attendees are roster members.
-    h.engine.AddUserByUserSelected(201);
-    h.engine.AddUserByUserSelected(999);
-    h.engine.AddUserByUserSelected(202);
-    EXPECT_TRUE(h.engine.IsUserSelectedUser(201));
-    EXPECT_TRUE(h.engine.IsUserSelectedUser(202));
-    EXPECT_FALSE(h.engine.IsUserSelectedUser(999));
+    for (const std::uint32_t node : {201u, 999u, 202u})
+        h.engine.AddUserByUserSelected(node);
     h.engine.RemoveUserByUserID(201);
     EXPECT_FALSE(h.engine.IsUserSelectedUser(201));
     EXPECT_TRUE(h.engine.IsUserSelectedUser(202));
+    EXPECT_FALSE(h.engine.IsUserSelectedUser(999));
 }
