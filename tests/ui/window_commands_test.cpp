@@ -114,7 +114,7 @@ TEST_F(WindowTest, SelectedUserLeftShowsThePlaceholderUntilATargetIsChosenAgain)
     EXPECT_EQ(engine.events.back(), (RecordedEvent{msg_SelectionChanged, 1}));
 }
 
-TEST_F(WindowTest, InputTextHasNormalisedLineEndsAndIsLimited) {
+TEST_F(WindowTest, InputIsNormalisedLimitedAndSentWithReturnToAChosenTarget) {
     // Each text typed and what the engine is given for it.
     const std::tuple<std::string, std::string> cases[] = {
         {"x\n\ny", "x\ry"},
@@ -130,9 +130,8 @@ TEST_F(WindowTest, InputTextHasNormalisedLineEndsAndIsLimited) {
     }
     Command(msg_ClearInput);
     EXPECT_TRUE(window->editView()->toPlainText().isEmpty());
-}
 
-TEST_F(WindowTest, ReturnSendsShiftReturnStartsANewLineAndTheAttendeeItemSendsNothing) {
+    // Return sends, Shift+Return starts a new line, and the attendee item sends nothing.
     Rebuild({Entry("Everyone", 15), Entry("Select an Attendee...", 16)});
     QTest::keyClicks(window->editView(), "hi");
     QTest::keyClick(window->editView(), Qt::Key_Return, Qt::ShiftModifier);

@@ -78,10 +78,7 @@ protected:
         Command(msg_InsertMenuItem, &entry, at < 0 ? nullptr : &at);
     }
 
-    void Rebuild(const MenuStatusList& entries) {
-        MenuStatusList copy = entries;
-        Command(msg_RebuildMenu, &copy);
-    }
+    void Rebuild(MenuStatusList entries) { Command(msg_RebuildMenu, &entries); }
 
     // The popup's rows as shown: their text ("-" for a separator).
     std::vector<std::string> Rows() const {
