@@ -1,5 +1,7 @@
 // The engine's life against the in-process conference on a virtual clock: start, the
-// connection chain and its failures, roster-info switches, the tick and the tear-down.
+// connection chain and its failures, roster-info switches, the tick and the tear-down; and the
+// exact log lines of that walk and of the host's tuning commands, which hosts and support
+// staff search their logs for.
 #include <gtest/gtest.h>
 
 #include <optional>
@@ -11,6 +13,8 @@
 #include "tests/support/trace_capture.h"
 
 namespace {
+
+using Strings = std::vector<std::string>;
 
 constexpr std::uint32_t kSessionId = 42;
 
@@ -35,8 +39,41 @@ protected:
     int parentView = 0;
 };
 
-std::vector<std::string> Prefix(const std::vector<std::string>& calls, std::size_t n) {
-    return std::vector<std::string>(calls.begin(), calls.begin() + std::min(n, calls.size()));
+Strings Prefix(const Strings& calls, std::size_t n) {
+    return Strings(calls.begin(), calls.begin() + std::min(n, calls.size()));
+}
+
+using Engine = std::unique_ptr<CChatClient>;
+
+// Enter and Leave lines of one scoped trace around the given inner lines.
+Strings Scoped(const std::string& text, Strings inner = {}) {
+    inner.insert(inner.begin(), "Enter " + text);
+    inner.push_back("Leave " + text);
+    return inner;
+}
+
+constexpr const char* kCustomerId =
+    "<chat ver=\"1.0\"><mtype>11</mtype><customerid>5</customerid></chat>";
+constexpr const char* kFaqMacros = "<chat ver=\"1.0\"><mtype>8</mtype><fname>Ann</fname></chat>";
+
+const Strings kCleanup =
+    Scoped("CChatClient::Cleanup", {"CChatClient::ape detach", "CChatClient::conference leave",
+                                    "CChatClient::destroy", "CChatClient::after destroy"});
+
+// The lines of the capture that are the expected ones, each on the info channel with the
+// component's tag, kept in the order they were logged.
+Strings Matching(const TraceCapture& capture, const Strings& expected) {
+    Strings found;
+    std::size_t next = 0;
+    for (const TraceLine& line : capture.Lines()) {
+        if (next == expected.size()) break;
+        if (line.text != expected[next]) continue;
+        EXPECT_EQ(line.tag, "Chat") << line.text;
+        EXPECT_EQ(line.level, TraceLevel::Info) << line.text;
+        found.push_back(line.text);
+        ++next;
+    }
+    return found;
 }
 
 TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
@@ -45,7 +82,7 @@ TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
     engine.Initialize(Data(&spy, 7, "Alice", 3));
 
     // Nothing is answered inside a request: only Connect has happened yet.
-    EXPECT_EQ(spy.Calls(), std::vector<std::string>{"Connect"});
+    EXPECT_EQ(spy.Calls(), Strings{"Connect"});
     EXPECT_EQ(engine.State(), kStateIdle);
     loop.RunUntilIdle();
 
@@ -56,23 +93,23 @@ TEST_F(SessionTest, NormalStartWalksFromConnectToEnrolment) {
     ASSERT_NE(spy.ApeHandle(), 0u);
     ASSERT_FALSE(spy.EnrollPayloads().empty());
     const std::string length = std::to_string(spy.EnrollPayloads().front().size());
-    EXPECT_EQ(Prefix(spy.CallsWithArguments(), 6),
-              (std::vector<std::string>{
-                  "Connect(Alice, 0, 0, 0)", "ConferenceJoin(0, " + conf + ", 3)",
-                  "ApeAttach(0, " + conf + ")",
-                  "ApeEnroll(" + ape + ", 1, 42, 0, 1, {1, c_session_id, 1}, " + length + ", 3)",
-                  "AllocNameHandle(" + ape + ", 9)", "RegisterSharedDataSink(" + ape + ")"}));
+    EXPECT_EQ(
+        Prefix(spy.CallsWithArguments(), 6),
+        (Strings{"Connect(Alice, 0, 0, 0)", "ConferenceJoin(0, " + conf + ", 3)",
+                 "ApeAttach(0, " + conf + ")",
+                 "ApeEnroll(" + ape + ", 1, 42, 0, 1, {1, c_session_id, 1}, " + length + ", 3)",
+                 "AllocNameHandle(" + ape + ", 9)", "RegisterSharedDataSink(" + ape + ")"}));
     EXPECT_EQ(engine.SessionValue(), conference.SessionValue(kSessionId));
     EXPECT_EQ(spy.RegisteredSink(), static_cast<IArmSharedDataSink*>(&engine));
-    EXPECT_EQ(host.events, (std::vector<std::string>{"modified 0", "content 0"}));
+    EXPECT_EQ(host.events, (Strings{"modified 0", "content 0"}));
 
     // Named handles for the seven group caches of meeting type 3 and the bookkeeping caches.
     const std::string prefix = std::to_string(engine.SessionValue());
-    EXPECT_EQ(spy.HandleNames(),
-              (std::vector<std::string>{
-                  prefix + "_chat_cache_1", prefix + "_chat_cache_2", prefix + "_chat_cache_3",
-                  prefix + "_chat_cache_8", prefix + "_chat_cache_4", prefix + "_chat_cache_15",
-                  prefix + "_chat_cache_16", prefix + "_Chat_User_Info", prefix + "_chat_status"}));
+    EXPECT_EQ(
+        spy.HandleNames(),
+        (Strings{prefix + "_chat_cache_1", prefix + "_chat_cache_2", prefix + "_chat_cache_3",
+                 prefix + "_chat_cache_8", prefix + "_chat_cache_4", prefix + "_chat_cache_15",
+                 prefix + "_chat_cache_16", prefix + "_Chat_User_Info", prefix + "_chat_status"}));
 
     RecordingWindow* window = RecordingWindow::Latest();
     ASSERT_NE(window, nullptr);
@@ -118,9 +155,8 @@ TEST_F(SessionTest, RosterInfoCarriesFaqFieldsTagAndCustomerId) {
     // With a customer id its cache is asked for between the user-info and the status cache.
     const std::string prefix = std::to_string(engine.SessionValue());
     ASSERT_GE(spy.HandleNames().size(), 3u);
-    EXPECT_EQ(std::vector<std::string>(spy.HandleNames().end() - 3, spy.HandleNames().end()),
-              (std::vector<std::string>{prefix + "_Chat_User_Info", "switch_cache_555",
-                                        prefix + "_chat_status"}));
+    EXPECT_EQ(Strings(spy.HandleNames().end() - 3, spy.HandleNames().end()),
+              (Strings{prefix + "_Chat_User_Info", "switch_cache_555", prefix + "_chat_status"}));
 }
 
 TEST_F(SessionTest, ConnectResultDecidesWhetherTheChainGoesOn) {
@@ -145,7 +181,7 @@ TEST_F(SessionTest, ConnectResultDecidesWhetherTheChainGoesOn) {
         engine.Initialize(Data(&spy, node++, "Alice"));
         const bool already = result == kArmAlreadyConnected || result == 0;
         if (already) {
-            const std::vector<std::string> chain{"Connect", "ConferenceJoin", "ApeAttach"};
+            const Strings chain{"Connect", "ConferenceJoin", "ApeAttach"};
             const std::size_t made = result == 0 ? 3 : 2;
             EXPECT_EQ(Prefix(spy.Calls(), made), Prefix(chain, made));
             EXPECT_TRUE(
@@ -160,7 +196,7 @@ TEST_F(SessionTest, ConnectResultDecidesWhetherTheChainGoesOn) {
             continue;
         }
         if (result < 0) {  // a confirmation other than 0 and 19 changes nothing
-            EXPECT_EQ(spy.Calls(), std::vector<std::string>{"Connect"});
+            EXPECT_EQ(spy.Calls(), Strings{"Connect"});
             EXPECT_EQ(engine.ArmClient(), &spy);
             EXPECT_EQ(engine.State(), kStateIdle);
             continue;
@@ -292,11 +328,9 @@ TEST_F(SessionTest, CleanupIsSafeTwiceAndReleasesOnce) {
     // One detach and one release, last.
     EXPECT_EQ(engine.ChatUI(), nullptr);
     const std::string conf = std::to_string(conference.ConferenceId());
-    EXPECT_EQ(
-        std::vector<std::string>(spy.CallsWithArguments().end() - 4,
-                                 spy.CallsWithArguments().end()),
-        (std::vector<std::string>{"ApeDetach(" + std::to_string(spy.ApeHandle()) + ")",
-                                  "ConferenceLeave(0, " + conf + ")", "Destroy(1)", "Release()"}));
+    EXPECT_EQ(Strings(spy.CallsWithArguments().end() - 4, spy.CallsWithArguments().end()),
+              (Strings{"ApeDetach(" + std::to_string(spy.ApeHandle()) + ")",
+                       "ConferenceLeave(0, " + conf + ")", "Destroy(1)", "Release()"}));
 }
 
 TEST_F(SessionTest, SecondInitializeKeepsTheServiceWindowAndTheTimerThatReappliesPrivileges) {
@@ -357,6 +391,59 @@ TEST_F(SessionTest, NullNamesLeaveStringsEmptyAndTagModeZeroDropsTheTag) {
     EXPECT_TRUE(engine.MyName().empty());
     EXPECT_TRUE(engine.Reserved().empty());
     EXPECT_EQ(engine.UserExternalTag(), 0u);
+}
+
+TEST_F(SessionTest, LogTextsOfTheWalkAndOfTheHostCommands) {
+    // Each step: whether the engine was started on a conference before the capture begins,
+    // what it does, and the lines it logs.
+    const std::tuple<const char*, bool, std::function<void(Engine&)>, Strings> steps[] = {
+        {"Initialize", false,
+         [](Engine& e) { e->Initialize(chatroom::StartRecord(nullptr, 0, 0, "Alice", 0, 0)); },
+         Scoped("CChatClient::Initialize", {"Enter CChatClient::ShowChatUI, bShow = 1",
+                                            "Enter CChatClient::SetChatPanelUI inState = -1",
+                                            "Leave CChatClient::SetChatPanelUI inState = -1",
+                                            "Leave CChatClient::ShowChatUI, bShow = 1",
+                                            "Enter CChatClient::SetChatPanelUI inState = 0",
+                                            "Leave CChatClient::SetChatPanelUI inState = 0"})},
+        {"attach confirmation", false, [](Engine& e) { e->ApeAttachConfirm(5, 0, 33); },
+         Scoped("CChatClient::::ApeAttachConfirm, ape_handle = 5, result = 0, userId = 33",
+                Scoped("CChatClient::Enroll"))},
+        {"enroll confirmation", false, [](Engine& e) { e->ApeEnrollConfirm(5, 0, 1, nullptr); },
+         Scoped("CChatClient::ApeEnrollConfirm, ape_handle = 5, result = 0, resource_number = 1")},
+        {"SetRosterStatus", false, [](Engine& e) { e->SetRosterStatus(0, 1); },
+         Scoped("CChatClient::SetRosterStatus, inNeedRosterInfo = 0, inBroadcastRosterInfo = 1",
+                Scoped("CChatClient::Enroll"))},
+        {"DisconnectIndication", false, [](Engine& e) { e->DisconnectIndication(7); },
+         Scoped("CChatClient::DisconnectIndication, reason=7.")},
+        {"Cleanup", true, [](Engine& e) { e->Cleanup(); }, kCleanup},
+        {"destructor", true, [](Engine& e) { e.reset(); },
+         Scoped("CChatClient::~CChatClient", kCleanup)},
+        {"SelectFeature", false, [](Engine& e) { e->SelectFeature(0x8000, 0, 0, 0, 0, nullptr); },
+         Scoped("CChatClient::SelectFeature")},
+        {"SetNBRStatus", false, [](Engine& e) { e->SetNBRStatus(3, 2, 1); },
+         Scoped("CChatClient::SetNBRStatus, dwStatus = 3, dwOption = 2, dwReserved = 1")},
+        {"SetSoundIncomingChat", false, [](Engine& e) { e->SetSoundIncomingChat(2); },
+         Scoped("CChatClient::SetSourndIncomingChat, inSoundWork = 2")},
+        {"SetSoundFSSpec", false, [](Engine& e) { e->SetSoundFSSpec(FSRef{}); },
+         Scoped("CChatClient::SetSoundFSSpec")},
+        {"customer id configuration", false, [](Engine& e) { e->SetConfig(3, kCustomerId); },
+         Scoped("CChatClient::HandleCustomerIdConfig()")},
+        {"FAQ macro configuration", false, [](Engine& e) { e->SetConfig(2, kFaqMacros); },
+         Scoped("CChatClient::HandleFAQMacroInfoConfig()")},
+    };
+    std::uint32_t node = 7;
+    for (const auto& [step, withService, act, lines] : steps) {
+        SCOPED_TRACE(step);
+        Engine engine = std::make_unique<CChatClient>();
+        if (withService) {
+            engine->Initialize(Data(conference.CreateClient(loop, node), node, "Alice", 0));
+            ++node;
+            loop.RunUntilIdle();
+        }
+        TraceCapture capture;
+        act(engine);
+        EXPECT_EQ(Matching(capture, lines), lines);
+    }
 }
 
 }  // namespace
