@@ -11,6 +11,7 @@
 
 #include "engine/chat_client.h"
 #include "platform/inproc_conference.h"
+#include "platform/telemetry.h"
 #include "platform/virtual_run_loop.h"
 #include "tests/support/recording_window.h"
 
@@ -29,6 +30,15 @@ inline _tagChatData StartRecord(IArmClient* client, std::uint16_t conferenceId,
     data.lMeetingType = meetingType;
     return data;
 }
+
+// Reported telemetry actions, collected while the object lives.
+struct TelemetryCapture {
+    TelemetryCapture() {
+        SetTelemetrySink([this](int id) { actions.push_back(id); });
+    }
+    ~TelemetryCapture() { SetTelemetrySink(nullptr); }
+    std::vector<int> actions;
+};
 
 struct Person {
     const char* name;

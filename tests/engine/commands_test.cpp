@@ -7,7 +7,6 @@
 #include <tuple>
 
 #include "engine/chat_recovery_mgr.h"
-#include "platform/telemetry.h"
 #include "tests/engine/chat_room.h"
 #include "tests/engine/menu_harness.h"
 #include "tests/support/trace_capture.h"
@@ -18,15 +17,6 @@ using chatroom::ChatRoom;
 using chatroom::Member;
 using menutest::MenuHarness;
 using Strings = std::vector<std::string>;
-
-// Reported telemetry actions, collected while the object lives.
-struct TelemetryCapture {
-    TelemetryCapture() {
-        SetTelemetrySink([this](int id) { actions.push_back(id); });
-    }
-    ~TelemetryCapture() { SetTelemetrySink(nullptr); }
-    std::vector<int> actions;
-};
 
 std::vector<int> SelectedIndexes(const CChatClient& engine) {
     std::vector<int> selected;
@@ -54,17 +44,18 @@ TEST(Commands, SelectionChangedMarksExactlyTheReportedEntry) {
     for (auto [index, selected, actions] : cases) {
         std::int32_t before = index == attendees ? everyone : attendees;
         ASSERT_EQ(h.engine.HandleUIMessage(msg_SelectionChanged, &before, nullptr), 0);
-        TelemetryCapture telemetry;
+        chatroom::TelemetryCapture telemetry;
         EXPECT_EQ(h.engine.HandleUIMessage(msg_SelectionChanged, &index, nullptr), 0) << index;
         EXPECT_EQ(SelectedIndexes(h.engine), selected) << index;
         EXPECT_EQ(telemetry.actions, actions) << index;
     }
 }
 
-TEST(Commands, ShowAttendeeListNamesOnlyPlainAttendees) {
+TEST(Commands, WindowEventsListPlainAttendeesAndThoseNoWindowSendsChangeNothing) {
     MenuHarness h({3});
     h.Enroll(
         {{201, "ann", 0}, {202, "bob", ROLE_PANELIST}, {203, "cy", 0}, {204, "dee", ROLE_HOST}});
+    const Strings titles = h.Titles();
     h.Commands();
     std::int32_t created = 1;
     EXPECT_EQ(h.engine.HandleUIMessage(msg_ShowAttendeeList, &created, nullptr), 0);
@@ -74,6 +65,16 @@ TEST(Commands, ShowAttendeeListNamesOnlyPlainAttendees) {
         listed.push_back(c.attendee.strName + "@" + std::to_string(c.attendee.dwNodeID));
     }
     EXPECT_EQ(listed, (Strings{"ann@201", "cy@203"}));
+    h.Commands();
+    for (const int message : {0, 2000, 4999, 5004, 6000}) {
+        std::int32_t value = 0;
+        EXPECT_EQ(h.engine.HandleUIMessage(message, &value, &value), 1) << message;
+    }
+    EXPECT_EQ(h.Titles(), titles);
+    EXPECT_TRUE(h.Commands().empty());
+    // Sending with nothing typed asks the window for the text and does nothing more.
+    EXPECT_EQ(h.engine.HandleUIMessage(msg_SendChat, nullptr, nullptr), 0);
+    EXPECT_EQ(h.Commands(), Strings{"msg_GetInputText"});
 }
 
 TEST(Commands, AttendeeSelectedGivesThePickedUserAnEntryOrReselectsTheSelectedOne) {
@@ -100,22 +101,6 @@ TEST(Commands, AttendeeSelectedGivesThePickedUserAnEntryOrReselectsTheSelectedOn
     std::int32_t outside = -1;
     h.engine.HandleUIMessage(msg_SelectionChanged, &outside, nullptr);
     EXPECT_TRUE(pick(0).empty());
-}
-
-TEST(Commands, EventsNoWindowSendsChangeNothing) {
-    MenuHarness h({3});
-    h.Enroll({{201, "ann", 0}});
-    const Strings titles = h.Titles();
-    h.Commands();
-    for (const int message : {0, 2000, 4999, 5004, 6000}) {
-        std::int32_t value = 0;
-        EXPECT_EQ(h.engine.HandleUIMessage(message, &value, &value), 1) << message;
-    }
-    EXPECT_EQ(h.Titles(), titles);
-    EXPECT_TRUE(h.Commands().empty());
-    // Sending with nothing typed asks the window for the text and does nothing more.
-    EXPECT_EQ(h.engine.HandleUIMessage(msg_SendChat, nullptr, nullptr), 0);
-    EXPECT_EQ(h.Commands(), Strings{"msg_GetInputText"});
 }
 
 TEST(Commands, FeatureWordSetsModesAndTellsTheRecoveryManager) {

@@ -8,7 +8,6 @@
 #include <utility>
 
 #include "engine/line_ends.h"
-#include "platform/telemetry.h"
 #include "tests/engine/chat_room.h"
 #include "tests/support/arm_recorder.h"
 #include "tests/support/trace_capture.h"
@@ -84,11 +83,9 @@ TEST(Sending, EveryAudienceOfAPanelMeetingReachesExactlyItsParticipants) {
 }
 
 TEST(Sending, QMRulesSendToEveryoneOrPrivatelyToTheRoleHolder) {
-    std::vector<int> telemetry;
-    SetTelemetrySink([&telemetry](int id) { telemetry.push_back(id); });
     ChatRoom room(1, FEATURE_QM_MODE);
     JoinPanel(room);
-    telemetry.clear();
+    chatroom::TelemetryCapture telemetry;
     // Each line Ann says: to which group (or node), its title, who shows it, the action told.
     const std::tuple<std::int32_t, std::uint32_t, const char*, Names, int> rows[] = {
         {GROUP_EVERYONE, 0, "from Ann to Everyone", {"Hana", "Pia", "Paul", "Ann", "Al"}, 908},
@@ -102,9 +99,8 @@ TEST(Sending, QMRulesSendToEveryoneOrPrivatelyToTheRoleHolder) {
         const std::string text = "qm " + std::to_string(++n);
         room.Say(ByName(room, "Ann"), text, groupId, node);
         EXPECT_EQ(room.Holders(std::string(title) + "|" + text), holders) << title;
-        EXPECT_EQ(telemetry.back(), action) << title;
+        EXPECT_EQ(telemetry.actions.back(), action) << title;
     }
-    SetTelemetrySink(nullptr);
 }
 
 TEST(Sending, TheServiceIsGivenTheFlagsOfTheRecordCondition) {
