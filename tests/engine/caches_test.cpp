@@ -17,9 +17,7 @@
 
 namespace {
 
-constexpr std::uint32_t kSessionId = 42;
-constexpr std::uint32_t kMyNode = 7;
-constexpr std::uint32_t kOtherNode = 9;
+constexpr std::uint32_t kSessionId = 42, kMyNode = 7, kOtherNode = 9;
 // A host-added group at the top of the id range that still names a group cache.
 constexpr std::uint32_t kHighGroupId = 4096;
 

@@ -40,10 +40,10 @@ struct TelemetryCapture {
     std::vector<int> actions;
 };
 
+// A participant: its name, its node and the ROLE_* bits the host gives before the start.
 struct Person {
     const char* name;
-    std::uint32_t node;
-    std::uint32_t roles;  // ROLE_* bits the host gives before the start
+    std::uint32_t node, roles;
 };
 
 // One participant: its engine, the window it made and its service object.

@@ -3,7 +3,6 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <cstdint>
 #include <tuple>
 
 #include "engine/chat_recovery_mgr.h"
@@ -25,14 +24,9 @@ std::vector<int> SelectedIndexes(const CChatClient& engine) {
     return selected;
 }
 
-// A menu with two group entries around a separator.
-void SeedGroups(MenuHarness& h) {
-    h.Seed({{"All Participants", GROUP_EVERYONE}, {"---", 0}, {"All Attendees", GROUP_ATTENDEES}});
-}
-
 TEST(Commands, SelectionChangedMarksExactlyTheReportedEntry) {
     MenuHarness h;
-    SeedGroups(h);
+    h.Seed({{"All Participants", GROUP_EVERYONE}, {"---", 0}, {"All Attendees", GROUP_ATTENDEES}});
     const int everyone = h.engine.GetIndexOfMenuByGroup(GROUP_EVERYONE);
     const int attendees = h.engine.GetIndexOfMenuByGroup(GROUP_ATTENDEES);
     const int size = static_cast<int>(h.engine.Menu().size());
@@ -80,7 +74,7 @@ TEST(Commands, WindowEventsListPlainAttendeesAndThoseNoWindowSendsChangeNothing)
 TEST(Commands, AttendeeSelectedGivesThePickedUserAnEntryOrReselectsTheSelectedOne) {
     // With the attendee selector an attendee gets an entry only when picked.
     MenuHarness h({1, true});
-    SeedGroups(h);
+    h.Seed({{"All Participants", GROUP_EVERYONE}, {"---", 0}, {"All Attendees", GROUP_ATTENDEES}});
     h.Enroll({{201, "ann", 0}});
     ASSERT_EQ(h.engine.GetIndexOfMenuByNodeID(201), -1);
     std::int32_t attendees = h.engine.GetIndexOfMenuByGroup(GROUP_ATTENDEES);
