@@ -177,25 +177,20 @@ std::string Subscribed(CChatClient& engine) {
 TEST(Practice, EachSideSeesItsAudiencesAndKeepsItsCaches) {
     // Each case: own role, the caches subscribed before, during and after practice, and the
     // menus during and after it.
-    const std::tuple<const char*, Own, const char*, const char*, const char*> cases[] = {
+    const std::string roles = "Host|Presenter|Host & Presenter|---|";
+    const std::string picker = "|---|Select an Attendee...";
+    const std::tuple<const char*, Own, const char*, std::string, std::string> cases[] = {
         {"attendee with attendees: one entry", kAttendee, " 8 15", "*All Attendees",
-         "Host|Presenter|Host & Presenter|---|*All Attendees|All Panelists|hank|pat|---|All "
-         "Participants"},
+         roles + "*All Attendees|All Panelists|hank|pat|---|All Participants"},
         {"panelist: the audiences among panelists", kPanelist, " 4 15",
-         "Host|Presenter|Host & Presenter|---|All Attendees|*All Panelists|pat|---|All "
-         "Participants",
-         "Host|Presenter|Host & Presenter|---|All Attendees|*All Panelists|hank|pat|---|All "
-         "Participants|---|Select an Attendee..."},
+         roles + "All Attendees|*All Panelists|pat|---|All Participants",
+         roles + "All Attendees|*All Panelists|hank|pat|---|All Participants" + picker},
         {"presenter: no picker, the audience chosen before kept", kPresenter, " 2 3 4 15",
-         "*Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|All "
-         "Participants",
-         "*Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|All "
-         "Participants|---|Select an Attendee..."},
+         "*" + roles + "All Attendees|All Panelists|pat|---|All Participants",
+         "*" + roles + "All Attendees|All Panelists|pat|---|All Participants" + picker},
         {"host: the same groups", kHostRole, " 1 3 4 15",
-         "Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|*All "
-         "Participants",
-         "Host|Presenter|Host & Presenter|---|All Attendees|All Panelists|pat|---|*All "
-         "Participants|---|Select an Attendee..."},
+         roles + "All Attendees|All Panelists|pat|---|*All Participants",
+         roles + "All Attendees|All Panelists|pat|---|*All Participants" + picker},
     };
     for (const auto& [scenario, own, caches, during, after] : cases) {
         SCOPED_TRACE(scenario);

@@ -20,10 +20,6 @@ namespace {
 constexpr const char* kPrivilegeReapplied =
     "Enter CChatClient::OnPrivilegeChanged , in_dwPrivilege = 65615";
 
-const UserItem* Find(const MenuHarness& h, std::uint32_t node) {
-    return h.engine.UserList().GetUserItemFromNodeId(node);
-}
-
 }  // namespace
 
 TEST(ApeRosterChanged, WalksOnlyRecordsOfTheOwnSessionAndSkipsKnownUsersAndTheRecorder) {
@@ -54,8 +50,9 @@ TEST(ApeRosterChanged, AddsThenDeletesThenModifiesInOneCallback) {
         .Record(kSession, {EntryFor({202, "bob", ROLE_PANELIST})});
     h.engine.ApeRosterChanged(1, 0, 1, 1, 1, report.Records());
     EXPECT_EQ(h.engine.UserList().GetCount(), 1u);
-    ASSERT_NE(Find(h, 202), nullptr);
-    EXPECT_EQ(Find(h, 202)->dwRoles, ROLE_PANELIST);
+    const UserItem* bob = h.engine.UserList().GetUserItemFromNodeId(202);
+    ASSERT_NE(bob, nullptr);
+    EXPECT_EQ(bob->dwRoles, ROLE_PANELIST);
     // bob's new panelist role re-applies the privilege: his entry is re-created as a panelist's.
     EXPECT_EQ(h.Menu(), "*All Attendees|bob");
     EXPECT_EQ(h.Seen(),
@@ -261,7 +258,7 @@ TEST(ProcessModifyEnrollInfo, UpdatesTheItemButNotTheTitle) {
     h.Enroll({{201, "ann"}});
     TraceCapture trace;
     h.Modify({201, "anne", ROLE_PANELIST, 2});
-    const UserItem* ann = Find(h, 201);
+    const UserItem* ann = h.engine.UserList().GetUserItemFromNodeId(201);
     ASSERT_NE(ann, nullptr);
     EXPECT_STREQ(ann->strName.GetData(), "anne");
     EXPECT_EQ(ann->dwRoles, ROLE_PANELIST);
