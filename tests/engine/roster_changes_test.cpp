@@ -295,25 +295,3 @@ TEST(ConferenceRoster, PrivateChatEntriesFollowArrivalsAndDepartures) {
     EXPECT_EQ(Join(Titles(bob)), "*Alice");
     EXPECT_EQ(alice.UserList().GetUserItemFromNodeId(11), nullptr);
 }
-
-TEST(ConferenceRoster, PanelistRoleReachesOthersAndLateJoiners) {
-    chatroom::ChatRoom room(3);
-    CChatClient& alice = room.Join({"Alice", 7, 0}).engine;
-    CChatClient& bob = room.Join({"Bob", 9, 0}).engine;
-    EXPECT_EQ(Join(Titles(alice)), "Host|Presenter|Host & Presenter|---|All Panelists");
-
-    bob.SetRosters(ROLE_PANELIST, 0);  // enrolls again with the new roles
-    room.Run();
-    const UserItem* seen = alice.UserList().GetUserItemFromNodeId(9);
-    ASSERT_NE(seen, nullptr);
-    EXPECT_EQ(seen->dwRoles, ROLE_PANELIST);
-
-    CChatClient& dana = room.Join({"Dana", 13, 0}).engine;
-    EXPECT_EQ(Join(Titles(dana)), "Host|Presenter|Host & Presenter|---|*All Panelists|Bob");
-    EXPECT_EQ(dana.UserList().GetCount(), 3u);
-
-    room.members.erase(room.members.begin() + 1);  // Bob leaves
-    room.Run();
-    EXPECT_EQ(Join(Titles(dana)), "Host|Presenter|Host & Presenter|---|*All Panelists");
-    EXPECT_EQ(alice.UserList().GetCount(), 2u);
-}
