@@ -16,8 +16,6 @@ using namespace menutest;
 
 namespace {
 
-using Strings = std::vector<std::string>;
-
 constexpr std::uint32_t kQM = FEATURE_QM_MODE;
 constexpr const char* kDoubledSeparator =
     "CChatClient::InsertRecentUserName : add sep indexStart+2 != indexEnd";
@@ -53,9 +51,9 @@ TEST(InsertChatUserName, PlacesAttendeesByMeetingTypeAndRules) {
         MenuHarness h({meetingType, false, 0, features});
         h.Seed(seed);
         h.Commands();
-        const Strings inserted = Split(names);
-        for (std::size_t i = 0; i < inserted.size(); ++i)
-            h.engine.InsertChatUserName(inserted[i].c_str(), 201 + i, 0);
+        std::uint32_t node = 201;
+        for (const std::string& name : Split(names))
+            h.engine.InsertChatUserName(name.c_str(), node++, 0);
         EXPECT_EQ(h.Menu(), menu);
         EXPECT_EQ(h.Seen(), commands);
     }
@@ -449,17 +447,15 @@ TEST(MenuModel, IndexedAnswersEqualAPlainWalk) {
             (op == 8 ? plain[at % plain.size()].bSelected : plain[at % plain.size()].bEnabled) =
                 e.bPanelist;
         }
-        const std::uint32_t node = e.dwNodeID;
-        const std::int32_t group = e.nGroupID;
-        EXPECT_EQ(model.IndexOfNode(node), first([&](const MenuStatus& x) {
-                      return node != 0 && x.nGroupID == -1 && x.dwNodeID == node;
+        const auto node = [&e](const MenuStatus& x) {
+            return e.dwNodeID != 0 && x.nGroupID == -1 && x.dwNodeID == e.dwNodeID;
+        };
+        EXPECT_EQ(model.IndexOfNode(e.dwNodeID), first(node));
+        EXPECT_EQ(model.IndexOfParticipant(e.dwNodeID, e.bRecent),
+                  first([&](const MenuStatus& x) { return node(x) && x.bRecent == e.bRecent; }));
+        EXPECT_EQ(model.IndexOfGroup(e.nGroupID), first([&e](const MenuStatus& x) {
+                      return x.nGroupID == e.nGroupID && !x.dwNodeID;
                   }));
-        EXPECT_EQ(model.IndexOfParticipant(node, e.bRecent), first([&](const MenuStatus& x) {
-                      return node != 0 && x.nGroupID == -1 && x.dwNodeID == node &&
-                             x.bRecent == e.bRecent;
-                  }));
-        EXPECT_EQ(model.IndexOfGroup(group),
-                  first([&](const MenuStatus& x) { return x.nGroupID == group && !x.dwNodeID; }));
         EXPECT_EQ(model.HasParticipantEntry(),
                   first([](const MenuStatus& x) { return x.dwNodeID; }) != -1);
         EXPECT_EQ(model.HasSelectedDisabledEntry(),

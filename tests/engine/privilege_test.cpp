@@ -75,38 +75,32 @@ Strings Apply(MenuHarness& h, std::int32_t type, Own own, unsigned setup, std::u
 TEST(PrivilegePolicy, MenuInputAndSendToListFollowRolesAndWord) {
     // Each case: meeting type, own role, set-up flags, word; the last input and send-to list
     // states, and the menu.
+    const std::string on = "Host|Presenter|Host & Presenter|";
+    const std::string off = "~Host|~Presenter|~Host & Presenter|";
     const std::tuple<const char*, std::int32_t, Own, unsigned, std::uint32_t, const char*,
-                     const char*>
+                     std::string>
         cases[] = {
             {"type 1 host: every group entry on whatever the word", 1, kHostRole, 0, 0, "1 on",
-             "Host|Presenter|Host & Presenter|All Panelists|pat|All Attendees|ann|*All "
-             "Participants"},
+             on + "All Panelists|pat|All Attendees|ann|*All Participants"},
             {"type 1 presenter before any host: role entries off", 1, kPresenter, 0, 0x40, "1 on",
-             "~Host|~Presenter|~Host & Presenter|All Panelists|pat|All Attendees|ann|*All "
-             "Participants"},
+             off + "All Panelists|pat|All Attendees|ann|*All Participants"},
             {"type 1 attendee, host only", 1, kAttendee, kHostKnown, 0x2, "1 on",
              "*Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|~All Participants"},
             {"type 1 attendee, private: entries, input by them", 1, kAttendee, kHostKnown, 0x8,
-             "1 on",
-             "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All "
-             "Participants"},
+             "1 on", off + "~All Panelists|~All Attendees|*ann|~All Participants"},
             // The audience chosen before stays marked, disabled; the window clears the input.
             {"type 1 attendee, nothing at all", 1, kAttendee, kHostKnown, 0, "0 off",
-             "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*~All Participants"},
+             off + "~All Panelists|~All Attendees|*~All Participants"},
             {"type 1 attendee before the host: attendees allowed", 1, kAttendee, 0, 0, "1 on",
-             "~Host|~Presenter|~Host & Presenter|~All Panelists|*All Attendees|~All Participants"},
+             off + "~All Panelists|*All Attendees|~All Participants"},
             {"type 1 attendee before the host, picker: no attendees", 1, kAttendee, kPicker, 0,
-             "0 off",
-             "~Host|~Presenter|~Host & Presenter|*~All Panelists|~All Attendees|~All Participants"},
+             "0 off", off + "*~All Panelists|~All Attendees|~All Participants"},
             {"type 1 attendee, all but panelists: everyone off", 1, kAttendee, kHostKnown, 0x7,
-             "1 on",
-             "*Host|Presenter|Host & Presenter|~All Panelists|All Attendees|~All Participants"},
+             "1 on", "*" + on + "~All Panelists|All Attendees|~All Participants"},
             {"type 1 attendee, all: panelists listed", 1, kAttendee, kHostKnown, 0x4F, "1 on",
-             "Host|Presenter|Host & Presenter|All Panelists|hank|pat|All Attendees|ann|*All "
-             "Participants"},
+             on + "All Panelists|hank|pat|All Attendees|ann|*All Participants"},
             {"type 2 panelist, nothing: its role keeps input", 2, kPanelist, kHostKnown, 0, "1 on",
-             "~Host|~Presenter|~Host & Presenter|~All Panelists|~All Attendees|*ann|~All "
-             "Participants"},
+             off + "~All Panelists|~All Attendees|*ann|~All Participants"},
             {"type 3 attendee, attendees without private chat", 3, kAttendee, kHostKnown, 0x1,
              "0 off", "*All Attendees"},
             {"type 3 panelist, attendees and private: picker", 3, kPanelist, kHostKnown, 0x9,
