@@ -40,8 +40,7 @@ TEST(InsertChatUserName, PlacesAttendeesByMeetingTypeAndRules) {
             {"type 3: attendees fenced between All Participants and the picker", 3, 0, kPanelTail,
              "bob|Alice",
              "Host|Presenter|Host & Presenter|---|All Panelists|---|All "
-             "Participants|---|Alice|bob|---|"
-             "Select an Attendee...",
+             "Participants|---|Alice|bob|---|Select an Attendee...",
              "insert 7 ---|insert 8 bob|insert 8 Alice"},
             {"type 3 without everyone or attendees entry: appended, no separator", 3, 0, "", "bob",
              "Host|Presenter|Host & Presenter|---|All Panelists|bob", "insert -1 bob"},
