@@ -181,12 +181,12 @@ TEST(Sending, NothingLeavesForAnEntryThatCannotTakeTheLine) {
     room.Say(ann, "lost?", GROUP_EVERYONE);
     EXPECT_TRUE(capture.Has(TraceLevel::Warn,
                             "CChatClient::SendChat, group 15 has no cache, nothing sent"));
-    EXPECT_EQ(Clears(ann, 0), 0u);
     // A disabled entry, and anything but everyone under the everyone-only mode, are refused.
     ann.engine.SetGroupMenuEnable(GROUP_EVERYONE, false);
     room.Say(ann, "disabled", GROUP_EVERYONE);
     EXPECT_TRUE(
         capture.Has(TraceLevel::Warn, "CChatClient::SendChat, send-to entry 0 cannot be chosen"));
+    // Neither line left or cleared the input.
     EXPECT_EQ(ann.client->MemHandleCount(), 0u);
     EXPECT_EQ(Clears(ann, 0), 0u);
 }

@@ -259,29 +259,6 @@ TEST_F(SessionTest, NoResourceOrNoServiceChangesNothing) {
     EXPECT_EQ(engine.Enroll(), 1);
 }
 
-TEST_F(SessionTest, SetRosterStatusReEnrollsOnlyOnChange) {
-    SpyArmClient spy(conference.CreateClient(loop, 7));
-    CChatClient engine;
-    engine.Initialize(Data(&spy, 7, "Alice"));
-    loop.RunUntilIdle();
-    ASSERT_EQ(spy.Count("ApeEnroll"), 1u);
-    loop.AdvanceBy(10.0);  // let the start-up countdown finish
-    ASSERT_EQ(engine.PrivilegeCountdown(), 0);
-
-    engine.SetRosterStatus(1, 1);
-    EXPECT_EQ(spy.Count("ApeEnroll"), 1u);
-    EXPECT_EQ(engine.PrivilegeCountdown(), 0);
-
-    engine.SetRosterStatus(0, 1);
-    EXPECT_EQ(spy.Count("ApeEnroll"), 2u);
-    EXPECT_EQ(engine.PrivilegeCountdown(), 5);
-
-    engine.SetRosterStatus(7, 7);  // values other than 0 and 1 change nothing
-    EXPECT_EQ(spy.Count("ApeEnroll"), 2u);
-    EXPECT_EQ(engine.NeedRosterInfo(), 0);
-    EXPECT_EQ(engine.BroadcastRosterInfo(), 1);
-}
-
 TEST_F(SessionTest, TickClosesTheAttendeePickerOnceItsWarningIsGone) {
     CChatClient engine;
     engine.Initialize(Data(nullptr, 7, "Alice"));
@@ -305,17 +282,31 @@ TEST_F(SessionTest, TickClosesTheAttendeePickerOnceItsWarningIsGone) {
     EXPECT_TRUE(during([&] { loop.AdvanceBy(0.5); }).empty());
 }
 
-TEST_F(SessionTest, RolesChangedBeforeEnrolmentAreEnrolledByTheTick) {
+TEST_F(SessionTest, RolesAndRosterStatusEnrollAgainOnlyOnChange) {
     SpyArmClient spy(conference.CreateClient(loop, 7));
     CChatClient engine;
     engine.Initialize(Data(&spy, 7, "Alice"));
     EXPECT_EQ(engine.SetRosters(ROLE_PRESENTER, 0), 0);  // not enrolled yet: pending
     loop.RunUntilIdle();
     ASSERT_EQ(spy.Count("ApeEnroll"), 1u);
-    loop.AdvanceBy(1.0);
+    loop.AdvanceBy(1.0);  // the tick enrolls the pending roles, once
     EXPECT_EQ(spy.Count("ApeEnroll"), 2u);
-    loop.AdvanceBy(1.0);
+    loop.AdvanceBy(9.0);  // and lets the start-up countdown finish
     EXPECT_EQ(spy.Count("ApeEnroll"), 2u);
+    ASSERT_EQ(engine.PrivilegeCountdown(), 0);
+
+    engine.SetRosterStatus(1, 1);
+    EXPECT_EQ(spy.Count("ApeEnroll"), 2u);
+    EXPECT_EQ(engine.PrivilegeCountdown(), 0);
+
+    engine.SetRosterStatus(0, 1);
+    EXPECT_EQ(spy.Count("ApeEnroll"), 3u);
+    EXPECT_EQ(engine.PrivilegeCountdown(), 5);
+
+    engine.SetRosterStatus(7, 7);  // values other than 0 and 1 change nothing
+    EXPECT_EQ(spy.Count("ApeEnroll"), 3u);
+    EXPECT_EQ(engine.NeedRosterInfo(), 0);
+    EXPECT_EQ(engine.BroadcastRosterInfo(), 1);
 }
 
 TEST_F(SessionTest, CleanupIsSafeTwiceAndReleasesOnce) {
@@ -383,9 +374,7 @@ TEST_F(SessionTest, DeletingWithAnswersInFlightDeliversNothingMore) {
 
 TEST_F(SessionTest, NullNamesLeaveStringsEmptyAndTagModeZeroDropsTheTag) {
     CChatClient engine;
-    _tagChatData data = Data(nullptr, 7, nullptr);
-    data.lpszReserved = nullptr;
-    data.lExternalTagMode = 0;
+    _tagChatData data = Data(nullptr, 7, nullptr);  // no reserved text, tag mode 0
     data.dwUserExternalTag = 2;
     engine.Initialize(data);
     EXPECT_TRUE(engine.MyName().empty());
