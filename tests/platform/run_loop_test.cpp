@@ -187,21 +187,19 @@ TEST(PollRunLoop, WorkPostedFromOtherThreadsWakesALoopWaitingForALateTimer) {
     PollRunLoop loop;
     int ran = 0;  // only the loop's thread touches it
     const RunLoop::TimerId far = loop.AddTimer(3600, 0, [] {});
-    std::thread quitter([&loop, &ran] {
-        std::vector<std::thread> posters;
-        for (int t = 0; t < 4; ++t) {
-            posters.emplace_back([&loop, &ran] {
-                for (int i = 0; i < 250; ++i)
-                    loop.Post([&ran] { ++ran; });
-            });
-        }
-        for (std::thread& poster : posters)
-            poster.join();
-        loop.Post([&loop] { loop.Quit(); });
-    });
+    std::vector<std::thread> posters;
+    for (int t = 0; t < 4; ++t) {
+        posters.emplace_back([&loop, &ran] {
+            for (int i = 0; i < 250; ++i)
+                loop.Post([&loop, &ran] {
+                    if (++ran == 1000) loop.Quit();
+                });
+        });
+    }
     const auto start = std::chrono::steady_clock::now();
     EXPECT_TRUE(loop.RunFor(3600));
-    quitter.join();
+    for (std::thread& poster : posters)
+        poster.join();
     EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::minutes(1));
     EXPECT_EQ(1000, ran);
     loop.CancelTimer(far);

@@ -42,18 +42,6 @@ std::vector<ArmEvent> ArmRecorder::Named(const std::string& name) const {
     return found;
 }
 
-int ArmRecorder::ConnectConfirm(short result, std::uint32_t) {
-    return Record(ArmEvent("ConnectConfirm", 0, result));
-}
-
-int ArmRecorder::ConferenceJoinConfirm(std::uint16_t, const char*, short result, std::uint32_t) {
-    return Record(ArmEvent("ConferenceJoinConfirm", 0, result));
-}
-
-int ArmRecorder::ApeAttachConfirm(std::uint32_t apeHandle, short result, std::uint32_t userId) {
-    return Record(ArmEvent("ApeAttachConfirm", apeHandle, result, userId));
-}
-
 int ArmRecorder::ApeEnrollConfirm(std::uint32_t apeHandle, short result, short resourceNumber,
                                   ARMSessionResource* resources) {
     ArmEvent event("ApeEnrollConfirm", apeHandle, result);
@@ -85,16 +73,6 @@ int ArmRecorder::ApeRosterChanged(std::uint32_t serviceId, std::uint16_t, std::u
     return Record(std::move(event));
 }
 
-int ArmRecorder::ApeCacheActionConfirmEx(std::uint32_t apeHandle, std::uint32_t entityId,
-                                         tagCacheAction action, std::uint32_t,
-                                         std::uint32_t cacheId, short result) {
-    ArmEvent event("ApeCacheActionConfirmEx", apeHandle, result);
-    event.entityId = entityId;
-    event.action = action;
-    event.cacheId = cacheId;
-    return Record(std::move(event));
-}
-
 int ArmRecorder::SharedDataReceivedEx(std::uint32_t apeHandle, std::uint32_t cacheId,
                                       std::uint32_t entityId, std::uint32_t memHandle, short result,
                                       tagCacheAction action, std::uint32_t senderId,
@@ -114,13 +92,6 @@ int ArmRecorder::SharedDataReceivedEx(std::uint32_t apeHandle, std::uint32_t cac
         if (m_pClient->ReadMemHandle(memHandle, 0, event.data.data(), &size) != 0) size = 0;
         event.data.resize(size);
     }
-    return Record(std::move(event));
-}
-
-int ArmRecorder::AllocNameHandleConfirm(std::uint32_t apeHandle, std::uint32_t count,
-                                        NameHandle* handles, short result, std::uint32_t) {
-    ArmEvent event("AllocNameHandleConfirm", apeHandle, result);
-    if (handles != nullptr) event.handles.assign(handles, handles + count);
     return Record(std::move(event));
 }
 

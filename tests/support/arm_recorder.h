@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <functional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "platform/conference_null_sink.h"
@@ -58,10 +59,15 @@ public:
     std::size_t Count(const std::string& name) const { return Named(name).size(); }
     void Clear() { m_events.clear(); }
 
-    int ConnectConfirm(short result, std::uint32_t value) override;
-    int ConferenceJoinConfirm(std::uint16_t conferenceId, const char* conferenceName, short result,
-                              std::uint32_t value) override;
-    int ApeAttachConfirm(std::uint32_t apeHandle, short result, std::uint32_t userId) override;
+    int ConnectConfirm(short result, std::uint32_t) override {
+        return Record(ArmEvent("ConnectConfirm", 0, result));
+    }
+    int ConferenceJoinConfirm(std::uint16_t, const char*, short result, std::uint32_t) override {
+        return Record(ArmEvent("ConferenceJoinConfirm", 0, result));
+    }
+    int ApeAttachConfirm(std::uint32_t apeHandle, short result, std::uint32_t userId) override {
+        return Record(ArmEvent("ApeAttachConfirm", apeHandle, result, userId));
+    }
     int ApeEnrollConfirm(std::uint32_t apeHandle, short result, short resourceNumber,
                          ARMSessionResource* resources) override;
     int ApeDataIndication(std::uint32_t apeHandle, std::uint32_t senderId, std::uint32_t value,
@@ -71,14 +77,24 @@ public:
                          ARMApeRoster* records) override;
     using ArmNullSink::ApeRosterChanged;  // the conference sink's one stays silent
     int ApeCacheActionConfirmEx(std::uint32_t apeHandle, std::uint32_t entityId,
-                                tagCacheAction action, std::uint32_t requestIdx,
-                                std::uint32_t cacheId, short result) override;
+                                tagCacheAction action, std::uint32_t, std::uint32_t cacheId,
+                                short result) override {
+        ArmEvent event("ApeCacheActionConfirmEx", apeHandle, result);
+        event.entityId = entityId;
+        event.action = action;
+        event.cacheId = cacheId;
+        return Record(std::move(event));
+    }
     int SharedDataReceivedEx(std::uint32_t apeHandle, std::uint32_t cacheId, std::uint32_t entityId,
                              std::uint32_t memHandle, short result, tagCacheAction action,
                              std::uint32_t senderId, std::uint32_t value,
                              std::uint16_t flags) override;
     int AllocNameHandleConfirm(std::uint32_t apeHandle, std::uint32_t count, NameHandle* handles,
-                               short result, std::uint32_t reserved) override;
+                               short result, std::uint32_t) override {
+        ArmEvent event("AllocNameHandleConfirm", apeHandle, result);
+        if (handles != nullptr) event.handles.assign(handles, handles + count);
+        return Record(std::move(event));
+    }
 
 private:
     // Stores event, runs the hook; returns 0 (what the callbacks answer).

@@ -12,19 +12,15 @@ TraceCapture::~TraceCapture() {
     SetTraceSink([](TraceLevel, const char*, const char*) {});
 }
 
-bool TraceCapture::Has(const std::string& text) const {
-    return std::any_of(m_lines.begin(), m_lines.end(),
-                       [&](const TraceLine& line) { return line.text == text; });
-}
-
-bool TraceCapture::Has(TraceLevel level, const std::string& text) const {
+bool TraceCapture::Has(const std::string& text, const TraceLevel* level) const {
     return std::any_of(m_lines.begin(), m_lines.end(), [&](const TraceLine& line) {
-        return line.level == level && line.text == text;
+        return line.text == text && (level == nullptr || line.level == *level);
     });
 }
 
 std::vector<std::string> TraceCapture::Texts() const {
     std::vector<std::string> texts;
-    for (const TraceLine& line : m_lines) texts.push_back(line.text);
+    for (const TraceLine& line : m_lines)
+        texts.push_back(line.text);
     return texts;
 }
