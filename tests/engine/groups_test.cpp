@@ -1,3 +1,5 @@
+// Groups and the group list: reading a group from cache bytes (hostile ones included), flag
+// schemes, cache records, look-ups, insertion schemes, row numbering, modify and delete.
 #include <gtest/gtest.h>
 
 #include <cstring>

@@ -1,3 +1,5 @@
+// The roster list itself: role queries and their result codes, lookups by node and user id,
+// and the counts and indexes kept as items move, change roles or leave.
 #include <gtest/gtest.h>
 
 #include <memory>
