@@ -29,7 +29,6 @@ public:
                 ran += loop->RunUntilIdle();
         } while (ran > 0);
     }
-    InProcessConference& Conference() { return m_conference; }
 
 private:
     InProcessConference m_conference{kConference};
@@ -47,9 +46,6 @@ class InProcessConferenceTest : public testing::Test, protected ConferenceDriver
 protected:
     using ConferenceDriver::Run;  // not the test's own Run
     void SetUp() override { m_harness = std::make_unique<InProcessHarness>(); }
-    InProcessConference& Conference() {
-        return static_cast<InProcessHarness&>(*m_harness).Conference();
-    }
     static InProcessArmClient* Ctl(const ContractParticipant& p) {
         return static_cast<InProcessArmClient*>(p.client);
     }
@@ -71,31 +67,18 @@ std::vector<short> Results(const ArmRecorder& sink, const std::string& name) {
 
 }  // namespace
 
-TEST_F(InProcessConferenceTest, FailedCallsReturnTheChosenResultAndDoNothing) {
+// Chosen failures and refusals report what they were told to and change nothing.
+TEST_F(InProcessConferenceTest, FailedCallsAndRefusedConfirmationsTakeNoEffect) {
     ContractParticipant& a = Attached(11);
+    ContractParticipant& b = Attached(12);
     Ctl(a)->FailNext(ArmOperation::ApeEnroll, 1);
     EXPECT_EQ(1, Enroll(a, "x"));
-    Run();
-    EXPECT_TRUE(a.sink->Events().empty());
-
     std::uint32_t mem = 0;
     Ctl(a)->FailNext(ArmOperation::AllocMemHandle, 7, 2);
     EXPECT_EQ(7, a.client->AllocMemHandle(4, &mem));
     EXPECT_EQ(7, a.client->AllocMemHandle(4, &mem));
     EXPECT_EQ(0u, Ctl(a)->MemHandleCount());
     EXPECT_EQ(0, a.client->AllocMemHandle(4, &mem));
-
-    // A result of 0 claims success, but no answer ever comes.
-    ContractParticipant& b = Fresh(12);
-    Ctl(b)->FailNext(ArmOperation::Connect, 0);
-    EXPECT_EQ(0, b.client->Connect(b.sink.get(), "b", 0, 0, 0));
-    Run();
-    EXPECT_EQ(0u, b.sink->Count("ConnectConfirm"));
-}
-
-TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect) {
-    ContractParticipant& a = Attached(11);
-    ContractParticipant& b = Attached(12);
     ASSERT_EQ(0, Enroll(b, "b"));
     Run();
     b.sink->Clear();
@@ -123,6 +106,13 @@ TEST_F(InProcessConferenceTest, ConfirmationsCarryTheChosenResultAndTakeNoEffect
     EXPECT_EQ(std::vector<short>{7}, Results(*a.sink, "ApeCacheActionConfirmEx"));
     // The refused append left the cache never set: the subscriber saw nothing of it.
     EXPECT_EQ(std::vector<short>{kArmRetry}, Results(*b.sink, "SharedDataReceivedEx"));
+
+    // A result of 0 claims success, but no answer ever comes.
+    ContractParticipant& c = Fresh(13);
+    Ctl(c)->FailNext(ArmOperation::Connect, 0);
+    EXPECT_EQ(0, c.client->Connect(c.sink.get(), "c", 0, 0, 0));
+    Run();
+    EXPECT_TRUE(c.sink->Events().empty());
 }
 
 TEST_F(InProcessConferenceTest, InjectedDeliveriesArriveExactlyAsCrafted) {
