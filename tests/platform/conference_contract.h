@@ -68,9 +68,14 @@ protected:
     int Write(ContractParticipant& p, std::uint32_t cache, tagCacheAction action,
               const std::vector<std::uint8_t>* bytes);
     // ApeRequestSharedDataEx with p's recorder as sink; its result.
-    int Request(ContractParticipant& p, std::uint32_t cache, tagCacheRequestType type);
+    int Request(ContractParticipant& p, std::uint32_t cache, tagCacheRequestType type) {
+        return p.client->ApeRequestSharedDataEx(p.ape, cache, 0, type, 255, p.sink.get());
+    }
     // Releases p's service object.
-    void Release(ContractParticipant& p);
+    void Release(ContractParticipant& p) {
+        EXPECT_EQ(0, p.client->Release());
+        p.client = nullptr;
+    }
 
     std::unique_ptr<ConferenceHarness> m_harness;
     std::deque<ContractParticipant> m_participants;

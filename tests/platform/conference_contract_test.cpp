@@ -113,16 +113,6 @@ int ConferenceDriver::Write(ContractParticipant& p, std::uint32_t cache, tagCach
     return result;
 }
 
-int ConferenceDriver::Request(ContractParticipant& p, std::uint32_t cache,
-                              tagCacheRequestType type) {
-    return p.client->ApeRequestSharedDataEx(p.ape, cache, 0, type, 255, p.sink.get());
-}
-
-void ConferenceDriver::Release(ContractParticipant& p) {
-    EXPECT_EQ(0, p.client->Release());
-    p.client = nullptr;
-}
-
 TEST_P(ConferenceContract, ConnectJoinAndAttachAnswerLaterAndRepeatsAnswerTheSame) {
     ContractParticipant& p = Fresh(11);
     const std::uint16_t conference = m_harness->ConferenceId();
@@ -214,7 +204,9 @@ TEST_P(ConferenceContract, EnrollGrantsOneSessionValuePerSessionAndTellsEveryMem
               Rosters(b));
 }
 
-TEST_P(ConferenceContract, PrivateDataReachesOneUserWithTheTrueSender) {
+// Private data reaches its one addressee, cache actions every subscriber; both with the true
+// sender and the bytes unchanged.
+TEST_P(ConferenceContract, PrivateDataAndCacheActionsReachTheirAddresseesWithTheTrueSender) {
     ContractParticipant& a = Attached(11);
     ContractParticipant& b = Attached(12);
     ContractParticipant& c = Attached(13);
@@ -223,7 +215,6 @@ TEST_P(ConferenceContract, PrivateDataReachesOneUserWithTheTrueSender) {
     EXPECT_NE(0, a.client->ApeSendData(a.ape, 999999, 1, bytes.data(), 13, 1, 1));
     EXPECT_TRUE(b.sink->Events().empty());
     Run();
-
     const std::vector<ArmEvent> received = b.sink->Named("ApeDataIndication");
     ASSERT_EQ(1u, received.size());
     EXPECT_EQ(b.ape, received[0].apeHandle);
@@ -231,12 +222,7 @@ TEST_P(ConferenceContract, PrivateDataReachesOneUserWithTheTrueSender) {
     EXPECT_EQ(bytes, Text(received[0].data));
     EXPECT_TRUE(a.sink->Events().empty());
     EXPECT_TRUE(c.sink->Events().empty());
-}
 
-TEST_P(ConferenceContract, CacheActionsReachEverySubscriberWithTheWriterAsSender) {
-    ContractParticipant& a = Attached(11);
-    ContractParticipant& b = Attached(12);
-    ContractParticipant& c = Attached(13);
     const std::uint32_t cache = Handle(a, "70001_chat_cache_15");
     ASSERT_EQ(cache, Handle(b, "70001_chat_cache_15"));
     ASSERT_EQ(0, Request(a, cache, CACHE_REQUEST_SUBSCRIBE));

@@ -20,13 +20,11 @@ TEST_F(GermanHost, KeysComeBackTranslatedInUtf8OrElseUnchanged) {
     EXPECT_EQ(GetLocalizedString(key, "com.korvo.nocatalogue"), key);
 }
 
-struct FormatCase {
-    const char* format;
-    const char* expected;
-};
-
 TEST(StringFormat, PlaceholdersTakeTheNamesAndEverythingElseIsText) {
-    const FormatCase cases[] = {
+    const struct {
+        const char* format;
+        const char* expected;
+    } cases[] = {
         {"from %@ to %@ (privately)", "from Ana to %@ Bo (privately)"},
         {"from %@ to Everyone", "from Ana to Everyone"},
         {"%s and %d and 100% stay: %@", "%s and %d and 100% stay: Ana"},
@@ -35,7 +33,7 @@ TEST(StringFormat, PlaceholdersTakeTheNamesAndEverythingElseIsText) {
         {"%3$@ %0$@ %1$ %", "%3$@ %0$@ %1$ %"},
         {"", ""},
     };
-    for (const FormatCase& c : cases) {
+    for (const auto& c : cases) {
         std::string out = "previous";
         FormatStringWith2Parameters(c.format, "Ana", "%@ Bo", out);  // names are never formats
         EXPECT_EQ(out, c.expected) << c.format;

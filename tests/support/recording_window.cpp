@@ -26,10 +26,6 @@ void RecordingWindow::Install(bool answerBack) {
     SetChatWindowFactory([] { return new RecordingWindow; });
 }
 
-void RecordingWindow::Uninstall() {
-    SetChatWindowFactory(nullptr);
-}
-
 RecordingWindow* RecordingWindow::Latest() {
     return g_latest;
 }

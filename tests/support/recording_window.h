@@ -31,7 +31,7 @@ public:
     // With answerBack they report selections (5001) back to the engine, recorded in order.
     static void Install(bool answerBack = false);
     // Makes CreateUI build no window at all.
-    static void Uninstall();
+    static void Uninstall() { SetChatWindowFactory(nullptr); }
     // The window made most recently and still alive, or null.
     static RecordingWindow* Latest();
 

@@ -14,7 +14,6 @@ class SpyArmClient final : public IArmClient {
 
 public:
     explicit SpyArmClient(IArmClient* inner) : m_pInner(inner) {}
-    ~SpyArmClient() = default;
     SpyArmClient(const SpyArmClient&) = delete;
     SpyArmClient& operator=(const SpyArmClient&) = delete;
 
