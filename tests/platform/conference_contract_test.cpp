@@ -211,15 +211,20 @@ TEST_P(ConferenceContract, PrivateDataAndCacheActionsReachTheirAddresseesWithThe
     ContractParticipant& b = Attached(12);
     ContractParticipant& c = Attached(13);
     const std::string bytes("<pdu>\0\xff</pdu>", 13);
+    const ARMSendOption option{a.ape, 0x92};  // marks the next send only
+    ASSERT_EQ(0, a.client->SetSendOption(-200, &option));
     ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.userId, 1, bytes.data(), 13, 1, 1));
     EXPECT_NE(0, a.client->ApeSendData(a.ape, 999999, 1, bytes.data(), 13, 1, 1));
+    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.userId, 1, "2", 1, 1, 1));
     EXPECT_TRUE(b.sink->Events().empty());
     Run();
     const std::vector<ArmEvent> received = b.sink->Named("ApeDataIndication");
-    ASSERT_EQ(1u, received.size());
+    ASSERT_EQ(2u, received.size());
     EXPECT_EQ(b.ape, received[0].apeHandle);
     EXPECT_EQ(a.userId, received[0].userId);
     EXPECT_EQ(bytes, Text(received[0].data));
+    EXPECT_EQ(0x92, received[0].flags);
+    EXPECT_EQ(0, received[1].flags);
     EXPECT_TRUE(a.sink->Events().empty());
     EXPECT_TRUE(c.sink->Events().empty());
 

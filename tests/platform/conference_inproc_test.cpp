@@ -1,8 +1,6 @@
 // The in-process conference: the contract suite on the virtual clock, and the fault
 // injection, refusals and choices that belong to this implementation.
-#include <string>
 #include <tuple>
-#include <vector>
 
 #include "platform/conference_results.h"
 #include "platform/inproc_conference.h"
@@ -216,20 +214,6 @@ TEST_F(InProcessConferenceTest, MemoryBlocksAreClippedAtTheirEndAndGoneOnceFreed
     EXPECT_EQ(kArmUnknownHandle, m.WriteMemHandle(mem, 0, "ab", &size));
     EXPECT_EQ(kArmUnknownHandle, m.FreeMemHandle(mem));
     EXPECT_EQ(kArmUnknownHandle, m.FreeMemHandle(0));
-}
-
-TEST_F(InProcessConferenceTest, SendOptionMarksTheNextSendOnly) {
-    ContractParticipant& a = Attached(11);
-    ContractParticipant& b = Attached(12);
-    const ARMSendOption option{a.ape, 0x92};
-    ASSERT_EQ(0, a.client->SetSendOption(-200, &option));
-    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.userId, 1, "1", 1, 1, 1));
-    ASSERT_EQ(0, a.client->ApeSendData(a.ape, b.userId, 1, "2", 1, 1, 1));
-    Run();
-    const std::vector<ArmEvent> got = b.sink->Named("ApeDataIndication");
-    ASSERT_EQ(2u, got.size());
-    EXPECT_EQ(0x92, got[0].flags);
-    EXPECT_EQ(0, got[1].flags);
 }
 
 TEST_F(InProcessConferenceTest, DestroyAndTheConferenceEndingDeliverNothingMore) {

@@ -52,29 +52,26 @@ TEST(PosixFiles, UniqueFilesAreNewOpenForWritingAndTakeTheModeAsked) {
     PosixFileServices files;
     TempDir dir;
     const mode_t umask = ::umask(022);
-    struct Made {
-        std::string name;
-        FileId id = -1;
-    } made[3];
-    ASSERT_EQ(files.CreateUnique(dir.Path(), ".f.", kDefaultFileMode, &made[0].name, &made[0].id),
-              kFileOk);
-    ASSERT_EQ(files.CreateUnique(dir.Path(), ".f.", kDefaultFileMode, &made[1].name, &made[1].id),
-              kFileOk);
-    ASSERT_EQ(files.CreateUnique(dir.Path() + "/", ".f.", 0604, &made[2].name, &made[2].id),
-              kFileOk);
-    ::umask(umask);
-    EXPECT_NE(made[0].name, made[1].name);
+    // Twice the default mode (0666 less the umask), once a mode of its own in the folder
+    // written with a trailing slash.
+    const std::string folders[] = {dir.Path(), dir.Path(), dir.Path() + "/"};
+    const std::uint32_t asked[] = {kDefaultFileMode, kDefaultFileMode, 0604};
     const mode_t modes[] = {0644, 0644, 0604};
+    std::string names[3];
     for (int i = 0; i < 3; ++i) {
-        EXPECT_EQ(made[i].name.rfind(".f.", 0), 0u);
-        EXPECT_EQ(files.Write(made[i].id, "x", 1), kFileOk);
-        EXPECT_EQ(files.Sync(made[i].id), kFileOk);
-        EXPECT_EQ(files.Close(made[i].id), kFileOk);
+        FileId id = -1;
+        ASSERT_EQ(files.CreateUnique(folders[i], ".f.", asked[i], &names[i], &id), kFileOk);
+        EXPECT_EQ(names[i].rfind(".f.", 0), 0u);
+        EXPECT_EQ(files.Write(id, "x", 1), kFileOk);
+        EXPECT_EQ(files.Sync(id), kFileOk);
+        EXPECT_EQ(files.Close(id), kFileOk);
         FileInfo info;
-        ASSERT_EQ(files.GetInfo(dir.File(made[i].name), &info), kFileOk);
+        ASSERT_EQ(files.GetInfo(dir.File(names[i]), &info), kFileOk);
         EXPECT_EQ(info.mode, modes[i]);
-        EXPECT_EQ(FileBytes(dir.File(made[i].name)), "x");
+        EXPECT_EQ(FileBytes(dir.File(names[i])), "x");
     }
+    ::umask(umask);
+    EXPECT_NE(names[0], names[1]);
     EXPECT_EQ(files.SyncFolder(dir.Path()), kFileOk);
 }
 

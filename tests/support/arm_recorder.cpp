@@ -1,7 +1,5 @@
 #include "tests/support/arm_recorder.h"
 
-#include <utility>
-
 namespace {
 
 std::vector<std::uint8_t> Bytes(const void* data, std::int64_t length) {
@@ -27,31 +25,6 @@ std::vector<RosterRecord> CopyRecords(const ARMApeRoster* records, std::uint32_t
 }
 
 }  // namespace
-
-std::vector<std::string> ArmRecorder::Names() const {
-    std::vector<std::string> names;
-    for (const ArmEvent& event : m_events)
-        names.push_back(event.name);
-    return names;
-}
-
-std::vector<ArmEvent> ArmRecorder::Named(const std::string& name) const {
-    std::vector<ArmEvent> found;
-    for (const ArmEvent& event : m_events)
-        if (event.name == name) found.push_back(event);
-    return found;
-}
-
-int ArmRecorder::ApeEnrollConfirm(std::uint32_t apeHandle, short result, short resourceNumber,
-                                  ARMSessionResource* resources) {
-    ArmEvent event("ApeEnrollConfirm", apeHandle, result);
-    for (short i = 0; i < resourceNumber && resources != nullptr; ++i) {
-        const ARMSessionResource& resource = resources[i];
-        event.resources.push_back({resource.pszName == nullptr ? "" : resource.pszName,
-                                   resource.dwValue, resource.wStatus});
-    }
-    return Record(std::move(event));
-}
 
 int ArmRecorder::ApeDataIndication(std::uint32_t apeHandle, std::uint32_t senderId, std::uint32_t,
                                    std::uint16_t flags, const void* data, std::uint32_t length) {
@@ -93,11 +66,4 @@ int ArmRecorder::SharedDataReceivedEx(std::uint32_t apeHandle, std::uint32_t cac
         event.data.resize(size);
     }
     return Record(std::move(event));
-}
-
-int ArmRecorder::Record(ArmEvent event) {
-    m_events.push_back(event);
-    // The hook gets its own copy: it may clear the recorder.
-    if (m_hook) m_hook(event);
-    return 0;
 }

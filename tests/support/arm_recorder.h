@@ -53,9 +53,19 @@ public:
 
     const std::vector<ArmEvent>& Events() const { return m_events; }
     // The callback names in order.
-    std::vector<std::string> Names() const;
+    std::vector<std::string> Names() const {
+        std::vector<std::string> names;
+        for (const ArmEvent& event : m_events)
+            names.push_back(event.name);
+        return names;
+    }
     // The events of one callback, in order.
-    std::vector<ArmEvent> Named(const std::string& name) const;
+    std::vector<ArmEvent> Named(const std::string& name) const {
+        std::vector<ArmEvent> found;
+        for (const ArmEvent& event : m_events)
+            if (event.name == name) found.push_back(event);
+        return found;
+    }
     std::size_t Count(const std::string& name) const { return Named(name).size(); }
     void Clear() { m_events.clear(); }
 
@@ -69,7 +79,13 @@ public:
         return Record(ArmEvent("ApeAttachConfirm", apeHandle, result, userId));
     }
     int ApeEnrollConfirm(std::uint32_t apeHandle, short result, short resourceNumber,
-                         ARMSessionResource* resources) override;
+                         ARMSessionResource* resources) override {
+        ArmEvent event("ApeEnrollConfirm", apeHandle, result);
+        for (short i = 0; i < resourceNumber && resources != nullptr; ++i)
+            event.resources.push_back({resources[i].pszName == nullptr ? "" : resources[i].pszName,
+                                       resources[i].dwValue, resources[i].wStatus});
+        return Record(std::move(event));
+    }
     int ApeDataIndication(std::uint32_t apeHandle, std::uint32_t senderId, std::uint32_t value,
                           std::uint16_t flags, const void* data, std::uint32_t length) override;
     int ApeRosterChanged(std::uint32_t serviceId, std::uint16_t value, std::uint32_t addedCount,
@@ -97,8 +113,13 @@ public:
     }
 
 private:
-    // Stores event, runs the hook; returns 0 (what the callbacks answer).
-    int Record(ArmEvent event);
+    // Stores event, runs the hook (with its own copy: it may clear the recorder); returns 0,
+    // what the callbacks answer.
+    int Record(ArmEvent event) {
+        m_events.push_back(event);
+        if (m_hook) m_hook(event);
+        return 0;
+    }
 
     IArmClient* m_pClient;
     std::function<void(const ArmEvent&)> m_hook;

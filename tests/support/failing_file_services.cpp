@@ -1,17 +1,5 @@
 #include "tests/support/failing_file_services.h"
 
-FailingFileServices::FailingFileServices() : m_pPrevious(&CurrentFileServices()) {
-    SetFileServices(this);
-}
-
-FailingFileServices::~FailingFileServices() {
-    SetFileServices(m_pPrevious);
-}
-
-void FailingFileServices::Fail(FileOp op, FileResult result, const std::string& pathPart) {
-    m_rules.push_back(Rule{op, result, pathPart});
-}
-
 FileResult FailingFileServices::Injected(FileOp op, const std::string& path) const {
     for (const Rule& rule : m_rules)
         if (rule.op == op && path.find(rule.pathPart) != std::string::npos) return rule.result;

@@ -29,8 +29,8 @@ enum class FileOp {
 
 class FailingFileServices final : public FileServices {
 public:
-    FailingFileServices();
-    ~FailingFileServices() override;
+    FailingFileServices() : m_pPrevious(&CurrentFileServices()) { SetFileServices(this); }
+    ~FailingFileServices() override { SetFileServices(m_pPrevious); }
     FailingFileServices(const FailingFileServices&) = delete;
     FailingFileServices& operator=(const FailingFileServices&) = delete;
 
@@ -38,7 +38,9 @@ public:
     // Rename the path is the destination, for CreateUnique the folder and stem; for calls on
     // an open file it is the path it was opened or created with. A failed call does nothing, except
     // that a failed Close still releases the file, as a real one does.
-    void Fail(FileOp op, FileResult result, const std::string& pathPart = "");
+    void Fail(FileOp op, FileResult result, const std::string& pathPart = "") {
+        m_rules.push_back(Rule{op, result, pathPart});
+    }
 
     FileResult Resolve(const std::string& path) override {
         return Unless(FileOp::Resolve, path, [&] { return m_posix.Resolve(path); });

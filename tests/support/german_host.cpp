@@ -1,8 +1,5 @@
 #include "tests/support/german_host.h"
 
-#include <clocale>
-#include <cstdlib>
-
 #include "platform/string_table.h"
 
 void GermanHost::SetUp() {
@@ -10,10 +7,4 @@ void GermanHost::SetUp() {
     setenv("LC_ALL", "C.UTF-8", 1);
     setenv("LANGUAGE", "de", 1);
     std::setlocale(LC_ALL, "");
-}
-
-void GermanHost::TearDown() {
-    unsetenv("LANGUAGE");
-    unsetenv("LC_ALL");
-    std::setlocale(LC_ALL, "C");
 }

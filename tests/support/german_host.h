@@ -4,8 +4,15 @@
 
 #include <gtest/gtest.h>
 
+#include <clocale>
+#include <cstdlib>
+
 class GermanHost : public ::testing::Test {
 protected:
     void SetUp() override;
-    void TearDown() override;
+    void TearDown() override {
+        unsetenv("LANGUAGE");
+        unsetenv("LC_ALL");
+        std::setlocale(LC_ALL, "C");
+    }
 };

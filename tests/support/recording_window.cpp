@@ -1,34 +1,12 @@
 #include "tests/support/recording_window.h"
 
-#include <cstdint>
-
 #include "api/ui_protocol.h"
 
 namespace {
-RecordingWindow* g_latest = nullptr;
-bool g_answerBack = false;
-
 std::int32_t IndexAt(void* param) {
     return param ? *static_cast<std::int32_t*>(param) : -2;
 }
 }  // namespace
-
-RecordingWindow::RecordingWindow() : m_bAnswerBack(g_answerBack) {
-    g_latest = this;
-}
-
-RecordingWindow::~RecordingWindow() {
-    if (g_latest == this) g_latest = nullptr;
-}
-
-void RecordingWindow::Install(bool answerBack) {
-    g_answerBack = answerBack;
-    SetChatWindowFactory([] { return new RecordingWindow; });
-}
-
-RecordingWindow* RecordingWindow::Latest() {
-    return g_latest;
-}
 
 void RecordingWindow::SetSink(IChatCommSinkForChatUI* sink) {
     m_pSink = sink;

@@ -24,16 +24,21 @@ struct RecordedCommand {
 
 class RecordingWindow final : public IChatWindow {
 public:
-    RecordingWindow();
-    ~RecordingWindow() override;
+    RecordingWindow() : m_bAnswerBack(s_answerBack) { s_pLatest = this; }
+    ~RecordingWindow() override {
+        if (s_pLatest == this) s_pLatest = nullptr;
+    }
 
     // Makes CreateUI build RecordingWindow objects from now on; Latest() is the newest one.
     // With answerBack they report selections (5001) back to the engine, recorded in order.
-    static void Install(bool answerBack = false);
+    static void Install(bool answerBack = false) {
+        s_answerBack = answerBack;
+        SetChatWindowFactory([] { return new RecordingWindow; });
+    }
     // Makes CreateUI build no window at all.
     static void Uninstall() { SetChatWindowFactory(nullptr); }
     // The window made most recently and still alive, or null.
-    static RecordingWindow* Latest();
+    static RecordingWindow* Latest() { return s_pLatest; }
 
     void SetSuperView(void* view) override { m_pSuperView = view; }
     void SetSink(IChatCommSinkForChatUI* sink) override;
@@ -55,6 +60,8 @@ public:
     void* SuperView() const { return m_pSuperView; }
 
 private:
+    static inline RecordingWindow* s_pLatest = nullptr;
+    static inline bool s_answerBack = false;  // what the next window is made with
     // Sends 5001 with the index to the engine and records that it did.
     void ReportSelection(std::int32_t index);
 

@@ -4,8 +4,6 @@
 #include <safeclib/safe_mem_lib.h>
 #include <safeclib/safe_str_lib.h>
 
-#include <string>
-
 namespace {
 
 ExpectSafecViolation* g_pInnermost = nullptr;
@@ -13,13 +11,12 @@ ExpectSafecViolation* g_pInnermost = nullptr;
 }  // namespace
 
 void ExpectSafecViolation::OnViolation(const char* msg, void* /*ptr*/, int error) {
-    const std::string text = msg != nullptr ? msg : "(no message)";
-    if (g_pInnermost == nullptr) {
-        ADD_FAILURE() << "bounded library refused an operation: " << text << " (error " << error
-                      << ")";
+    if (g_pInnermost != nullptr) {
+        ++g_pInnermost->m_nCount;
         return;
     }
-    ++g_pInnermost->m_nCount;
+    ADD_FAILURE() << "bounded library refused an operation: " << (msg ? msg : "(no message)")
+                  << " (error " << error << ")";
 }
 
 void InstallSafecGuard() {

@@ -4,6 +4,7 @@
 #pragma once
 
 #include <cstdint>
+#include <cstring>
 #include <string>
 #include <vector>
 
@@ -32,13 +33,10 @@ public:
     // The ape handle the service wrote at the last ApeAttach.
     std::uint32_t ApeHandle() const { return m_apeHandle; }
     IArmSharedDataSink* RegisteredSink() const { return m_pRegisteredSink; }
-    bool Released() const { return m_bReleased; }
+    bool Released() const { return Count("Release") > 0; }
     void ClearCalls() { m_details.clear(); }
 
-    int Release() override {
-        m_bReleased = true;
-        return Call("Release", &Arm::Release);
-    }
+    int Release() override { return Call("Release", &Arm::Release); }
     int Connect(IArmNodeControllerSink* sink, const char* userName, std::uint32_t a,
                 std::uint32_t b, std::uint32_t c) override {
         return Call("Connect", &Arm::Connect, sink, userName, a, b, c);
@@ -58,10 +56,20 @@ public:
         return Call("ConferenceLeave", &Arm::ConferenceLeave, reserved, conferenceId, sink);
     }
     int ApeAttach(IArmApeSink* sink, std::uint32_t reserved, std::uint16_t conferenceId,
-                  std::uint32_t* apeHandle) override;
+                  std::uint32_t* apeHandle) override {
+        const int result =
+            Call("ApeAttach", &Arm::ApeAttach, sink, reserved, conferenceId, apeHandle);
+        if (apeHandle) m_apeHandle = *apeHandle;
+        return result;
+    }
     int ApeEnroll(std::uint32_t apeHandle, int enroll, std::uint32_t sessionId,
                   std::uint32_t reserved, int resourceCount, ARMSessionResource* resources,
-                  const void* enrollInfo, std::uint32_t enrollInfoLength, int mode) override;
+                  const void* enrollInfo, std::uint32_t enrollInfoLength, int mode) override {
+        m_enrollPayloads.emplace_back(static_cast<const char*>(enrollInfo), enrollInfoLength);
+        return Call("ApeEnroll", &Arm::ApeEnroll, apeHandle, enroll, sessionId, reserved,
+                    resourceCount, Resources{resources, resourceCount}, enrollInfo,
+                    enrollInfoLength, mode);
+    }
     int ApeSendData(std::uint32_t apeHandle, std::uint32_t destUserId, int priority,
                     const void* data, std::uint32_t length, int reliable, int segment) override {
         return Call("ApeSendData", &Arm::ApeSendData, apeHandle, destUserId, priority, data, length,
@@ -75,7 +83,14 @@ public:
         return Call("RegisterSharedDataSink", &Arm::RegisterSharedDataSink, apeHandle, sink);
     }
     int AllocNameHandle(std::uint32_t apeHandle, std::uint32_t count, NameHandle* entries,
-                        IArmAllocHandleSink* sink) override;
+                        IArmAllocHandleSink* sink) override {
+        m_handleRequests.emplace_back(entries, entries + count);
+        m_handleNames.clear();
+        for (std::uint32_t i = 0; i < count; ++i)
+            m_handleNames.emplace_back(entries[i].name,
+                                       strnlen(entries[i].name, sizeof entries[i].name));
+        return Call("AllocNameHandle", &Arm::AllocNameHandle, apeHandle, count, entries, sink);
+    }
     int ApeSharedDataActionEx(std::uint32_t apeHandle, std::uint32_t cacheHandle,
                               std::uint32_t reserved1, std::uint32_t reserved2,
                               tagCacheAction action, std::uint32_t flags, std::uint32_t memHandle,
@@ -122,9 +137,13 @@ private:
         int count;
         operator ARMSessionResource*() const { return list; }
     };
-    static void Put(std::string& out, std::int64_t value);
+    static void Put(std::string& out, std::int64_t value) {
+        Put(out, std::to_string(value).c_str());
+    }
     static void Put(std::string& out, const Resources& resources);
-    static void Put(std::string& out, const char* text);
+    static void Put(std::string& out, const char* text) {
+        out += (out.empty() ? "" : ", ") + std::string(text ? text : "null");
+    }
     template <typename T>
     static void Put(std::string&, T*) {}  // sinks, buffers and out-values
 
@@ -135,5 +154,4 @@ private:
     std::vector<std::vector<NameHandle>> m_handleRequests;
     IArmSharedDataSink* m_pRegisteredSink = nullptr;
     std::uint32_t m_apeHandle = 0;
-    bool m_bReleased = false;
 };
