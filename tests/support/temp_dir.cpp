@@ -8,14 +8,6 @@
 #include <fstream>
 #include <iterator>
 
-namespace {
-
-int RemoveEntry(const char* path, const struct stat*, int, struct FTW*) {
-    return ::remove(path);
-}
-
-}  // namespace
-
 TempDir::TempDir() {
     const char* base = std::getenv("TMPDIR");
     std::string pattern = std::string(base && *base ? base : "/tmp") + "/qc-test-XXXXXX";
@@ -23,7 +15,11 @@ TempDir::TempDir() {
 }
 
 TempDir::~TempDir() {
-    if (!m_path.empty()) ::nftw(m_path.c_str(), RemoveEntry, 16, FTW_DEPTH | FTW_PHYS);
+    // Deepest entries first, links themselves rather than what they point to.
+    const auto remove = [](const char* path, const struct stat*, int, struct FTW*) {
+        return ::remove(path);
+    };
+    if (!m_path.empty()) ::nftw(m_path.c_str(), remove, 16, FTW_DEPTH | FTW_PHYS);
 }
 
 bool PutFile(const std::string& path, const std::string& bytes) {
