@@ -1,7 +1,6 @@
 #include "kyutil/safe_mem.h"
 
 #include <safeclib/safe_mem_lib.h>
-#include <safeclib/safe_str_lib.h>
 
 #include <cstring>
 
@@ -29,14 +28,4 @@ bool SafeBytesEqual(const void* a, const void* b, size_t n) {
     if (n == 0) return true;
     int diff = 1;
     return memcmp_s(a, n, b, n, &diff) == EOK && diff == 0;
-}
-
-bool SafeCompareText(const char* a, const char* b, size_t maxLen, bool ignoreCase, int* order) {
-    if (order == nullptr) return false;
-    int result = 0;
-    const errno_t rc =
-        ignoreCase ? strcasecmp_s(a, maxLen, b, &result) : strcmp_s(a, maxLen, b, &result);
-    if (rc != EOK) return false;
-    *order = result;
-    return true;
 }

@@ -24,8 +24,3 @@ size_t SafeTextLength(const char* text, size_t maxLen);
 // True when the n bytes at a and b are equal (n == 0: true). A null pointer or a refused
 // comparison (n above 256 MiB) answers false, never "equal".
 bool SafeBytesEqual(const void* a, const void* b, size_t n);
-
-// Compares two texts over at most maxLen bytes, case-sensitively or not, and stores in *order a
-// value below, equal to or above 0 as a sorts before, with or after b. Returns false, leaving
-// *order alone, when a text or order is null, maxLen is 0 or maxLen exceeds 32768.
-bool SafeCompareText(const char* a, const char* b, size_t maxLen, bool ignoreCase, int* order);

@@ -278,7 +278,9 @@ TEST(Caches, TheStatusCacheAnswerDecidesWhetherToInitialiseOrJoin) {
                               "m_ChatStatusCacheHandle.handle_value,result =19"),
                   warns);
         // Joining writes the own user info only; initialising sets every cache and more.
-        if (!initialises) EXPECT_EQ(p.spy.Count("ApeSharedDataActionEx"), joins ? 1u : 0u);
+        if (!initialises) {
+            EXPECT_EQ(p.spy.Count("ApeSharedDataActionEx"), joins ? 1u : 0u);
+        }
     }
 }
 

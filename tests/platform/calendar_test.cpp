@@ -36,6 +36,7 @@ TEST(Calendar, SecondsSplitIntoFieldsWithoutTimeZoneAndBack) {
     std::int64_t unchanged = 7;
     EXPECT_FALSE(UnixSecondsFromCalendar({2023, 2, 29, 0, 0, 0, true}, &unchanged));
     EXPECT_FALSE(UnixSecondsFromCalendar({2023, 1, 1, 24, 0, 0, true}, &unchanged));
+    EXPECT_EQ(unchanged, 7);
 }
 
 TEST(Calendar, TheVirtualClockCountsFromItsOriginAndIsWhatCodeOnItsLoopReads) {
