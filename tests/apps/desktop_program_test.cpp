@@ -49,9 +49,11 @@ protected:
         process->start(QC_DESKTOP_PROGRAM, args + extra);
     }
 
+    // The program bounds every wait of its own (connect, enrol, start-up, each expectation), so
+    // the limit here only catches a hang: on a busy machine a sound run can take over 30 s.
     static Finished Finish(QProcess* process) {
         Finished run;
-        if (process->waitForFinished(30000) && process->exitStatus() == QProcess::NormalExit)
+        if (process->waitForFinished(120000) && process->exitStatus() == QProcess::NormalExit)
             run.exitCode = process->exitCode();
         run.out = process->readAll().toStdString();
         return run;
